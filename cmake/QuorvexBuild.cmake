@@ -1,0 +1,54 @@
+# Common compile settings and the helpers every subsystem folder uses.
+
+add_library(quorvex_options INTERFACE)
+target_compile_options(quorvex_options INTERFACE -Wall -Wextra -Wpedantic)
+target_include_directories(quorvex_options INTERFACE "${PROJECT_SOURCE_DIR}/src")
+if(QUORVEX_WERROR)
+  target_compile_options(quorvex_options INTERFACE -Werror)
+endif()
+if(QUORVEX_SANITIZE)
+  target_compile_options(quorvex_options INTERFACE
+    -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
+  target_link_options(quorvex_options INTERFACE -fsanitize=address,undefined)
+endif()
+
+# Root of the source tree, for tests and tools that need the sandbox runner
+# or the simulated console's scenarios.
+set(QUORVEX_SOURCE_ROOT "${PROJECT_SOURCE_DIR}")
+
+# quorvex_add_library(<subsystem> SOURCES <files...> [DEPENDS <subsystems...>])
+# Builds the static library quorvex_<subsystem>.
+function(quorvex_add_library subsystem)
+  cmake_parse_arguments(ARG "" "" "SOURCES;DEPENDS" ${ARGN})
+  add_library(quorvex_${subsystem} STATIC ${ARG_SOURCES})
+  target_link_libraries(quorvex_${subsystem} PUBLIC quorvex_options)
+  foreach(dep ${ARG_DEPENDS})
+    target_link_libraries(quorvex_${subsystem} PUBLIC quorvex_${dep})
+  endforeach()
+endfunction()
+
+# quorvex_add_gtest(<name> SOURCES <files...> [LIBS <targets...>] [SANDBOX] [LABELS <labels...>])
+# Builds one GoogleTest executable and registers each of its tests with ctest.
+# SANDBOX tests re-run themselves inside the private mount namespace of
+# tools/sandbox (see tests/support); where no namespace can be made they
+# exit with 77 and ctest reports them as skipped.
+function(quorvex_add_gtest name)
+  if(NOT QUORVEX_BUILD_TESTS)
+    return()
+  endif()
+  cmake_parse_arguments(ARG "SANDBOX" "" "SOURCES;LIBS;LABELS" ${ARGN})
+  add_executable(${name} ${ARG_SOURCES})
+  target_link_libraries(${name} PRIVATE quorvex_options ${ARG_LIBS} GTest::gtest)
+  if(ARG_SANDBOX)
+    target_link_libraries(${name} PRIVATE quorvex_test_sandbox_main)
+  else()
+    target_link_libraries(${name} PRIVATE GTest::gtest_main)
+  endif()
+  set(labels ${ARG_LABELS})
+  if(ARG_SANDBOX)
+    list(APPEND labels sandbox)
+  endif()
+  gtest_discover_tests(${name}
+    DISCOVERY_TIMEOUT 60
+    PROPERTIES SKIP_RETURN_CODE 77 LABELS "${labels}" TIMEOUT 300)
+endfunction()
