@@ -1,0 +1,15 @@
+#pragma once
+
+#include "pylon/ListOf_Partitions.h"
+
+namespace Quorvex {
+namespace PYLON {
+namespace Utility {
+
+// Replaces the content of partitions with every partition of every managed
+// machine of object type 0, sorted; returns their number.
+int get_AllManagedPartitions(::Quorvex::PYLON::ListOf_Partitions& partitions);
+
+} // namespace Utility
+} // namespace PYLON
+} // namespace Quorvex
