@@ -1,0 +1,26 @@
+#pragma once
+
+#include <string>
+
+namespace Quorvex {
+namespace RELAY {
+
+class FileInfo;
+
+// Formats the name::value parameters of the remote action command and fills
+// in the file attributes that transferred files get.
+class RELAY_Utility {
+public:
+    // name::"value"; the value is written as it is, without escaping.
+    static std::string create_Parameter(std::string const& name, std::string const& value);
+    // name::value in decimal, without quotes.
+    static std::string create_Parameter(std::string const& name, long const& value);
+
+    // Attributes of a file that lands on the console; the file name is kept.
+    static void set_Default_PYLON_FileInfo(FileInfo& info);
+    // Attributes of a file that lands on the partition; the file name is kept.
+    static void set_Default_Client_FileInfo(FileInfo& info);
+};
+
+} // namespace RELAY
+} // namespace Quorvex

@@ -1,0 +1,32 @@
+#pragma once
+
+#include "system/Partition.h"
+
+#include <string>
+
+namespace Quorvex {
+namespace RELAY {
+
+// The partition a remote action addresses, and whether the action names it
+// by "PartitionId" or by "PartitionArray".
+class TargetPartition {
+public:
+    TargetPartition();
+    TargetPartition(Quorvex::System::Partition const& partition);
+
+    Quorvex::System::Partition const& get_Partition() const;
+
+    void use_PartitionArray();
+    void use_PartitionID();
+
+    // CecMT::"<type-model>"::CecMS::"<serial>"::PartitionId::"<id>"
+    // or, in array mode, ...::PartitionArray::{"<id>"}
+    std::string createString_Target() const;
+
+private:
+    Quorvex::System::Partition _Partition;
+    bool _UsePartitionArray;
+};
+
+} // namespace RELAY
+} // namespace Quorvex
