@@ -1,0 +1,33 @@
+#pragma once
+
+#include <string>
+
+namespace Utility {
+
+// An empty file with a unique name, made from a path prefix plus six generated
+// characters. The file stays on disk until remove() succeeds; the destructor
+// never deletes it.
+class TemporaryFile {
+public:
+    // Creates baseFileName + ".XXXXXX" with the six X replaced; on failure the
+    // object stays invalid and nothing is reported.
+    explicit TemporaryFile(std::string const& baseFileName);
+    TemporaryFile(TemporaryFile const& other) = default;
+    TemporaryFile& operator=(TemporaryFile const& other) = default;
+    ~TemporaryFile() = default;
+
+    bool isValid() const;
+    std::string get_ActualFileName() const;
+    std::string get_BaseFileName() const;
+
+    // Deletes the file. Only when the object is valid and the deletion
+    // succeeds are both names emptied and the object made invalid.
+    bool remove();
+
+private:
+    std::string _baseFileName;
+    std::string _actualFileName;
+    bool _valid;
+};
+
+} // namespace Utility
