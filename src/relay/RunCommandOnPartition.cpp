@@ -1,0 +1,66 @@
+#include "relay/RunCommandOnPartition.h"
+
+#include "relay/RELAY_Utility.h"
+
+#include <sstream>
+
+namespace Quorvex {
+namespace RELAY {
+
+namespace {
+
+// The client survey is command 0 on the partition.
+constexpr long gc_ClientQuorvex_CommandID = 0;
+// The client version the partition side is asked to speak.
+constexpr char gc_ClientQuorvex_Version[] = "4.0.11";
+
+} // namespace
+
+RunCommandOnPartition::RunCommandOnPartition(TargetPartition const& target) : Base(target) {}
+
+RunCommandOnPartition::~RunCommandOnPartition() = default;
+
+int RunCommandOnPartition::runCommandOnPartition(long const& commandID, std::string const& options,
+                                                 FileInfo const& remoteFile)
+{
+    set_Action("runCmdOnPartition");
+    get_TargetPartition().use_PartitionID();
+    return execute(createString_RunCommandParameters(commandID, options, remoteFile));
+}
+
+int RunCommandOnPartition::execute_PartitionQuorvex(std::string const& options,
+                                                    std::string const& remoteFileName)
+{
+    FileInfo remoteFile(remoteFileName, "", "", "");
+    RELAY_Utility::set_Default_Client_FileInfo(remoteFile);
+    std::string completedOptions = options;
+    _initialize_ClientQuorvexParameters(completedOptions);
+    return runCommandOnPartition(gc_ClientQuorvex_CommandID, completedOptions, remoteFile);
+}
+
+std::string RunCommandOnPartition::createString_RunCommandParameters(long const& commandID,
+                                                                     std::string const& options,
+                                                                     FileInfo const& remoteFile)
+{
+    std::ostringstream parameters;
+    parameters << RELAY_Utility::create_Parameter("CmdID", commandID) << "::"
+               << RELAY_Utility::create_Parameter("CmdOpts", options) << "::"
+               << RELAY_Utility::create_Parameter("RemoteFN", remoteFile.get_FileName()) << "::"
+               << RELAY_Utility::create_Parameter("RemoteFileInfo", remoteFile.get_FileInfoString());
+    return parameters.str();
+}
+
+void RunCommandOnPartition::_initialize_ClientQuorvexParameters(std::string& options)
+{
+    // Plain substring checks: options that mention "-c" anywhere, even inside
+    // another word, already name the machine.
+    if (options.find("-c") == std::string::npos) {
+        options += " -c " + get_TargetPartition().get_Partition().get_MTMS().__StringValue();
+    }
+    if (options.find("-pylonv") == std::string::npos) {
+        options += " -pylonv " + std::string(gc_ClientQuorvex_Version);
+    }
+}
+
+} // namespace RELAY
+} // namespace Quorvex
