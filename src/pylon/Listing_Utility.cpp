@@ -1,0 +1,31 @@
+#include "pylon/Listing_Utility.h"
+
+#include "utility/ShellCommand.h"
+#include "utility/StringUtility.h"
+
+namespace Quorvex {
+namespace PYLON {
+namespace Listing_Utility {
+
+namespace {
+
+constexpr char gc_Entry_Delimiter[] = ";";
+
+} // namespace
+
+std::vector<std::string> u_run_Listing(std::string const& tool, std::string const& arguments) {
+    ::Utility::ShellCommand command(tool);
+    command.append_Command(arguments);
+    command.execute();
+    std::vector<std::string> entries;
+    // Empty only when the command could not be run at all.
+    if (command.get_stdout().empty()) {
+        return entries;
+    }
+    ::StringUtility::splitString(command.get_stdout().front(), gc_Entry_Delimiter, entries);
+    return entries;
+}
+
+} // namespace Listing_Utility
+} // namespace PYLON
+} // namespace Quorvex
