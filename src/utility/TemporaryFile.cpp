@@ -1,0 +1,55 @@
+#include "utility/TemporaryFile.h"
+
+#include <cstdio>
+#include <cstdlib>
+#include <unistd.h>
+#include <vector>
+
+namespace Utility {
+
+namespace {
+
+// mkstemp replaces these six characters with unique ones.
+constexpr char gc_UniqueSuffix[] = ".XXXXXX";
+
+} // namespace
+
+TemporaryFile::TemporaryFile(std::string const& baseFileName)
+    : _baseFileName(baseFileName), _actualFileName(), _valid(false) {
+    std::string const pattern = _baseFileName + gc_UniqueSuffix;
+    // mkstemp writes the generated name into its argument.
+    std::vector<char> name(pattern.begin(), pattern.end());
+    name.push_back('\0');
+    int const descriptor = ::mkstemp(name.data());
+    if (descriptor < 0) {
+        return;
+    }
+    ::close(descriptor);
+    _actualFileName = name.data();
+    _valid = true;
+}
+
+bool TemporaryFile::isValid() const {
+    return _valid;
+}
+
+std::string TemporaryFile::get_ActualFileName() const {
+    return _actualFileName;
+}
+
+std::string TemporaryFile::get_BaseFileName() const {
+    return _baseFileName;
+}
+
+bool TemporaryFile::remove() {
+    // The C library's remove: the member of the same name hides it here.
+    if (!_valid || ::remove(_actualFileName.c_str()) != 0) {
+        return false;
+    }
+    _actualFileName = "";
+    _baseFileName = "";
+    _valid = false;
+    return true;
+}
+
+} // namespace Utility

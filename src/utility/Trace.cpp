@@ -1,0 +1,103 @@
+#include "utility/Trace.h"
+
+#include "utility/ShellCommand.h"
+
+#include <cstdio>
+#include <cstring>
+#include <ctime>
+#include <new>
+
+namespace Utility {
+
+namespace {
+
+constexpr char gc_TimeFormat[] = "%k:%M:%S";
+constexpr char gc_NoTime[] = "-----";
+constexpr std::size_t gc_TextBufferSize = 255;
+constexpr char gc_HostNameCommand[] = "/bin/hostname";
+constexpr char gc_UnknownHostName[] = "***Unknown***.hostname.";
+// Whole seconds read as milliseconds: the last three digits are always zero.
+constexpr char gc_MillisecondsSuffix[] = "000";
+
+// The current local time as text, or "-----" when it cannot be formatted.
+std::string u_format_LocalTime() {
+    char text[gc_TextBufferSize] = {0};
+    std::time_t const now = std::time(nullptr);
+    std::tm const* const local = std::localtime(&now);
+    if (local == nullptr) {
+        return gc_NoTime;
+    }
+// "%k" (hour padded with a blank) is a C library extension that the
+// compiler's strict format check does not know.
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wformat"
+    std::size_t const length = std::strftime(text, sizeof text, gc_TimeFormat, local);
+#pragma GCC diagnostic pop
+    if (length == 0) {
+        return gc_NoTime;
+    }
+    return text;
+}
+
+} // namespace
+
+Trace::Trace(std::string const& fileName) : std::ofstream() {
+    std::basic_ios<char>::rdbuf(&_get_FileHandle());
+    if (!ms_IsInitialized && !fileName.empty()) {
+        // Set before the open whatever its outcome: a failed open is never retried.
+        ms_IsInitialized = true;
+        _open(fileName);
+    }
+    ++ms_ObjectCounter;
+}
+
+Trace::~Trace() {
+    --ms_ObjectCounter;
+    if (ms_ObjectCounter == 0 && _get_FileHandle().is_open()) {
+        _get_FileHandle().close();
+    }
+}
+
+std::filebuf* Trace::rdbuf() const {
+    return &_get_FileHandle();
+}
+
+std::filebuf& Trace::_get_FileHandle() {
+    static std::filebuf* const handle = new std::filebuf;
+    return *handle;
+}
+
+void Trace::_open(std::string const& fileName) {
+    // Output only: an earlier run's trace is truncated.
+    _get_FileHandle().open(fileName, std::ios::out);
+}
+
+void timeStamp(Trace& trace) {
+    std::string const text = u_format_LocalTime();
+    std::size_t const length = text.size();
+    char* const copy = new (std::nothrow) char[length];
+    if (copy == nullptr) {
+        return;
+    }
+    std::memcpy(copy, text.data(), length);
+    trace.write(copy, static_cast<std::streamsize>(length));
+    delete[] copy;
+}
+
+std::string get_HostName() {
+    ShellCommand hostName(gc_HostNameCommand);
+    hostName.execute();
+    if (!hostName.wasExecuted() || hostName.get_ReturnCode() != 0 ||
+        hostName.get_stdout().empty()) {
+        return std::string(gc_UnknownHostName) + gc_SiteDomainName;
+    }
+    return hostName.get_stdout().front();
+}
+
+std::string get_TimeStamp() {
+    char text[gc_TextBufferSize] = {0};
+    std::snprintf(text, sizeof text, "%lu", static_cast<unsigned long>(std::time(nullptr)));
+    return std::string(text) + gc_MillisecondsSuffix;
+}
+
+} // namespace Utility
