@@ -1,0 +1,23 @@
+#pragma once
+
+#include "vpd/Base.h"
+#include "vpd/Base_StringValue.h"
+#include "vpd/ListOf_Properties.h"
+
+#include <string>
+
+namespace Quorvex {
+namespace VPD {
+
+// Properties under a common name. Keyed by that name; two groups of one name
+// merge into one holding the union of their properties.
+class PropertyGroup : public Base, public Base_StringValue, public ListOf_Properties {
+public:
+    PropertyGroup();
+    explicit PropertyGroup(std::string const& name);
+
+    std::string const& __StringValue() const override;
+};
+
+} // namespace VPD
+} // namespace Quorvex

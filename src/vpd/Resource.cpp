@@ -1,0 +1,44 @@
+#include "vpd/Resource.h"
+
+#include "vpd/ResourceList.h"
+
+namespace Quorvex {
+namespace VPD {
+
+Resource::Resource() = default;
+
+Resource::Resource(std::string const& displayName, std::string const& uniqueID)
+    : Base(displayName), Resource_ContainerInterface_Attributes(uniqueID, std::string()) {}
+
+Resource& Resource::operator+=(Resource const& other) {
+    if (other.get_UniqueID() != get_UniqueID()) {
+        return *this;
+    }
+    if (other.get_NumberOf_Properties() != 0) {
+        get_ListOf_Properties() += other.get_ListOf_Properties();
+    }
+    if (other.get_NumberOf_PropertyGroups() != 0) {
+        get_ListOf_PropertyGroups() += other.get_ListOf_PropertyGroups();
+    }
+    if (other.get_NumberOf_ResourceLists() != 0) {
+        get_ListOf_ResourceLists() += other.get_ListOf_ResourceLists();
+    }
+    return *this;
+}
+
+bool Resource::insert_Resource(std::string const& listName, Resource const& resource) {
+    if (listName.empty()) {
+        return false;
+    }
+    ResourceList& list = get_ListOf_ResourceLists().find_orCreate(listName);
+    if (list.get_DisplayName().empty()) {
+        list.set_DisplayName(listName);
+    }
+    list.insert(resource);
+    return true;
+}
+
+std::string const& Resource::__StringValue() const { return get_UniqueID(); }
+
+} // namespace VPD
+} // namespace Quorvex

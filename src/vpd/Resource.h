@@ -1,0 +1,42 @@
+#pragma once
+
+#include "vpd/Base.h"
+#include "vpd/Base_StringValue.h"
+#include "vpd/Resource_ContainerInterface_Attributes.h"
+#include "vpd/Resource_ContainerInterface_ListOf_Properties.h"
+#include "vpd/Resource_ContainerInterface_ListOf_PropertyGroups.h"
+#include "vpd/Resource_ContainerInterface_ListOf_ResourceLists.h"
+
+#include <string>
+
+namespace Quorvex {
+namespace VPD {
+
+// One surveyed thing (machine, partition, card): display name, unique ID,
+// references, properties, property groups and named lists of further
+// resources, nested to any depth. Keyed by its unique ID. Copies are deep.
+// Reading its resource lists needs vpd/ResourceList.h.
+class Resource : public Base,
+                 public Base_StringValue,
+                 public Resource_ContainerInterface_ListOf_Properties,
+                 public Resource_ContainerInterface_ListOf_PropertyGroups,
+                 public Resource_ContainerInterface_ListOf_ResourceLists,
+                 public Resource_ContainerInterface_Attributes {
+public:
+    Resource();
+    Resource(std::string const& displayName, std::string const& uniqueID);
+
+    // Joins other into this resource when both have the same unique ID, and
+    // silently does nothing otherwise. Content already here wins per key;
+    // display name and references never change.
+    Resource& operator+=(Resource const& other);
+
+    // Adds resource to the list named listName, making that list when it is
+    // missing; false, and nothing added, for an empty list name.
+    bool insert_Resource(std::string const& listName, Resource const& resource);
+
+    std::string const& __StringValue() const override;
+};
+
+} // namespace VPD
+} // namespace Quorvex
