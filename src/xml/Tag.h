@@ -1,0 +1,44 @@
+#pragma once
+
+#include <string>
+
+namespace XML {
+
+// The kind of an element's tag, as a code into the tag table from which the
+// writer takes every delimiter it writes.
+class Tag {
+public:
+    static constexpr unsigned long Type_Undefined = 0;
+    static constexpr unsigned long Type_BeginTag = 1;
+    static constexpr unsigned long Type_EmptyElementTag = 2;
+    static constexpr unsigned long Type_EndTag = 3;
+    static constexpr unsigned long Type_String = 4;
+    static constexpr unsigned long Type_Content = 5;
+    static constexpr unsigned long Type_Comment = 6;
+    static constexpr unsigned long Type_Declaration = 7;
+
+    Tag();
+    explicit Tag(unsigned long const& type);
+
+    Tag& operator=(unsigned long const& type);
+
+    unsigned long const& get_Type() const;
+    void set_Type(unsigned long const& type);
+
+    // Codes above Type_Declaration have no row: asking them is a caller's error.
+    std::string get_BeginTag_StartDelimiter() const;
+    std::string get_BeginTag_EndDelimiter() const;
+    bool has_EndTag() const;
+    // Empty for a kind that has no end tag.
+    std::string get_EndTag_StartDelimiter() const;
+    std::string get_EndTag_EndDelimiter() const;
+
+private:
+    unsigned long _Type;
+};
+
+bool operator==(Tag const& a, Tag const& b);
+bool operator==(Tag const& tag, unsigned long const& type);
+bool operator!=(Tag const& tag, unsigned long const& type);
+
+} // namespace XML
