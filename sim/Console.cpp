@@ -1,0 +1,173 @@
+#include "Console.h"
+
+#include "InvocationLog.h"
+#include "RemoteActionRequest.h"
+#include "Scenario.h"
+
+#include <chrono>
+#include <cstdlib>
+#include <fstream>
+#include <iostream>
+#include <thread>
+
+namespace PylonSim
+{
+
+namespace
+{
+
+constexpr char gc_ScenarioVariable[] = "PYLON_SIM_SCENARIO";
+constexpr char gc_LogVariable[] = "PYLON_SIM_LOG";
+// The console's get-file action places its file relative to this folder.
+constexpr char gc_QuorvexFolder[] = "/var/adm/quorvex/";
+constexpr char gc_UnknownActionLine[] = "Rc::3::RcCmd::0::RetStr1::unknown action::RetStr2::\n";
+constexpr char const* gc_Actions[] = {"runCmdOnPartition", "getFileFromPartition",
+                                      "putFileToPartition"};
+
+std::string _environment(char const* name)
+{
+    char const* value = std::getenv(name);
+    return value == nullptr ? "" : value;
+}
+
+bool _isAction(std::string const& action)
+{
+    for (char const* known : gc_Actions)
+    {
+        if (action == known)
+        {
+            return true;
+        }
+    }
+    return false;
+}
+
+// Without PYLON_SIM_SCENARIO every tool answers nothing and exits 0.
+Scenario _loadScenario()
+{
+    std::string const fileName = _environment(gc_ScenarioVariable);
+    return fileName.empty() ? Scenario() : Scenario::load(fileName);
+}
+
+void _wait(double seconds)
+{
+    if (seconds > 0.0)
+    {
+        std::this_thread::sleep_for(std::chrono::duration<double>(seconds));
+    }
+}
+
+int _print(Response const& response, std::string const& diagnostic)
+{
+    std::cout.write(response.stdoutText.data(), static_cast<std::streamsize>(response.stdoutText.size()));
+    std::cout.flush();
+    std::cerr << diagnostic;
+    std::cerr.write(response.stderrText.data(), static_cast<std::streamsize>(response.stderrText.size()));
+    std::cerr.flush();
+    return response.exitCode;
+}
+
+// The identity after the first "-c"; "*" (the default section) without one.
+std::string _identity(std::vector<std::string> const& arguments)
+{
+    for (std::size_t i = 0; i + 1 < arguments.size(); ++i)
+    {
+        if (arguments[i] == "-c")
+        {
+            return arguments[i + 1];
+        }
+    }
+    return "*";
+}
+
+}  // namespace
+
+bool Console::isTool(std::string const& name)
+{
+    return name == "lsvtc" || name == "lspartition" || name == "runact-api";
+}
+
+int Console::answer(std::string const& tool, std::vector<std::string> const& arguments)
+{
+    _log(tool, arguments);
+    try
+    {
+        return tool == "runact-api" ? _answerRemoteAction(arguments) : _answerListing(tool, arguments);
+    }
+    catch (ScenarioError const& error)
+    {
+        _reportBadScenario(error.describe());
+        return gc_ExitBadScenario;
+    }
+}
+
+int Console::check(std::string const& fileName)
+{
+    try
+    {
+        Scenario::load(fileName);
+        return 0;
+    }
+    catch (ScenarioError const& error)
+    {
+        _reportBadScenario(error.describe());
+        return gc_ExitBadScenario;
+    }
+}
+
+void Console::_log(std::string const& tool, std::vector<std::string> const& arguments)
+{
+    std::string const fileName = _environment(gc_LogVariable);
+    if (!fileName.empty() && !InvocationLog::append(fileName, InvocationLog::formatLine(tool, arguments)))
+    {
+        std::cerr << "pylon-sim: cannot append to the invocation log " << fileName << std::endl;
+    }
+}
+
+void Console::_reportBadScenario(std::string const& description)
+{
+    std::cerr << "pylon-sim: bad scenario: " << description << std::endl;
+}
+
+int Console::_answerListing(std::string const& tool, std::vector<std::string> const& arguments)
+{
+    Scenario const scenario = _loadScenario();
+    std::string const name = tool == "lsvtc" ? "" : _identity(arguments);
+    Response const response = scenario.find(tool, name);
+    _wait(response.delay.value_or(scenario.get_DefaultDelay()));
+    return _print(response, "");
+}
+
+int Console::_answerRemoteAction(std::vector<std::string> const& arguments)
+{
+    Scenario const scenario = _loadScenario();
+    RemoteActionRequest const request(arguments);
+    if (!_isAction(request.get_Action()))
+    {
+        Response unknown;
+        unknown.stdoutText = gc_UnknownActionLine;
+        unknown.exitCode = gc_ExitUnknownAction;
+        _wait(scenario.get_DefaultDelay());
+        return _print(unknown, "runact-api: unknown action \"" + request.get_Action() + "\"\n");
+    }
+    Response const response = scenario.find(request.get_Action(), request.get_PartitionID());
+    _wait(response.delay.value_or(scenario.get_DefaultDelay()));
+    std::string const diagnostic =
+        response.document ? _placeDocument(request, *response.document) : std::string();
+    return _print(response, diagnostic);
+}
+
+std::string Console::_placeDocument(RemoteActionRequest const& request, std::string const& document)
+{
+    if (!request.has_LocalFN())
+    {
+        return "runact-api: no LocalFN given, no document placed\n";
+    }
+    std::string const fileName = gc_QuorvexFolder + request.get_LocalFN();
+    std::ofstream out(fileName, std::ios::binary | std::ios::trunc);
+    out.write(document.data(), static_cast<std::streamsize>(document.size()));
+    out.close();
+    return out ? "" : "runact-api: cannot write " + fileName + "\n";
+}
+
+}  // namespace PylonSim

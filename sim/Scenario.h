@@ -1,0 +1,62 @@
+#pragma once
+// The scenario of the simulated console: how each console tool answers.
+// The file format is described in sim/README.md.
+
+#include <map>
+#include <optional>
+#include <string>
+
+namespace PylonSim
+{
+
+// One answer of a console tool.
+struct Response
+{
+    std::string stdoutText;
+    std::string stderrText;
+    int exitCode = 0;
+    // Seconds to wait before answering; unset takes the scenario's default.
+    std::optional<double> delay;
+    // The client document that getFileFromPartition places; unset: none.
+    std::optional<std::string> document;
+};
+
+// A scenario file that cannot be used; carries the line it was found on
+// (0 when the file itself cannot be read).
+struct ScenarioError
+{
+    std::string fileName;
+    unsigned long line = 0;
+    std::string problem;
+
+    // "<file>:<line>: <problem>", or "<file>: <problem>" without a line.
+    std::string describe() const;
+};
+
+class Scenario
+{
+public:
+    // The empty scenario: every tool prints nothing and exits 0.
+    Scenario() = default;
+
+    // Reads and checks a whole scenario file; throws ScenarioError.
+    static Scenario load(std::string const& fileName);
+
+    // The answer of a section such as "lspartition 1234-ABC_10ABCDE", else of
+    // the tool's default section ("lspartition *"), else the empty answer.
+    Response find(std::string const& tool, std::string const& name) const;
+
+    // Delay of every answer whose section sets none.
+    double get_DefaultDelay() const;
+
+private:
+    friend class ScenarioParser;
+
+    void _insert(std::string const& tool, std::string const& name, Response const& response);
+    bool _contains(std::string const& tool, std::string const& name) const;
+
+    double _defaultDelay = 0.0;
+    std::map<std::string, Response> _sections;
+};
+
+}  // namespace PylonSim
