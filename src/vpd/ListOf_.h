@@ -19,6 +19,18 @@ public:
     using iterator = typename std::map<std::string, T>::iterator;
     using const_iterator = typename std::map<std::string, T>::const_iterator;
 
+    ListOf_() = default;
+    ListOf_(ListOf_ const& other) = default;
+    ListOf_(ListOf_&& other) = default;
+    // Copies before it lets the old content go: other may live inside it.
+    ListOf_& operator=(ListOf_ const& other) {
+        std::map<std::string, T> copy(other._Elements);
+        _Elements.swap(copy);
+        return *this;
+    }
+    ListOf_& operator=(ListOf_&& other) = default;
+    ~ListOf_() = default;
+
     void insert(T const& element) {
         auto const placed = _Elements.try_emplace(element.__StringValue(), element);
         if (!placed.second) {
@@ -51,7 +63,7 @@ public:
         return *this;
     }
 
-    void assign(ListOf_ const& other) { _Elements = other._Elements; }
+    void assign(ListOf_ const& other) { *this = other; }
 
     std::size_t size() const { return _Elements.size(); }
     bool empty() const { return _Elements.empty(); }

@@ -10,6 +10,21 @@ Resource::Resource() = default;
 Resource::Resource(std::string const& displayName, std::string const& uniqueID)
     : Base(displayName), Resource_ContainerInterface_Attributes(uniqueID, std::string()) {}
 
+Resource::Resource(Resource const& other) = default;
+
+// The lists go last: other may live inside them, and their assignment copies
+// other's lists before it lets the old ones go.
+Resource& Resource::operator=(Resource const& other) {
+    Base::operator=(other);
+    Resource_ContainerInterface_ListOf_Properties::operator=(other);
+    Resource_ContainerInterface_ListOf_PropertyGroups::operator=(other);
+    Resource_ContainerInterface_Attributes::operator=(other);
+    Resource_ContainerInterface_ListOf_ResourceLists::operator=(other);
+    return *this;
+}
+
+Resource::~Resource() = default;
+
 Resource& Resource::operator+=(Resource const& other) {
     if (other.get_UniqueID() != get_UniqueID()) {
         return *this;

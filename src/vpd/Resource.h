@@ -25,6 +25,10 @@ class Resource : public Base,
 public:
     Resource();
     Resource(std::string const& displayName, std::string const& uniqueID);
+    Resource(Resource const& other);
+    // Safe when other lives inside this resource's own lists.
+    Resource& operator=(Resource const& other);
+    ~Resource();
 
     // Joins other into this resource when both have the same unique ID, and
     // silently does nothing otherwise. Content already here wins per key;
