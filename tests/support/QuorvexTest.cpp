@@ -6,6 +6,7 @@
 #include <fcntl.h>
 #include <filesystem>
 #include <fstream>
+#include <set>
 #include <sstream>
 #include <stdexcept>
 #include <sys/stat.h>
@@ -89,6 +90,26 @@ std::string _unescape(std::string const& field)
         text += next == 't' ? '\t' : next == 'n' ? '\n' : next;
     }
     return text;
+}
+
+// The folders of the current scenario and invocation log: a nested sandbox
+// gets a /tmp of its own and would not see them otherwise.
+std::set<std::string> _simulatorFolders()
+{
+    std::set<std::string> folders;
+    for (char const* variable : {gc_ScenarioVariable, gc_LogVariable})
+    {
+        char const* path = std::getenv(variable);
+        if (path != nullptr && *path != '\0')
+        {
+            std::string const folder = std::filesystem::path(path).parent_path().string();
+            if (!folder.empty() && fileExists(folder))
+            {
+                folders.insert(folder);
+            }
+        }
+    }
+    return folders;
 }
 
 Invocation _parseLogLine(std::string const& line)
@@ -225,6 +246,11 @@ CommandResult runInSandbox(std::vector<std::string> const& sandboxOptions,
                            std::vector<std::string> const& command)
 {
     std::vector<std::string> argv{sandboxPath(), "--sim", simulatorPath()};
+    for (std::string const& folder : _simulatorFolders())
+    {
+        argv.push_back("--bind");
+        argv.push_back(folder + ":" + folder);
+    }
     argv.insert(argv.end(), sandboxOptions.begin(), sandboxOptions.end());
     argv.push_back("--");
     argv.insert(argv.end(), command.begin(), command.end());

@@ -62,7 +62,9 @@ CommandResult runCommand(std::vector<std::string> const& argv);
 CommandResult runShell(std::string const& commandLine);
 // Runs a command in a sandbox of its own, with the simulator installed and
 // extra sandbox options such as "--readonly-tmp" (see tools/sandbox --help).
-// Works on the host and, nested, inside a sandboxed test.
+// Works on the host and, nested, inside a sandboxed test; the folders of the
+// current scenario and invocation log (see SimulatedConsole) are bound into
+// the new sandbox at the same paths.
 CommandResult runInSandbox(std::vector<std::string> const& sandboxOptions,
                            std::vector<std::string> const& command);
 
