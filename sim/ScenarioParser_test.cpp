@@ -23,15 +23,21 @@ protected:
     // The error that loading the text raises.
     ScenarioError errorOf(std::string const& text)
     {
+        QuorvexTest::writeFile(path(), text);
+        return errorLoading(path());
+    }
+
+    static ScenarioError errorLoading(std::string const& fileName)
+    {
         try
         {
-            load(text);
+            Scenario::load(fileName);
         }
         catch (ScenarioError const& error)
         {
             return error;
         }
-        ADD_FAILURE() << "scenario accepted:\n" << text;
+        ADD_FAILURE() << "scenario accepted: " << fileName;
         return ScenarioError();
     }
 
@@ -153,32 +159,14 @@ TEST_F(ScenarioFile, CommentsAndBlankLinesAreIgnored)
 
 TEST_F(ScenarioFile, MissingFileIsReportedWithoutLine)
 {
-    ScenarioError const error = [this] {
-        try
-        {
-            Scenario::load(folder.file("missing.scn"));
-        }
-        catch (ScenarioError const& caught)
-        {
-            return caught;
-        }
-        return ScenarioError();
-    }();
+    ScenarioError const error = errorLoading(folder.file("missing.scn"));
     EXPECT_EQ(0u, error.line);
     EXPECT_EQ(folder.file("missing.scn") + ": cannot read the scenario file", error.describe());
 }
 
 TEST_F(ScenarioFile, FolderIsNotAScenario)
 {
-    try
-    {
-        Scenario::load(folder.path());
-        ADD_FAILURE() << "a folder was accepted";
-    }
-    catch (ScenarioError const& error)
-    {
-        EXPECT_EQ(folder.path() + ": cannot read the scenario file", error.describe());
-    }
+    EXPECT_EQ(folder.path() + ": cannot read the scenario file", errorLoading(folder.path()).describe());
 }
 
 TEST_F(ScenarioFile, ErrorNamesFileLineAndProblem)
