@@ -1,0 +1,72 @@
+#include "pylon/PylonTest_Utility.h"
+
+#include "utility/Trace.h"
+
+#include "QuorvexTest.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <regex>
+#include <sstream>
+
+namespace PylonTest_Utility {
+
+namespace {
+
+constexpr char gc_TraceFolder[] = "/var/adm/quorvex/Trace/";
+constexpr char gc_CommandHeader[] = "****** ShellCommand::execute ******";
+
+std::string _u_normalised(std::string const& text) {
+    static std::regex const generated("(/tmp/ShellCommand\\.)[A-Za-z0-9]{6}");
+    return std::regex_replace(text, generated, "$1XXXXXX");
+}
+
+} // namespace
+
+std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Machines const& machines) {
+    std::vector<std::string> described;
+    for (auto const& machine : machines) {
+        described.push_back(std::to_string(machine.get_ObjectType()) + "|" +
+                            machine.get_MTMS().get_MachineType_Model() + "|" +
+                            machine.get_MTMS().get_Serial());
+    }
+    return described;
+}
+
+std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Partitions const& partitions) {
+    std::vector<std::string> described;
+    for (auto const& partition : partitions) {
+        described.push_back(std::string(partition.get_MTMS()) + "|" + partition.get_PartitionID() +
+                            "|" + partition.get_IP() + "|" + partition.get_ActiveStatus() + "|" +
+                            partition.get_HostName() + "|" +
+                            partition.get_OperatingSystem_Name() + "|" +
+                            partition.get_OperatingSystem_Version());
+    }
+    return described;
+}
+
+std::vector<std::string> u_tracedCommandLines(std::string const& traceName,
+                                              std::function<void()> const& work) {
+    std::string const path = gc_TraceFolder + traceName;
+    EXPECT_EXIT(
+        {
+            {
+                ::Utility::Trace trace(path);
+                work();
+            }
+            std::exit(0);
+        },
+        ::testing::ExitedWithCode(0), "");
+    std::istringstream lines(_u_normalised(QuorvexTest::readFile(path)));
+    std::vector<std::string> commandLines;
+    std::string line;
+    while (std::getline(lines, line)) {
+        if (line == gc_CommandHeader && std::getline(lines, line)) {
+            commandLines.push_back(line);
+        }
+    }
+    return commandLines;
+}
+
+} // namespace PylonTest_Utility

@@ -1,0 +1,27 @@
+#pragma once
+// Helpers of the console listing tests: readable forms of the parsed records
+// and the command lines that the shell command runner traced.
+
+#include "pylon/ListOf_Machines.h"
+#include "pylon/ListOf_Partitions.h"
+
+#include <functional>
+#include <string>
+#include <vector>
+
+namespace PylonTest_Utility {
+
+// "objectType|typeModel|serial" for every machine, in list order.
+std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Machines const& machines);
+
+// "MTMS|PartitionID|IP|ActiveStatus|HostName|OS name|OS version" for every
+// record, in list order.
+std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Partitions const& partitions);
+
+// Runs work in a child process whose trace file is traceName in the trace
+// folder, and returns the command lines traced there, with the generated part
+// of each temporary file name replaced by "XXXXXX".
+std::vector<std::string> u_tracedCommandLines(std::string const& traceName,
+                                              std::function<void()> const& work);
+
+} // namespace PylonTest_Utility
