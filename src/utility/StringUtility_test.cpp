@@ -1,0 +1,96 @@
+#include "utility/StringUtility.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+namespace {
+
+using Pieces = std::vector<std::string>;
+
+TEST(StringUtility_splitString, TrailingDelimiterGivesNoTrailingEmptyPiece) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString("a;b;", ";", pieces), 2);
+    EXPECT_EQ(pieces, (Pieces{"a", "b"}));
+}
+
+TEST(StringUtility_splitString, LeadingDelimiterKeepsLeadingEmptyPiece) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString(";a", ";", pieces), 2);
+    EXPECT_EQ(pieces, (Pieces{"", "a"}));
+}
+
+TEST(StringUtility_splitString, DoubledDelimiterKeepsInnerEmptyPiece) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString("a;;b", ";", pieces), 3);
+    EXPECT_EQ(pieces, (Pieces{"a", "", "b"}));
+}
+
+TEST(StringUtility_splitString, DelimiterAloneGivesOneEmptyPiece) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString(";", ";", pieces), 1);
+    EXPECT_EQ(pieces, (Pieces{""}));
+}
+
+TEST(StringUtility_splitString, MultiCharacterDelimiterMatchesAsWholeString) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString("a::b:c", "::", pieces), 2);
+    EXPECT_EQ(pieces, (Pieces{"a", "b:c"}));
+}
+
+TEST(StringUtility_splitString, EmptyTextReturnsZeroAndLeavesPiecesUntouched) {
+    Pieces pieces{"kept", "too"};
+    EXPECT_EQ(StringUtility::splitString("", ";", pieces), 0);
+    EXPECT_EQ(pieces, (Pieces{"kept", "too"}));
+}
+
+TEST(StringUtility_splitString, EmptyDelimiterReturnsZeroAndLeavesPiecesUntouched) {
+    Pieces pieces{"kept"};
+    EXPECT_EQ(StringUtility::splitString("abc", "", pieces), 0);
+    EXPECT_EQ(pieces, (Pieces{"kept"}));
+}
+
+TEST(StringUtility_splitString, TextWithoutDelimiterGivesWholeText) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString("abc", ";", pieces), 1);
+    EXPECT_EQ(pieces, (Pieces{"abc"}));
+}
+
+TEST(StringUtility_splitString, ReplacesEarlierPieces) {
+    Pieces pieces{"old", "older", "oldest"};
+    EXPECT_EQ(StringUtility::splitString("x;y", ";", pieces), 2);
+    EXPECT_EQ(pieces, (Pieces{"x", "y"}));
+}
+
+TEST(StringUtility_splitString, MatchIsCaseSensitive) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString("aXbxc", "x", pieces), 2);
+    EXPECT_EQ(pieces, (Pieces{"aXb", "c"}));
+}
+
+TEST(StringUtility_splitString, SearchRestartsAfterEachDelimiter) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString("a:::b", "::", pieces), 2);
+    EXPECT_EQ(pieces, (Pieces{"a", ":b"}));
+}
+
+TEST(StringUtility_splitString, ConsoleLineWithEmptyFields) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString("Rc::0::::RetStr1::done::", "::", pieces), 5);
+    EXPECT_EQ(pieces, (Pieces{"Rc", "0", "", "RetStr1", "done"}));
+}
+
+TEST(StringUtility_splitString, DelimiterOnlyTextGivesEmptyPiecesWithoutTrailingOne) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString(";;;", ";", pieces), 3);
+    EXPECT_EQ(pieces, (Pieces{"", "", ""}));
+}
+
+TEST(StringUtility_splitString, DelimiterLongerThanTextGivesText) {
+    Pieces pieces;
+    EXPECT_EQ(StringUtility::splitString("a", "::::", pieces), 1);
+    EXPECT_EQ(pieces, (Pieces{"a"}));
+}
+
+} // namespace
