@@ -370,8 +370,7 @@ TEST(SimulatedConsole, MalformedScenarioIsRejectedByEveryTool)
 
 TEST(SimulatedConsole, MissingScenarioFileIsRejected)
 {
-    SimulatedConsole console("");
-    ::setenv("PYLON_SIM_SCENARIO", "/nonexistent.scn", 1);
+    SimulatedConsole console(QuorvexTest::ScenarioFile{"/nonexistent.scn"});
     _expectAnswer(runCommand({gc_Lsvtc, "-t0"}), "",
                   "pylon-sim: bad scenario: /nonexistent.scn: cannot read the scenario file\n", gc_ExitBadScenario);
 }
@@ -396,8 +395,7 @@ TEST(SimulatedConsole, OtherNamesGetTheUsage)
 
 TEST(SimulatedConsole, DemoScenarioAnswersASurveyOfItsMachine)
 {
-    SimulatedConsole console("");
-    ::setenv("PYLON_SIM_SCENARIO", QuorvexTest::shippedScenario("demo.scn").c_str(), 1);
+    SimulatedConsole console(QuorvexTest::ScenarioFile{QuorvexTest::shippedScenario("demo.scn")});
     EXPECT_EQ("1,10.20.30.41,3,aurora,Zeph,7.2;2,10.20.30.42,3,boreas,Zeph,7.3;3,10.20.30.43,1,cirrus,Zeph,7.1;"
               "4,10.20.30.44,3,delta,Zeph,7.2;5,10.20.30.45,3,eos,Linux,5.14;6,10.20.30.46,3,fjord,Zeph,7.3;"
               "7,10.20.30.47,3,,Zeph,7.2;\n",
@@ -415,8 +413,7 @@ TEST(SimulatedConsole, DemoScenarioAnswersASurveyOfItsMachine)
 
 TEST(SimulatedConsole, SeveralMachinesScenarioListsObjectTypesZeroAndTwo)
 {
-    SimulatedConsole console("");
-    ::setenv("PYLON_SIM_SCENARIO", QuorvexTest::shippedScenario("several-machines.scn").c_str(), 1);
+    SimulatedConsole console(QuorvexTest::ScenarioFile{QuorvexTest::shippedScenario("several-machines.scn")});
     EXPECT_EQ("0:9119-MHE_21ABCDE;2:7063-CR2_06HMC01;0:8286-42A_10XYZ99;\n",
               runShell("/opt/lsvtc/bin/lsvtc -t0").stdoutText);
     EXPECT_EQ("1,10.40.50.61,3,gemini,Linux,5.14;3,10.40.50.63,2,hydra,Zeph,7.1;\n",
@@ -425,7 +422,6 @@ TEST(SimulatedConsole, SeveralMachinesScenarioListsObjectTypesZeroAndTwo)
 
 TEST(SimulatedConsole, EmptyScenarioListsNoPartitions)
 {
-    SimulatedConsole console("");
-    ::setenv("PYLON_SIM_SCENARIO", QuorvexTest::shippedScenario("empty.scn").c_str(), 1);
+    SimulatedConsole console(QuorvexTest::ScenarioFile{QuorvexTest::shippedScenario("empty.scn")});
     _expectAnswer(runShell("/opt/vtc/bin/lspartition -ix -c 9119-MHE_21ABCDE"), "", "", 0);
 }

@@ -262,6 +262,18 @@ SimulatedConsole::SimulatedConsole(std::string const& scenarioText)
     , _logPath(_directory.file("invocations.log"))
 {
     writeFile(_scenarioPath, scenarioText);
+    _activate();
+}
+
+SimulatedConsole::SimulatedConsole(ScenarioFile const& scenario)
+    : _scenarioPath(scenario.path)
+    , _logPath(_directory.file("invocations.log"))
+{
+    _activate();
+}
+
+void SimulatedConsole::_activate() const
+{
     ::setenv(gc_ScenarioVariable, _scenarioPath.c_str(), 1);
     ::setenv(gc_LogVariable, _logPath.c_str(), 1);
 }

@@ -68,6 +68,12 @@ CommandResult runShell(std::string const& commandLine);
 CommandResult runInSandbox(std::vector<std::string> const& sandboxOptions,
                            std::vector<std::string> const& command);
 
+// Names an existing scenario file, such as shippedScenario("demo.scn").
+struct ScenarioFile
+{
+    std::string path;
+};
+
 // One call of a console tool as the simulator logged it: the tool's base name
 // followed by every argument it received.
 using Invocation = std::vector<std::string>;
@@ -75,12 +81,15 @@ using Invocation = std::vector<std::string>;
 // Points the simulator at a scenario and a fresh, empty invocation log for as
 // long as the object lives, by setting PYLON_SIM_SCENARIO and PYLON_SIM_LOG in
 // this process (children inherit them). The scenario format is described in
-// sim/README.md; "document-file" paths are relative to directory().
+// sim/README.md; "document-file" paths are relative to the scenario file,
+// which for a scenario text lies in directory().
 class SimulatedConsole
 {
 public:
     // Writes the scenario text into a temporary file.
     explicit SimulatedConsole(std::string const& scenarioText);
+    // Uses an existing scenario file as it is.
+    explicit SimulatedConsole(ScenarioFile const& scenario);
     ~SimulatedConsole();
     SimulatedConsole(SimulatedConsole const&) = delete;
     SimulatedConsole& operator=(SimulatedConsole const&) = delete;
@@ -95,6 +104,8 @@ public:
     std::vector<Invocation> invocations() const;
 
 private:
+    void _activate() const;
+
     TemporaryDirectory _directory;
     std::string _scenarioPath;
     std::string _logPath;
