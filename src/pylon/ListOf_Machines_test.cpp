@@ -125,6 +125,14 @@ TEST(ListOf_Machines, FailingToolWithoutOutputGivesEmptyList) {
     EXPECT_EQ(machinesWith("[lsvtc]\nstderr lsvtc: console not ready\nexit 1\n"), Strings{});
 }
 
+TEST(ListOf_Machines, CommandThatCannotRunGivesEmptyList) {
+    SimulatedConsole const console("[lsvtc]\nstdout 0:1234-ABC_10ABCDE;\n");
+    EXPECT_EXIT(PylonTest_Utility::u_exitWithReadOnlyTmp([] { return ListOf_Machines().empty(); }),
+                ::testing::ExitedWithCode(0), "");
+    // The same console answers once /tmp is writable.
+    EXPECT_EQ(u_describe(ListOf_Machines()), Strings{"0|1234-ABC|10ABCDE"});
+}
+
 TEST(ListOf_Machines, LastLineWithoutLineEndIsRead) {
     EXPECT_EQ(machinesWith("[lsvtc]\nstdout-nolf 0:A-1_S1\n"), Strings{"0|A-1|S1"});
 }

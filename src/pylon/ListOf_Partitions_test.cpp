@@ -148,6 +148,20 @@ TEST(ListOf_Partitions, FailingToolWithoutOutputAppendsNothing) {
     EXPECT_EQ(partitionsWith("[lspartition *]\nstderr no such machine\nexit 1\n"), Strings{});
 }
 
+TEST(ListOf_Partitions, CommandThatCannotRunAppendsNothing) {
+    SimulatedConsole const console("[lspartition *]\nstdout 1,a;\n");
+    EXPECT_EXIT(PylonTest_Utility::u_exitWithReadOnlyTmp([] {
+                    ListOf_Partitions partitions;
+                    partitions.getPartitions_FromMachine(machine());
+                    return partitions.empty();
+                }),
+                ::testing::ExitedWithCode(0), "");
+    // The same console answers once /tmp is writable.
+    ListOf_Partitions partitions;
+    partitions.getPartitions_FromMachine(machine());
+    EXPECT_EQ(u_describe(partitions), Strings{"1234-ABC_10ABCDE|1|a||||"});
+}
+
 TEST(ListOf_Partitions, OddRecordsAreTakenAsFarAsTheyGo) {
     EXPECT_EQ(partitionsFromLine(";;,;,,,;x;;,a"),
               (Strings{"1234-ABC_10ABCDE||||||", "1234-ABC_10ABCDE||||||",

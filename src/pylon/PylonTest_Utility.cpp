@@ -8,7 +8,9 @@
 
 #include <cstdlib>
 #include <regex>
+#include <sched.h>
 #include <sstream>
+#include <sys/mount.h>
 
 namespace PylonTest_Utility {
 
@@ -16,10 +18,21 @@ namespace {
 
 constexpr char gc_TraceFolder[] = "/var/adm/quorvex/Trace/";
 constexpr char gc_CommandHeader[] = "****** ShellCommand::execute ******";
+constexpr char gc_TemporaryFolder[] = "/tmp";
+constexpr int gc_ExitCheckFailed = 1;
+constexpr int gc_ExitNoReadOnlyTmp = 2;
 
 std::string _u_normalised(std::string const& text) {
     static std::regex const generated("(/tmp/ShellCommand\\.)[A-Za-z0-9]{6}");
     return std::regex_replace(text, generated, "$1XXXXXX");
+}
+
+bool _u_makeTmpReadOnly() {
+    return ::unshare(CLONE_NEWNS) == 0 &&
+           ::mount(nullptr, "/", nullptr, MS_REC | MS_PRIVATE, nullptr) == 0 &&
+           ::mount(gc_TemporaryFolder, gc_TemporaryFolder, nullptr, MS_BIND, nullptr) == 0 &&
+           ::mount(nullptr, gc_TemporaryFolder, nullptr, MS_REMOUNT | MS_BIND | MS_RDONLY,
+                   nullptr) == 0;
 }
 
 } // namespace
@@ -67,6 +80,13 @@ std::vector<std::string> u_tracedCommandLines(std::string const& traceName,
         }
     }
     return commandLines;
+}
+
+void u_exitWithReadOnlyTmp(std::function<bool()> const& check) {
+    if (!_u_makeTmpReadOnly()) {
+        std::exit(gc_ExitNoReadOnlyTmp);
+    }
+    std::exit(check() ? 0 : gc_ExitCheckFailed);
 }
 
 } // namespace PylonTest_Utility

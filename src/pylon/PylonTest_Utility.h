@@ -24,4 +24,10 @@ std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Partitions const& p
 std::vector<std::string> u_tracedCommandLines(std::string const& traceName,
                                               std::function<void()> const& work);
 
+// For use as the statement of EXPECT_EXIT: in a mount namespace of its own,
+// makes /tmp read-only (its files stay readable), so that no shell command can
+// make its output files, then exits with 0 when check() holds, 1 when it does
+// not and 2 when /tmp could not be made read-only.
+void u_exitWithReadOnlyTmp(std::function<bool()> const& check);
+
 } // namespace PylonTest_Utility
