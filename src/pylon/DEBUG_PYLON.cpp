@@ -14,8 +14,7 @@ void print_Partition(::Quorvex::System::Partition const& partition) {
     std::cout << " IP                      : " << partition.get_IP() << std::endl;
     std::cout << " ActiveStatus            : " << partition.get_ActiveStatus() << std::endl;
     std::cout << " HostName                : " << partition.get_HostName() << std::endl;
-    std::cout << " OperatingSystem_Name    : " << partition.get_OperatingSystem_Name()
-              << std::endl;
+    std::cout << " OperatingSystem_Name    : " << partition.get_OperatingSystem_Name() << std::endl;
     std::cout << " OperatingSystem_Version : " << partition.get_OperatingSystem_Version()
               << std::endl;
 }

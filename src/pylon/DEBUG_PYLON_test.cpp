@@ -36,14 +36,15 @@ Partition record(std::string const& id, std::string const& host) {
 }
 
 std::string printedRecord(std::string const& id, std::string const& host) {
-    return "----------------------------------------\n"
-           " MTMS                    : 1234-ABC_10ABCDE\n"
-           " PartitionID             : " + id + "\n"
-           " IP                      : 10.1.1.1" + id + "\n"
-           " ActiveStatus            : 1\n"
-           " HostName                : " + host + "\n"
-           " OperatingSystem_Name    : Zeph\n"
-           " OperatingSystem_Version : 5.3\n";
+    std::string text = "----------------------------------------\n";
+    text += " MTMS                    : 1234-ABC_10ABCDE\n";
+    text += " PartitionID             : " + id + "\n";
+    text += " IP                      : 10.1.1.1" + id + "\n";
+    text += " ActiveStatus            : 1\n";
+    text += " HostName                : " + host + "\n";
+    text += " OperatingSystem_Name    : Zeph\n";
+    text += " OperatingSystem_Version : 5.3\n";
+    return text;
 }
 
 } // namespace

@@ -21,7 +21,9 @@ constexpr int gc_Minimum_Fields = 2;
 
 } // namespace
 
-ListOf_Machines::ListOf_Machines() { _initialize(); }
+ListOf_Machines::ListOf_Machines() {
+    _initialize();
+}
 
 void ListOf_Machines::_initialize() {
     for (auto const& entry :

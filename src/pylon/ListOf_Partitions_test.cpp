@@ -20,7 +20,9 @@ using Strings = std::vector<std::string>;
 
 namespace {
 
-Machine machine() { return Machine(0U, MTMS("1234-ABC", "10ABCDE")); }
+Machine machine() {
+    return Machine(0U, MTMS("1234-ABC", "10ABCDE"));
+}
 
 // The partitions of machine() as the console of the scenario lists them.
 Strings partitionsWith(std::string const& scenario) {
@@ -63,11 +65,10 @@ TEST(ListOf_Partitions, RunsThePartitionToolForTheMachineIdentity) {
 
 TEST(ListOf_Partitions, CommandLineIsExactlyThePartitionToolWithTheMachineIdentity) {
     SimulatedConsole const console("[lspartition *]\n");
-    Strings const commandLines =
-        PylonTest_Utility::u_tracedCommandLines("partitions.Trace", [] {
-            ListOf_Partitions partitions;
-            partitions.getPartitions_FromMachine(machine());
-        });
+    Strings const commandLines = PylonTest_Utility::u_tracedCommandLines("partitions.Trace", [] {
+        ListOf_Partitions partitions;
+        partitions.getPartitions_FromMachine(machine());
+    });
     EXPECT_EQ(commandLines, Strings{"/opt/vtc/bin/lspartition -ix -c 1234-ABC_10ABCDE"
                                     " > /tmp/ShellCommand.XXXXXX 2> /tmp/ShellCommand.XXXXXX"});
 }

@@ -52,9 +52,8 @@ std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Partitions const& p
     for (auto const& partition : partitions) {
         described.push_back(std::string(partition.get_MTMS()) + "|" + partition.get_PartitionID() +
                             "|" + partition.get_IP() + "|" + partition.get_ActiveStatus() + "|" +
-                            partition.get_HostName() + "|" +
-                            partition.get_OperatingSystem_Name() + "|" +
-                            partition.get_OperatingSystem_Version());
+                            partition.get_HostName() + "|" + partition.get_OperatingSystem_Name() +
+                            "|" + partition.get_OperatingSystem_Version());
     }
     return described;
 }

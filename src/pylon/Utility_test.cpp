@@ -23,14 +23,15 @@ using Strings = std::vector<std::string>;
 namespace {
 
 // Two partitioned machines printed out of order, and one other object.
-constexpr char gc_Console[] = "[lsvtc]\n"
-                              "stdout 0:5678-DEF_65XYZ12;2:4321-XYZ_10QRSTU;0:1234-ABC_10ABCDE;\n"
-                              "[lspartition 1234-ABC_10ABCDE]\n"
-                              "stdout 9,10.1.1.19,1,host9,Zeph,5.3;10,10.1.1.20,0,host10,Linux,2.6;\n"
-                              "[lspartition 5678-DEF_65XYZ12]\n"
-                              "stdout 2,10.2.2.2,1,b,Zeph,7.1;1,10.2.2.1,1,a,Zeph,7.1;\n"
-                              "[lspartition 4321-XYZ_10QRSTU]\n"
-                              "stdout 1,10.3.3.1,1,never,Zeph,7.1;\n";
+constexpr char gc_Console[] =
+    "[lsvtc]\n"
+    "stdout 0:5678-DEF_65XYZ12;2:4321-XYZ_10QRSTU;0:1234-ABC_10ABCDE;\n"
+    "[lspartition 1234-ABC_10ABCDE]\n"
+    "stdout 9,10.1.1.19,1,host9,Zeph,5.3;10,10.1.1.20,0,host10,Linux,2.6;\n"
+    "[lspartition 5678-DEF_65XYZ12]\n"
+    "stdout 2,10.2.2.2,1,b,Zeph,7.1;1,10.2.2.1,1,a,Zeph,7.1;\n"
+    "[lspartition 4321-XYZ_10QRSTU]\n"
+    "stdout 1,10.3.3.1,1,never,Zeph,7.1;\n";
 
 Invocation partitionListing(std::string const& identity) {
     return Invocation{"lspartition", "-ix", "-c", identity};
@@ -48,11 +49,10 @@ TEST(PYLON_Utility, AllManagedPartitionsAreListedSortedAndCounted) {
     SimulatedConsole const console(gc_Console);
     ListOf_Partitions partitions;
     EXPECT_EQ(get_AllManagedPartitions(partitions), 4);
-    EXPECT_EQ(u_describe(partitions),
-              (Strings{"1234-ABC_10ABCDE|10|10.1.1.20|0|host10|Linux|2.6",
-                       "1234-ABC_10ABCDE|9|10.1.1.19|1|host9|Zeph|5.3",
-                       "5678-DEF_65XYZ12|1|10.2.2.1|1|a|Zeph|7.1",
-                       "5678-DEF_65XYZ12|2|10.2.2.2|1|b|Zeph|7.1"}));
+    EXPECT_EQ(u_describe(partitions), (Strings{"1234-ABC_10ABCDE|10|10.1.1.20|0|host10|Linux|2.6",
+                                               "1234-ABC_10ABCDE|9|10.1.1.19|1|host9|Zeph|5.3",
+                                               "5678-DEF_65XYZ12|1|10.2.2.1|1|a|Zeph|7.1",
+                                               "5678-DEF_65XYZ12|2|10.2.2.2|1|b|Zeph|7.1"}));
 }
 
 TEST(PYLON_Utility, MachinesAreListedFirstThenPartitionedMachinesInSortedOrder) {
@@ -120,8 +120,9 @@ TEST(PYLON_Utility, MachineWhosePartitionToolFailsContributesNothing) {
 }
 
 TEST(PYLON_Utility, ObjectTypeThatWrapsToZeroIsListedAndMinusOneIsNot) {
-    SimulatedConsole const console("[lsvtc]\nstdout 4294967296:1234-ABC_10ABCDE;-1:5678-DEF_65XYZ12\n"
-                                   "[lspartition *]\nstdout 1,10.0.0.1;\n");
+    SimulatedConsole const console(
+        "[lsvtc]\nstdout 4294967296:1234-ABC_10ABCDE;-1:5678-DEF_65XYZ12\n"
+        "[lspartition *]\nstdout 1,10.0.0.1;\n");
     ListOf_Partitions partitions;
     EXPECT_EQ(get_AllManagedPartitions(partitions), 1);
     EXPECT_EQ(console.invocations(),

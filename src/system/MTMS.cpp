@@ -36,9 +36,13 @@ void MTMS::assign_TM_SE(std::string const& machineType_Model, std::string const&
     _Serial = _verify_SE(serial);
 }
 
-std::string const& MTMS::get_MachineType_Model() const { return _MachineType_Model; }
+std::string const& MTMS::get_MachineType_Model() const {
+    return _MachineType_Model;
+}
 
-std::string const& MTMS::get_Serial() const { return _Serial; }
+std::string const& MTMS::get_Serial() const {
+    return _Serial;
+}
 
 std::string MTMS::to_String(std::string const& separator) const {
     return _MachineType_Model + separator + _Serial;
@@ -52,9 +56,13 @@ std::string MTMS::to_String(std::string const& dashReplacement,
     return typeModel + separator + _Serial;
 }
 
-std::string MTMS::__StringValue() const { return to_String(gc_TM_SE_Delimiter); }
+std::string MTMS::__StringValue() const {
+    return to_String(gc_TM_SE_Delimiter);
+}
 
-MTMS::operator std::string() const { return __StringValue(); }
+MTMS::operator std::string() const {
+    return __StringValue();
+}
 
 std::string MTMS::_verify_TM(std::string machineType_Model) {
     if (machineType_Model.find(gc_ConsolePrefix) == 0) {
@@ -74,9 +82,13 @@ bool operator==(MTMS const& a, MTMS const& b) {
     return std::string(a) == std::string(b);
 }
 
-bool operator!=(MTMS const& a, MTMS const& b) { return !(a == b); }
+bool operator!=(MTMS const& a, MTMS const& b) {
+    return !(a == b);
+}
 
-bool operator<(MTMS const& a, MTMS const& b) { return std::string(a) < std::string(b); }
+bool operator<(MTMS const& a, MTMS const& b) {
+    return std::string(a) < std::string(b);
+}
 
 } // namespace System
 } // namespace Quorvex

@@ -58,8 +58,7 @@ TEST(MTMS, TypeModelWithoutDashGetsErrorAppendedToBoth) {
 }
 
 TEST(MTMS, TextFormIsNotCleanedOfConsolePrefix) {
-    expectFields(MTMS(std::string("ZOR*1234-ABC_ZOR*0210ABCDE")), "ZOR*1234-ABC",
-                 "ZOR*0210ABCDE");
+    expectFields(MTMS(std::string("ZOR*1234-ABC_ZOR*0210ABCDE")), "ZOR*1234-ABC", "ZOR*0210ABCDE");
 }
 
 TEST(MTMS, TwoStringConstructorDropsConsolePrefixOfFourAndSixCharacters) {

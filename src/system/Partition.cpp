@@ -23,29 +23,49 @@ Partition::Partition() = default;
 Partition::Partition(MTMS const& mtms, std::string const& partitionID, std::string const& hostName)
     : _MTMS(mtms), _PartitionID(partitionID), _HostName(hostName) {}
 
-MTMS const& Partition::get_MTMS() const { return _MTMS; }
+MTMS const& Partition::get_MTMS() const {
+    return _MTMS;
+}
 
-std::string const& Partition::get_PartitionID() const { return _PartitionID; }
+std::string const& Partition::get_PartitionID() const {
+    return _PartitionID;
+}
 
-std::string const& Partition::get_HostName() const { return _HostName; }
+std::string const& Partition::get_HostName() const {
+    return _HostName;
+}
 
-std::string const& Partition::get_IP() const { return _IP; }
+std::string const& Partition::get_IP() const {
+    return _IP;
+}
 
-std::string const& Partition::get_ActiveStatus() const { return _ActiveStatus; }
+std::string const& Partition::get_ActiveStatus() const {
+    return _ActiveStatus;
+}
 
-std::string const& Partition::get_OperatingSystem_Name() const { return _OperatingSystem_Name; }
+std::string const& Partition::get_OperatingSystem_Name() const {
+    return _OperatingSystem_Name;
+}
 
 std::string const& Partition::get_OperatingSystem_Version() const {
     return _OperatingSystem_Version;
 }
 
-void Partition::set_MTMS(MTMS const& mtms) { _MTMS = mtms; }
+void Partition::set_MTMS(MTMS const& mtms) {
+    _MTMS = mtms;
+}
 
-void Partition::set_PartitionID(std::string const& partitionID) { _PartitionID = partitionID; }
+void Partition::set_PartitionID(std::string const& partitionID) {
+    _PartitionID = partitionID;
+}
 
-void Partition::set_HostName(std::string const& hostName) { _HostName = hostName; }
+void Partition::set_HostName(std::string const& hostName) {
+    _HostName = hostName;
+}
 
-void Partition::set_IP(std::string const& ip) { _IP = ip; }
+void Partition::set_IP(std::string const& ip) {
+    _IP = ip;
+}
 
 void Partition::set_ActiveStatus(std::string const& activeStatus) {
     _ActiveStatus = activeStatus;
@@ -63,7 +83,9 @@ std::string Partition::__StringValue() const {
     return std::string(_MTMS) + gc_ID_Delimiter + _PartitionID;
 }
 
-Partition::operator std::string() const { return __StringValue(); }
+Partition::operator std::string() const {
+    return __StringValue();
+}
 
 std::string Partition::to_String(const char* dashReplacement, const char* separator,
                                  const char* idSeparator) const {

@@ -12,7 +12,9 @@ using Quorvex::System::Partition;
 
 namespace {
 
-MTMS machine() { return MTMS("1234-ABC", "10ABCDE"); }
+MTMS machine() {
+    return MTMS("1234-ABC", "10ABCDE");
+}
 
 Partition withIP(std::string const& id, std::string const& host, std::string const& ip) {
     Partition partition(machine(), id, host);
