@@ -3,6 +3,8 @@
 #include "utility/Trace.h"
 #include "utility/Utility_Test_Utility.h"
 
+#include "QuorvexTest.h"
+
 #include <gtest/gtest.h>
 
 #include <chrono>
@@ -28,7 +30,7 @@ protected:
 
     // Lines read from a file holding exactly content.
     Lines readBack(std::string const& content, unsigned int* count = nullptr) const {
-        TestUtility::u_write_File(path("output"), content);
+        QuorvexTest::writeFile(path("output"), content);
         Lines lines;
         unsigned int const result = Utility::ShellCommand::_readOutput(path("output"), lines);
         if (count != nullptr) {
@@ -153,7 +155,7 @@ TEST_F(ShellCommandTest, RedirectionsApplyToTheCommandTextAsGiven) {
     Utility::ShellCommand command("echo first > " + path("first") + "; echo second");
     EXPECT_EQ(command.execute(), 0);
     EXPECT_EQ(command.get_stdout(), (Lines{"second", ""}));
-    EXPECT_EQ(TestUtility::u_read_File(path("first")), "first\n");
+    EXPECT_EQ(QuorvexTest::readFile(path("first")), "first\n");
 }
 
 TEST_F(ShellCommandTest, AppendCommandAddsTextWithoutBlank) {
@@ -173,8 +175,8 @@ TEST_F(ShellCommandTest, TemporaryFilesOfRunAreInTmpAndRemovedAfterwards) {
     EXPECT_TRUE(isTemporaryName(names[0])) << names[0];
     EXPECT_TRUE(isTemporaryName(names[1])) << names[1];
     EXPECT_NE(names[0], names[1]);
-    EXPECT_FALSE(TestUtility::u_exists(names[0]));
-    EXPECT_FALSE(TestUtility::u_exists(names[1]));
+    EXPECT_FALSE(QuorvexTest::fileExists(names[0]));
+    EXPECT_FALSE(QuorvexTest::fileExists(names[1]));
 }
 
 TEST_F(ShellCommandTest, TemporarySettersHaveNoEffect) {
@@ -251,7 +253,7 @@ TEST_F(ShellCommandTest, ReadOutputNulByteEndsTheLineText) {
 }
 
 TEST_F(ShellCommandTest, ReadOutputAppendsToExistingLines) {
-    TestUtility::u_write_File(path("output"), "a\n");
+    QuorvexTest::writeFile(path("output"), "a\n");
     Lines lines{"old"};
     EXPECT_EQ(Utility::ShellCommand::_readOutput(path("output"), lines), 3u);
     EXPECT_EQ(lines, (Lines{"old", "a", ""}));

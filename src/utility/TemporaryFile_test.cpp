@@ -2,6 +2,8 @@
 
 #include "utility/Utility_Test_Utility.h"
 
+#include "QuorvexTest.h"
+
 #include <gtest/gtest.h>
 
 #include <regex>
@@ -46,9 +48,9 @@ TEST_F(TemporaryFileTest, TwoFilesFromOneBaseHaveDifferentNames) {
 TEST_F(TemporaryFileTest, RemoveDeletesFileAndEmptiesBothNames) {
     Utility::TemporaryFile file(_base);
     std::string const name = file.get_ActualFileName();
-    ASSERT_TRUE(TestUtility::u_exists(name));
+    ASSERT_TRUE(QuorvexTest::fileExists(name));
     EXPECT_TRUE(file.remove());
-    EXPECT_FALSE(TestUtility::u_exists(name));
+    EXPECT_FALSE(QuorvexTest::fileExists(name));
     EXPECT_FALSE(file.isValid());
     EXPECT_EQ(file.get_ActualFileName(), "");
     EXPECT_EQ(file.get_BaseFileName(), "");
@@ -76,7 +78,7 @@ TEST_F(TemporaryFileTest, DestructorLeavesFileOnDisk) {
         Utility::TemporaryFile file(_base);
         name = file.get_ActualFileName();
     }
-    EXPECT_TRUE(TestUtility::u_exists(name));
+    EXPECT_TRUE(QuorvexTest::fileExists(name));
 }
 
 TEST_F(TemporaryFileTest, MissingDirectoryGivesInvalidObjectWithBaseNameKept) {

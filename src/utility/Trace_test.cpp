@@ -3,6 +3,8 @@
 #include "utility/ShellCommand.h"
 #include "utility/Utility_Test_Utility.h"
 
+#include "QuorvexTest.h"
+
 #include <gtest/gtest.h>
 
 #include <csignal>
@@ -69,7 +71,7 @@ void writeTimeStampAt(std::string const& file, long secondOfDay) {
 
 TEST_F(TraceTest, TwoRunsLeaveOnlyTheSecondRunsText) {
     std::string const file = path("run.Trace");
-    TestUtility::u_write_File(file, "an older trace that is longer than the new ones\n");
+    QuorvexTest::writeFile(file, "an older trace that is longer than the new ones\n");
     for (std::string const text : {"first run", "second run"}) {
         TestUtility::u_run_InFreshProcess([&] {
             Utility::Trace trace(file);
@@ -77,7 +79,7 @@ TEST_F(TraceTest, TwoRunsLeaveOnlyTheSecondRunsText) {
             return 0;
         });
     }
-    EXPECT_EQ(TestUtility::u_read_File(file), "second run\n");
+    EXPECT_EQ(QuorvexTest::readFile(file), "second run\n");
 }
 
 TEST_F(TraceTest, SecondNameIsIgnoredAndWritesGoToFirstFile) {
@@ -91,9 +93,9 @@ TEST_F(TraceTest, SecondNameIsIgnoredAndWritesGoToFirstFile) {
         firstTrace << "first again" << std::endl;
         return 0;
     });
-    EXPECT_EQ(TestUtility::u_read_File(first),
+    EXPECT_EQ(QuorvexTest::readFile(first),
               "through the first\nthrough the second\nfirst again\n");
-    EXPECT_FALSE(TestUtility::u_exists(second));
+    EXPECT_FALSE(QuorvexTest::fileExists(second));
 }
 
 TEST_F(TraceTest, FailedOpenIsNeverRetried) {
@@ -110,7 +112,7 @@ TEST_F(TraceTest, FailedOpenIsNeverRetried) {
         }
         return 0;
     });
-    EXPECT_FALSE(TestUtility::u_exists(good));
+    EXPECT_FALSE(QuorvexTest::fileExists(good));
 }
 
 TEST_F(TraceTest, TextWrittenBeforeTheOpenIsLostForThatObject) {
@@ -128,7 +130,7 @@ TEST_F(TraceTest, TextWrittenBeforeTheOpenIsLostForThatObject) {
         }
         return 0;
     });
-    EXPECT_EQ(TestUtility::u_read_File(file), "main\nlater unit\n");
+    EXPECT_EQ(QuorvexTest::readFile(file), "main\nlater unit\n");
 }
 
 TEST_F(TraceTest, DestroyingMainTraceWhileUnitTraceLivesKeepsFileOpen) {
@@ -145,7 +147,7 @@ TEST_F(TraceTest, DestroyingMainTraceWhileUnitTraceLivesKeepsFileOpen) {
         unit << "from the unit" << std::endl;
         return 0;
     });
-    EXPECT_EQ(TestUtility::u_read_File(file), "from main\nfrom the unit\n");
+    EXPECT_EQ(QuorvexTest::readFile(file), "from main\nfrom the unit\n");
 }
 
 TEST_F(TraceTest, LastTraceObjectClosesTheFileAndWritesBufferedText) {
@@ -160,13 +162,13 @@ TEST_F(TraceTest, LastTraceObjectClosesTheFileAndWritesBufferedText) {
         if (shared->is_open()) {
             return failWith("the file stayed open after the last trace object");
         }
-        if (TestUtility::u_read_File(file) != "buffered, no flush") {
+        if (QuorvexTest::readFile(file) != "buffered, no flush") {
             return failWith("closing did not write the buffered text");
         }
         // Ends without running exit handlers: the text got there on close.
         std::_Exit(0);
     });
-    EXPECT_EQ(TestUtility::u_read_File(file), "buffered, no flush");
+    EXPECT_EQ(QuorvexTest::readFile(file), "buffered, no flush");
 }
 
 TEST_F(TraceTest, AllObjectsShareOneBuffer) {
@@ -185,7 +187,7 @@ TEST_F(TraceTest, TraceHasNoPrefixOrTimeStampOfItsOwn) {
         mainTrace.flush();
         return 0;
     });
-    EXPECT_EQ(TestUtility::u_read_File(file), "PYLON_VPD_Survey_ClientPartition::main\n42 -1");
+    EXPECT_EQ(QuorvexTest::readFile(file), "PYLON_VPD_Survey_ClientPartition::main\n42 -1");
 }
 
 TEST_F(TraceTest, ShellCommandRunWritesExactBlock) {
@@ -196,7 +198,7 @@ TEST_F(TraceTest, ShellCommandRunWritesExactBlock) {
         Utility::ShellCommand shellCommand(command);
         return shellCommand.execute() == 2 ? 0 : failWith("unexpected code");
     });
-    std::string const trace = TestUtility::u_read_File(file);
+    std::string const trace = QuorvexTest::readFile(file);
     EXPECT_EQ(TestUtility::u_normalise_TemporaryNames(trace),
               "\n****** ShellCommand::execute ******\n" + command +
                   " > /tmp/ShellCommand.XXXXXX 2> /tmp/ShellCommand.XXXXXX\n"
@@ -209,8 +211,8 @@ TEST_F(TraceTest, ShellCommandRunWritesExactBlock) {
         trace, names,
         std::regex(" > (/tmp/ShellCommand\\.[A-Za-z0-9]{6}) 2> (/tmp/ShellCommand\\.[A-Za-z0-9]{6})\n")));
     EXPECT_NE(names[1].str(), names[2].str());
-    EXPECT_FALSE(TestUtility::u_exists(names[1].str()));
-    EXPECT_FALSE(TestUtility::u_exists(names[2].str()));
+    EXPECT_FALSE(QuorvexTest::fileExists(names[1].str()));
+    EXPECT_FALSE(QuorvexTest::fileExists(names[2].str()));
 }
 
 TEST_F(TraceTest, RepeatedRunsTraceAllLinesSoFar) {
@@ -226,7 +228,7 @@ TEST_F(TraceTest, RepeatedRunsTraceAllLinesSoFar) {
     std::string const block = "\n****** ShellCommand::execute ******\n"
                               "echo line > /tmp/ShellCommand.XXXXXX 2> /tmp/ShellCommand.XXXXXX\n"
                               "RC = 0\n";
-    EXPECT_EQ(TestUtility::u_normalise_TemporaryNames(TestUtility::u_read_File(file)),
+    EXPECT_EQ(TestUtility::u_normalise_TemporaryNames(QuorvexTest::readFile(file)),
               block + "STDOUT\nline\n\nSTDERR\n\n\n\n" + block +
                   "STDOUT\nline\n\nline\n\nSTDERR\n\n\n\n\n");
 }
@@ -240,7 +242,7 @@ TEST_F(TraceTest, SystemFailureIsTracedAsMinusOne) {
         shellCommand.execute();
         return 0;
     });
-    EXPECT_EQ(TestUtility::u_normalise_TemporaryNames(TestUtility::u_read_File(file)),
+    EXPECT_EQ(TestUtility::u_normalise_TemporaryNames(QuorvexTest::readFile(file)),
               "\n****** ShellCommand::execute ******\n"
               "true > /tmp/ShellCommand.XXXXXX 2> /tmp/ShellCommand.XXXXXX\n"
               "RC = -1\nSTDOUT\n\nSTDERR\n\n\n\n");
@@ -251,7 +253,7 @@ TEST_F(TraceTest, SystemFailureIsTracedAsMinusOne) {
 TEST_F(TraceTest, TimeStampPadsSingleDigitHourWithBlank) {
     std::string const file = path("time.Trace");
     writeTimeStampAt(file, 9 * 3600 + 5 * 60 + 7);
-    std::string const text = TestUtility::u_read_File(file);
+    std::string const text = QuorvexTest::readFile(file);
     // The clock may tick once between setting the zone and reading the time.
     EXPECT_TRUE(text == " 9:05:07" || text == " 9:05:08") << '"' << text << '"';
 }
@@ -259,14 +261,14 @@ TEST_F(TraceTest, TimeStampPadsSingleDigitHourWithBlank) {
 TEST_F(TraceTest, TimeStampWritesTwoDigitHourUnpadded) {
     std::string const file = path("time.Trace");
     writeTimeStampAt(file, 23 * 3600 + 59 * 60 + 50);
-    std::string const text = TestUtility::u_read_File(file);
+    std::string const text = QuorvexTest::readFile(file);
     EXPECT_TRUE(text == "23:59:50" || text == "23:59:51") << '"' << text << '"';
 }
 
 TEST_F(TraceTest, TimeStampAtMidnightHourIsBlankAndZero) {
     std::string const file = path("time.Trace");
     writeTimeStampAt(file, 30);
-    std::string const text = TestUtility::u_read_File(file);
+    std::string const text = QuorvexTest::readFile(file);
     EXPECT_TRUE(text == " 0:00:30" || text == " 0:00:31") << '"' << text << '"';
 }
 
@@ -280,10 +282,10 @@ TEST_F(TraceTest, TimeStampHasClockFormatWithoutLineEnd) {
         trace.flush();
         return 0;
     });
-    EXPECT_TRUE(std::regex_match(TestUtility::u_read_File(file),
+    EXPECT_TRUE(std::regex_match(QuorvexTest::readFile(file),
                                  std::regex("[ 12][0-9]:[0-5][0-9]:[0-6][0-9]\\|"
                                             "[ 12][0-9]:[0-5][0-9]:[0-6][0-9]")))
-        << TestUtility::u_read_File(file);
+        << QuorvexTest::readFile(file);
 }
 
 TEST_F(TraceTest, TimeStampIntoClosedTraceIsIgnored) {

@@ -4,9 +4,7 @@
 
 #include <cstdlib>
 #include <filesystem>
-#include <fstream>
 #include <regex>
-#include <sstream>
 #include <vector>
 
 namespace Utility {
@@ -41,23 +39,6 @@ void u_remove_ScratchDirectory() {
     std::error_code ignored;
     std::filesystem::remove_all(current, ignored);
     ::unsetenv(gc_ScratchVariable);
-}
-
-std::string u_read_File(std::string const& path) {
-    std::ifstream file(path, std::ios::binary);
-    std::ostringstream content;
-    content << file.rdbuf();
-    return content.str();
-}
-
-void u_write_File(std::string const& path, std::string const& content) {
-    std::ofstream file(path, std::ios::binary | std::ios::trunc);
-    file.write(content.data(), static_cast<std::streamsize>(content.size()));
-}
-
-bool u_exists(std::string const& path) {
-    std::error_code ignored;
-    return std::filesystem::exists(path, ignored);
 }
 
 void u_run_InFreshProcess(std::function<int()> const& body) {

@@ -28,10 +28,6 @@ private:
 std::string u_get_ScratchDirectory();
 void u_remove_ScratchDirectory();
 
-std::string u_read_File(std::string const& path);
-void u_write_File(std::string const& path, std::string const& content);
-bool u_exists(std::string const& path);
-
 // Runs body in a freshly started copy of the test program, so process-wide
 // state (the shared trace file, the time zone, signal settings) starts clean
 // and does not leak into other tests. body returns the child's exit status:

@@ -1,0 +1,127 @@
+// Runs inside the sandbox, whose /tmp is private: every file there is ours.
+
+#include "utility/ShellCommand.h"
+
+#include "utility/Trace.h"
+
+#include "QuorvexTest.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <string>
+#include <unistd.h>
+#include <vector>
+
+namespace {
+
+using Lines = std::vector<std::string>;
+
+constexpr char gc_MarkerFolder[] = "/var/adm/quorvex/Trace";
+
+// Names in /tmp that begin with "ShellCommand.".
+Lines temporaryFilesInTmp() {
+    Lines names;
+    for (auto const& entry : std::filesystem::directory_iterator("/tmp")) {
+        std::string const name = entry.path().filename().string();
+        if (name.rfind("ShellCommand.", 0) == 0) {
+            names.push_back(name);
+        }
+    }
+    return names;
+}
+
+// Runs the probe in a sandbox of its own with the given options.
+QuorvexTest::CommandResult runProbe(std::vector<std::string> const& sandboxOptions) {
+    return QuorvexTest::runInSandbox(sandboxOptions,
+                                     {QUORVEX_UTILITY_PROBE, std::string(gc_MarkerFolder)});
+}
+
+std::string hostName() {
+    char name[256] = {0};
+    ::gethostname(name, sizeof name - 1);
+    return name;
+}
+
+class ShellCommandPrivateTmp : public ::testing::Test {
+protected:
+    void SetUp() override {
+        ASSERT_TRUE(QuorvexTest::isInsideSandbox());
+        ASSERT_EQ(temporaryFilesInTmp(), Lines{});
+    }
+
+    // Runs the command once and checks that /tmp holds no temporary file after it.
+    void runAndExpectNoFileLeft(std::string const& commandText, int expectedCode) {
+        Utility::ShellCommand command(commandText);
+        EXPECT_EQ(command.execute(), expectedCode) << commandText;
+        EXPECT_EQ(temporaryFilesInTmp(), Lines{}) << commandText;
+    }
+};
+
+TEST_F(ShellCommandPrivateTmp, SuccessfulRunLeavesNoTemporaryFile) {
+    runAndExpectNoFileLeft("echo word", 0);
+}
+
+TEST_F(ShellCommandPrivateTmp, FailingRunsLeaveNoTemporaryFile) {
+    runAndExpectNoFileLeft("exit 3", 3);
+    runAndExpectNoFileLeft("/nonexistent/quorvex-no-such-tool", 127);
+    runAndExpectNoFileLeft("kill -9 $$", 0);
+}
+
+TEST_F(ShellCommandPrivateTmp, RunWithOverLongLineLeavesNoTemporaryFile) {
+    runAndExpectNoFileLeft("sh -c \"head -c 200000 /dev/zero | tr '\\\\000' x; echo; echo z\"", 0);
+}
+
+TEST_F(ShellCommandPrivateTmp, RepeatedRunsLeaveNoTemporaryFile) {
+    Utility::ShellCommand command("echo again");
+    command.set_ExecuteOnlyOnce(false);
+    for (int run = 0; run < 3; ++run) {
+        EXPECT_EQ(command.execute(), 0);
+        EXPECT_EQ(temporaryFilesInTmp(), Lines{});
+    }
+    EXPECT_EQ(command.get_stdout(), (Lines{"again", "", "again", "", "again", ""}));
+}
+
+TEST_F(ShellCommandPrivateTmp, RefusedSecondRunLeavesNoTemporaryFile) {
+    Utility::ShellCommand command("echo once");
+    EXPECT_EQ(command.execute(), 0);
+    EXPECT_EQ(command.execute(), -1);
+    EXPECT_EQ(temporaryFilesInTmp(), Lines{});
+}
+
+TEST_F(ShellCommandPrivateTmp, HostNameQueryLeavesNoTemporaryFile) {
+    EXPECT_EQ(Utility::get_HostName(), hostName());
+    EXPECT_EQ(temporaryFilesInTmp(), Lines{});
+}
+
+TEST(ShellCommandTmpNotWritable, ExecuteGivesMinusOneAndRunsNothing) {
+    QuorvexTest::CommandResult const result = runProbe({"--readonly-tmp"});
+    EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
+    EXPECT_EQ(result.stdoutText, "execute -1\n"
+                                 "wasExecuted 0\n"
+                                 "returnCode 0\n"
+                                 "stdout 0\n"
+                                 "stderr 0\n"
+                                 "marker absent\n"
+                                 "host ***Unknown***.hostname.\n"
+                                 "left 0\n");
+}
+
+// The same probe with a writable /tmp runs its command: the marker check in
+// the read-only case can see a command that ran.
+TEST(ShellCommandTmpWritable, ProbeRunsCommandAndFindsItsMarker) {
+    QuorvexTest::CommandResult const result = runProbe({});
+    EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
+    EXPECT_EQ(result.stdoutText, "execute 0\n"
+                                 "wasExecuted 1\n"
+                                 "returnCode 0\n"
+                                 "stdout 1\n"
+                                 "stderr 1\n"
+                                 "marker present\n"
+                                 "host " +
+                                     hostName() +
+                                     "\n"
+                                     "left 0\n");
+}
+
+} // namespace
