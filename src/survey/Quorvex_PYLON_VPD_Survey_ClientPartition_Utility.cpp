@@ -1,0 +1,82 @@
+#include "survey/Quorvex_PYLON_VPD_Survey_ClientPartition_Utility.h"
+
+#include "survey/Survey_Files.h"
+#include "survey/System_Partition_2_VPD_Resource.h"
+#include "survey/Utility_VPD_XML.h"
+#include "transform/VPD_2_OStream.h"
+#include "utility/Print.h"
+#include "vpd/Property.h"
+#include "vpd/Resource.h"
+#include "vpd/ResourceList.h"
+
+#include <fstream>
+#include <sstream>
+#include <stdexcept>
+
+namespace Quorvex_PYLON_VPD_Survey_ClientPartition_Utility {
+
+namespace {
+
+// The list of the machine resource that holds the partition.
+constexpr char gc_PartitionsList[] = "Partitions";
+// The keyword of the failure reason.
+constexpr char gc_ReasonKeyword[] = "VD";
+
+// Builds the default document into set; false when the machine's identity
+// cannot be put into it (a type-model without "-").
+bool _u_build_DefaultDocument(Quorvex::System::Partition const& partition,
+                              std::string const& reason, Quorvex::VPD::ResourceSet& set) {
+    try {
+        u_create_VPD_ResourceSet_forFailedPartition(partition, reason, set);
+    } catch (std::out_of_range const&) {
+        return false;
+    }
+    return true;
+}
+
+} // namespace
+
+unsigned int _u_get_ActiveStatus(Quorvex::System::Partition const& partition) {
+    std::istringstream text(partition.get_ActiveStatus());
+    unsigned int activeStatus = 0;
+    if (!(text >> activeStatus)) {
+        return 0;
+    }
+    return activeStatus;
+}
+
+void u_create_VPD_ResourceSet_forFailedPartition(Quorvex::System::Partition const& partition,
+                                                 std::string const& reason,
+                                                 Quorvex::VPD::ResourceSet& set) {
+    Quorvex::PYLON::Utility_VPD_XML::initialize_Default_VPD_ResourceSet(set,
+                                                                        partition.get_MTMS());
+    Quorvex::VPD::Resource resource;
+    Transform::System_Partition_2_VPD_Resource()(partition, resource);
+    resource.insert_Property(Quorvex::VPD::Property(gc_ReasonKeyword, reason));
+    Quorvex::VPD::ResourceList partitions(gc_PartitionsList);
+    partitions.insert(resource);
+    set.get_Resource().insert_ResourceList(partitions);
+}
+
+void u_create_DefaultXML_forFailedPartition(Quorvex::System::Partition const& partition,
+                                            std::string const& reason,
+                                            std::string const& localFileName) {
+    Quorvex::VPD::ResourceSet set;
+    if (!_u_build_DefaultDocument(partition, reason, set)) {
+        return;
+    }
+    std::ofstream document(std::string(Quorvex::PYLON::VPD::gc_QuorvexDirectory) + localFileName);
+    Transform::VPD_2_OStream{document}(set);
+    document.flush();
+    document.close();
+}
+
+std::string u_transform_RELAY_ReturnCode_2_String(Quorvex::RELAY::ReturnCode const& returnCode) {
+    std::ostringstream text;
+    text << "\n";
+    DEBUG::STL::Print{text}(returnCode.get_Values());
+    text << "\n" << std::endl;
+    return text.str();
+}
+
+} // namespace Quorvex_PYLON_VPD_Survey_ClientPartition_Utility

@@ -1,0 +1,182 @@
+#include "survey/Survey_ClientPartition.h"
+
+#include "relay/Interface.h"
+#include "relay/ReturnCode.h"
+#include "relay/TargetPartition.h"
+#include "survey/Quorvex_PYLON_VPD_Survey_ClientPartition_Utility.h"
+#include "survey/Survey_Files.h"
+#include "system/DEBUG_System.h"
+#include "utility/Trace.h"
+
+#include <ostream>
+#include <sstream>
+
+namespace Quorvex {
+namespace PYLON {
+namespace VPD {
+
+namespace {
+
+namespace Survey_Utility = ::Quorvex_PYLON_VPD_Survey_ClientPartition_Utility;
+
+// This unit's trace; it writes into the file that main opens.
+::Utility::Trace g_Trace("");
+
+constexpr char gc_Surveyed[] = "0";
+constexpr char gc_NotSurveyed[] = "8";
+constexpr char gc_Ok[] = "Ok";
+constexpr char gc_Inactive[] = "Failed - Active Status < 3";
+// Statuses 0, 1 and 2 mean the partition is not running.
+constexpr unsigned int gc_HighestInactiveStatus = 2;
+
+// Fixed parts of the names formed per partition.
+constexpr char gc_RemoteResultSuffix[] = ".VPD.xml";
+constexpr char gc_ClientOutputSuffix[] = ".QuorvexOutput";
+constexpr char gc_ClientOptions[] = " -v  -of ";
+
+// The status text is written over its seed from the seed's first character.
+constexpr char gc_ClientFailedSeed[] = "survey Failed : ";
+constexpr char gc_FetchFailedSeed[] = "get result Failed, rc = ";
+constexpr char gc_ChannelFailed[] = "RELAY Failed, rc = ";
+constexpr char gc_ClientFailed[] = "Partition Failed, RcCmd = ";
+
+constexpr char gc_NotSurveyedReason[] = "Partition not surveyed, reason: \n";
+constexpr char gc_ChannelFailedReason[] = "RELAY Failed.\n";
+constexpr char gc_ClientFailedReason[] = "Partition Failed.\n";
+constexpr char gc_FetchFailedReason[] = "Unable to get File From Partition : \n";
+
+// The names of one partition's files, P being its identity text.
+struct ResultNames {
+    // P + ".VPD.xml", written by the client on the partition.
+    ::std::string remoteResult;
+    // "VPD/quorvexPYLON_VPD_Survey_ClientPartition_" + P + ".VPD.xml",
+    // relative to "/var/adm/quorvex/".
+    ::std::string localResult;
+    // The client's options: verbose, and the result file to write.
+    ::std::string clientArguments;
+    // P + ".QuorvexOutput", the client's own output on the partition.
+    ::std::string clientOutput;
+};
+
+ResultNames u_form_ResultNames(::Quorvex::System::Partition const& partition) {
+    ::std::string const identity = partition;
+    ResultNames names;
+    names.remoteResult = identity + gc_RemoteResultSuffix;
+    names.localResult =
+        ::std::string(gc_VPD_Folder) + gc_ProgramName + "_" + identity + gc_RemoteResultSuffix;
+    names.clientArguments = gc_ClientOptions + names.remoteResult;
+    names.clientOutput = identity + gc_ClientOutputSuffix;
+    return names;
+}
+
+// The text of a stream seeded with seed into which message and the code (as
+// an unsigned 32-bit number, so -1 reads 4294967295) are written from the
+// seed's first character on: what is written replaces that many characters
+// of the seed, and the rest of the seed stays.
+::std::string u_write_OverSeed(char const* seed, char const* message, int const& code) {
+    ::std::stringstream status(seed);
+    status << message << static_cast<unsigned int>(code);
+    return status.str();
+}
+
+void u_trace_Banner() {
+    g_Trace << "\n\n" << ::std::string(80, '+') << "\n"
+            << "PYLON_VPD_Survey_ClientPartition\n\n";
+}
+
+void u_trace_Partition(::Quorvex::System::Partition const& partition) {
+    ::DEBUG::Quorvex::System::print_Partition(g_Trace, partition, 4);
+    g_Trace << "    " << ::std::string(40, '-') << ::std::endl;
+}
+
+bool u_has_ClientFailed(int const& result, ::Quorvex::RELAY::ReturnCode const& returnCode) {
+    return result != 0 || returnCode.get_Rc() != 0 || returnCode.get_RcCmd() != 0;
+}
+
+bool u_has_ChannelFailed(int const& result, ::Quorvex::RELAY::ReturnCode const& returnCode) {
+    return result != 0 || returnCode.get_Rc() != 0;
+}
+
+// One output entry of each kind for one partition.
+struct Outcome {
+    ::std::string fileName;
+    ::std::string returnCode;
+    ::std::string statusText;
+};
+
+Outcome u_record_ClientFailure(::Quorvex::System::Partition const& partition,
+                               ResultNames const& names, int const& result,
+                               ::Quorvex::RELAY::ReturnCode const& returnCode) {
+    bool const channelFailed = u_has_ChannelFailed(result, returnCode);
+    ::std::string const reason =
+        ::std::string(gc_NotSurveyedReason) +
+        (channelFailed ? gc_ChannelFailedReason : gc_ClientFailedReason) +
+        Survey_Utility::u_transform_RELAY_ReturnCode_2_String(returnCode);
+    Survey_Utility::u_create_DefaultXML_forFailedPartition(partition, reason, names.localResult);
+    ::std::string const status =
+        channelFailed ? u_write_OverSeed(gc_ClientFailedSeed, gc_ChannelFailed, returnCode.get_Rc())
+                      : u_write_OverSeed(gc_ClientFailedSeed, gc_ClientFailed,
+                                         returnCode.get_RcCmd());
+    return {names.localResult, gc_NotSurveyed, status};
+}
+
+Outcome u_record_FetchFailure(::Quorvex::System::Partition const& partition,
+                              ResultNames const& names,
+                              ::Quorvex::RELAY::ReturnCode const& returnCode) {
+    ::std::string const reason = ::std::string(gc_FetchFailedReason) +
+                                 Survey_Utility::u_transform_RELAY_ReturnCode_2_String(returnCode);
+    Survey_Utility::u_create_DefaultXML_forFailedPartition(partition, reason, names.localResult);
+    return {names.localResult, gc_NotSurveyed,
+            u_write_OverSeed(gc_FetchFailedSeed, "", returnCode.get_Rc())};
+}
+
+// Runs the client survey on the partition, then fetches its result.
+Outcome u_survey_ActivePartition(::Quorvex::System::Partition const& partition) {
+    u_trace_Banner();
+    ::Quorvex::RELAY::Interface relay{::Quorvex::RELAY::TargetPartition(partition)};
+    u_trace_Partition(partition);
+    ResultNames const names = u_form_ResultNames(partition);
+
+    g_Trace << "\n\t 1.  > > > VPD Survey Client < < < \n";
+    int const clientResult =
+        relay.execute_PartitionQuorvex(names.clientArguments, names.clientOutput);
+    // Copies: the next operation replaces the interface's return codes.
+    ::Quorvex::RELAY::ReturnCode const clientCode = relay.get_ReturnCode();
+    if (u_has_ClientFailed(clientResult, clientCode)) {
+        return u_record_ClientFailure(partition, names, clientResult, clientCode);
+    }
+
+    g_Trace << "\n\n\t 2.  > > > Get VPD Survey Result < < < \n";
+    int const fetchResult = relay.getFileFromPartition(names.remoteResult, names.localResult);
+    ::Quorvex::RELAY::ReturnCode const fetchCode = relay.get_ReturnCode();
+    if (u_has_ChannelFailed(fetchResult, fetchCode)) {
+        return u_record_FetchFailure(partition, names, fetchCode);
+    }
+    return {names.localResult, gc_Surveyed, gc_Ok};
+}
+
+// An inactive partition is skipped: no trace text, no file.
+Outcome u_survey_Partition(::Quorvex::System::Partition const& partition) {
+    if (Survey_Utility::_u_get_ActiveStatus(partition) <= gc_HighestInactiveStatus) {
+        return {"", gc_NotSurveyed, gc_Inactive};
+    }
+    return u_survey_ActivePartition(partition);
+}
+
+} // namespace
+
+void Survey_ClientPartition::operator()(::Quorvex::PYLON::ListOf_Partitions const& partitions,
+                                        ::std::vector<::std::string>& fileNames,
+                                        ::std::vector<::std::string>& returnCodes,
+                                        ::std::vector<::std::string>& statusTexts) const {
+    for (::Quorvex::System::Partition const& partition : partitions) {
+        Outcome const outcome = u_survey_Partition(partition);
+        fileNames.push_back(outcome.fileName);
+        returnCodes.push_back(outcome.returnCode);
+        statusTexts.push_back(outcome.statusText);
+    }
+}
+
+} // namespace VPD
+} // namespace PYLON
+} // namespace Quorvex

@@ -1,0 +1,30 @@
+#pragma once
+
+#include "pylon/ListOf_Partitions.h"
+
+#include <string>
+#include <vector>
+
+namespace Quorvex {
+namespace PYLON {
+namespace VPD {
+
+// Surveys every partition of a listing in turn: runs the client survey on
+// each active partition through the remote action channel and fetches its
+// VPD document back, or writes a default document that carries the reason
+// when either step fails. Never stops early and keeps no state.
+class Survey_ClientPartition {
+public:
+    // Appends exactly one entry per listed partition, in listing order, to
+    // each output: the local VPD file name relative to "/var/adm/quorvex/"
+    // ("" for an inactive partition), the code ("0" surveyed, "8" not) and
+    // the status text. The outputs are not cleared first.
+    void operator()(::Quorvex::PYLON::ListOf_Partitions const& partitions,
+                    ::std::vector<::std::string>& fileNames,
+                    ::std::vector<::std::string>& returnCodes,
+                    ::std::vector<::std::string>& statusTexts) const;
+};
+
+} // namespace VPD
+} // namespace PYLON
+} // namespace Quorvex

@@ -1,0 +1,66 @@
+#include "survey/VPD_Survey_ClientPartition.h"
+
+#include "pylon/ListOf_Partitions.h"
+#include "pylon/Machine.h"
+#include "survey/Survey_ClientPartition.h"
+#include "survey/Survey_Files.h"
+#include "survey/calculate_ReturnCode.h"
+#include "system/MTMS.h"
+
+#include <fstream>
+#include <iostream>
+#include <vector>
+
+namespace {
+
+constexpr char gc_StatusSuffix[] = ".status";
+constexpr char gc_NoPartitions[] = "No ACTIVE Partition Found.";
+// Only machines of this object type have their partitions listed.
+constexpr unsigned int gc_ManagedMachineType = 0;
+
+std::string u_get_StatusFileName(std::string const& machineIdentity) {
+    return std::string(Quorvex::PYLON::VPD::gc_QuorvexDirectory) + Quorvex::PYLON::VPD::gc_VPD_Folder +
+           Quorvex::PYLON::VPD::gc_ProgramName + "_" + machineIdentity + gc_StatusSuffix;
+}
+
+// Per partition: the file name on standard output and the code on standard
+// error when a file name was recorded, and in every case the status line.
+void u_report_Partitions(Quorvex::PYLON::ListOf_Partitions const& partitions,
+                          std::vector<std::string> const& fileNames,
+                          std::vector<std::string> const& returnCodes,
+                          std::vector<std::string> const& statusTexts, std::ostream& status) {
+    for (std::size_t i = 0; i < fileNames.size(); ++i) {
+        if (!fileNames[i].empty()) {
+            // Flushed per line, so that names and codes interleave in order
+            // when both streams go to one file.
+            std::cout << fileNames[i] << std::endl;
+            std::cerr << returnCodes[i] << std::endl;
+        }
+        status << partitions[i].get_HostName() << " [" << partitions[i].get_IP()
+               << "] - VPD Survey - " << statusTexts[i] << std::endl;
+    }
+}
+
+} // namespace
+
+void VPD_Survey_ClientPartition(std::string const& machineIdentity) {
+    // A status file that cannot be opened loses its lines silently.
+    std::ofstream status(u_get_StatusFileName(machineIdentity));
+    Quorvex::System::MTMS const mtms(machineIdentity);
+    Quorvex::PYLON::Machine const machine(gc_ManagedMachineType, mtms);
+    Quorvex::PYLON::ListOf_Partitions partitions;
+    partitions.getPartitions_FromMachine(machine);
+    Quorvex::PYLON::VPD::Survey_ClientPartition const survey;
+
+    if (partitions.empty()) {
+        status << gc_NoPartitions << std::endl;
+        calculate_ReturnCode({});
+        return;
+    }
+    std::vector<std::string> fileNames;
+    std::vector<std::string> returnCodes;
+    std::vector<std::string> statusTexts;
+    survey(partitions, fileNames, returnCodes, statusTexts);
+    u_report_Partitions(partitions, fileNames, returnCodes, statusTexts, status);
+    calculate_ReturnCode(returnCodes);
+}

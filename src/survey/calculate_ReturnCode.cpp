@@ -1,0 +1,28 @@
+#include "survey/calculate_ReturnCode.h"
+
+#include "survey/Survey_Files.h"
+
+#include <algorithm>
+#include <iostream>
+
+namespace {
+
+char const* u_get_OverallCode(std::vector<std::string> const& returnCodes) {
+    auto const surveyed = std::count(returnCodes.begin(), returnCodes.end(), "0");
+    // Tested first, so that an empty sequence gives "8" too.
+    if (surveyed == 0) {
+        return "8";
+    }
+    if (static_cast<std::size_t>(surveyed) == returnCodes.size()) {
+        return "0";
+    }
+    return "4";
+}
+
+} // namespace
+
+void calculate_ReturnCode(std::vector<std::string> const& returnCodes) {
+    std::cerr << std::endl << Quorvex::PYLON::VPD::gc_ProgramName << " ReturnCode: " << std::endl;
+    std::cerr << u_get_OverallCode(returnCodes);
+    std::cerr.flush();
+}
