@@ -5,11 +5,41 @@
 #include <climits>
 #include <map>
 #include <string>
+#include <vector>
 
 using Quorvex::RELAY::cBlankReturnCode;
 using Quorvex::RELAY::ReturnCode;
 
 using Values = std::map<std::string, std::string>;
+
+namespace {
+
+// Read while this unit's start-up objects are built, in whatever order the
+// units are linked.
+int const gc_BlankRcAtStartUp = cBlankReturnCode.get_Rc();
+// A map or string not yet built has no begin node and no character buffer.
+bool const gc_BlankIsBuiltAtStartUp =
+    cBlankReturnCode.get_Values().begin() == cBlankReturnCode.get_Values().end() &&
+    cBlankReturnCode.get_RetStr1().c_str() != nullptr;
+
+// Every line of up to four pieces taken from tokens that break naive parsers.
+std::vector<std::string> hostileLines()
+{
+    std::vector<std::string> const pieces{"Rc", "RcCmd", "::", ":", "", "x", "-1", "abc", "\t", " "};
+    std::vector<std::string> lines{""};
+    for (std::size_t length = 0; length < 4; ++length) {
+        std::vector<std::string> longer;
+        for (std::string const& line : lines) {
+            for (std::string const& piece : pieces) {
+                longer.push_back(line + piece);
+            }
+        }
+        lines.insert(lines.end(), longer.begin(), longer.end());
+    }
+    return lines;
+}
+
+} // namespace
 
 TEST(ReturnCode, ExpectedToolLineGivesItsFourValues) {
     ReturnCode const rc("Rc::0::RcCmd::0::RetStr1::done::RetStr2::");
@@ -150,4 +180,21 @@ TEST(ReturnCode, CopiesAndAssignmentsKeepTheValues) {
     EXPECT_EQ(copy.get_Values(), original.get_Values());
     EXPECT_EQ(assigned.get_Rc(), 1);
     EXPECT_EQ(assigned.get_ValueOf("missing"), "");
+}
+
+TEST(ReturnCode, BlankReturnCodeIsReadyForOtherUnitsStartUpCode) {
+    EXPECT_EQ(gc_BlankRcAtStartUp, -1);
+    EXPECT_TRUE(gc_BlankIsBuiltAtStartUp);
+}
+
+TEST(ReturnCode, NoLineMadeOfHostilePiecesThrows) {
+    for (std::string const& line : hostileLines()) {
+        ReturnCode rc;
+        ASSERT_NO_THROW(rc = ReturnCode(line)) << line;
+        ASSERT_NO_THROW(rc.get_RcCmd()) << line;
+        if (!rc.contains("Rc")) {
+            ASSERT_EQ(rc.get_Rc(), -1) << line;
+        }
+        ASSERT_LE(rc.get_Values().size(), line.size() / 2 + 1) << line;
+    }
 }
