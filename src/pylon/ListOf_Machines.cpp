@@ -26,8 +26,8 @@ ListOf_Machines::ListOf_Machines() {
 }
 
 void ListOf_Machines::_initialize() {
-    for (auto const& entry :
-         Listing_Utility::u_run_Listing(gc_ListMachines_Tool, gc_ListMachines_Arguments)) {
+    for (auto const& entry : ::Quorvex::PYLON::Listing_Utility::u_run_Listing(
+             gc_ListMachines_Tool, gc_ListMachines_Arguments)) {
         _insert_Machine(entry);
     }
 }
@@ -50,8 +50,8 @@ void ListOf_Machines::_insert_Machine(std::string const& entry) {
     std::string typeModel;
     std::string serial;
     ::Quorvex::System::MTMS_Utility::u_split_TM_SE(fields[1], typeModel, serial);
-    push_back(Machine(static_cast<std::uint32_t>(objectType),
-                      ::Quorvex::System::MTMS(typeModel, serial)));
+    push_back(::Quorvex::PYLON::Machine(static_cast<std::uint32_t>(objectType),
+                                        ::Quorvex::System::MTMS(typeModel, serial)));
 }
 
 } // namespace PYLON

@@ -10,7 +10,7 @@ namespace PYLON {
 
 // The console's managed machines in the order its listing tool prints them.
 // Filled once by the constructor, which runs the listing tool.
-class ListOf_Machines : public std::vector<Machine> {
+class ListOf_Machines : public std::vector<::Quorvex::PYLON::Machine> {
 public:
     ListOf_Machines();
 

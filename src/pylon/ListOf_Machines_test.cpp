@@ -182,6 +182,10 @@ TEST(ListOf_Machines, OverlongLineIsTakenAsFarAsTheReaderKeepsIt) {
     EXPECT_EQ(machines.back(), "0|1234-ABC|50");
 }
 
+TEST(ListOf_Machines, HugeLineWithoutSeparatorsIsSkipped) {
+    EXPECT_EQ(machinesFromLine(std::string(200000, 'x')), Strings{});
+}
+
 TEST(ListOf_Machines, CopyKeepsTheMachines) {
     SimulatedConsole const console("[lsvtc]\nstdout 0:A-1_S;2:B-2_T\n");
     ListOf_Machines const original;

@@ -31,13 +31,14 @@ constexpr std::size_t gc_NumberOf_Fields = sizeof(gc_Field_Setters) / sizeof(gc_
 
 } // namespace
 
-void ListOf_Partitions::getPartitions_FromMachine(Machine const& machine) {
+void ListOf_Partitions::getPartitions_FromMachine(::Quorvex::PYLON::Machine const& machine) {
     if (machine.get_ObjectType() != gc_PartitionedObjectType) {
         return;
     }
     ::Quorvex::System::MTMS const& mtms = machine.get_MTMS();
     std::string const arguments = gc_ListPartitions_MachineOption + std::string(mtms);
-    for (auto const& record : Listing_Utility::u_run_Listing(gc_ListPartitions_Tool, arguments)) {
+    for (auto const& record :
+         ::Quorvex::PYLON::Listing_Utility::u_run_Listing(gc_ListPartitions_Tool, arguments)) {
         _insert_Partition(mtms, record);
     }
 }

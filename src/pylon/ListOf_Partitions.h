@@ -17,7 +17,7 @@ public:
 
     // Appends the partitions of one machine; only machines of object type 0
     // have their partitions listed.
-    void getPartitions_FromMachine(Machine const& machine);
+    void getPartitions_FromMachine(::Quorvex::PYLON::Machine const& machine);
 
 private:
     void _insert_Partition(::Quorvex::System::MTMS const& mtms, std::string const& record);

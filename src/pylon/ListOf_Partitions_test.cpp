@@ -185,6 +185,11 @@ TEST(ListOf_Partitions, HugeLineYieldsEveryRecord) {
     EXPECT_EQ(partitions.back(), "1234-ABC_10ABCDE|1999|10.0.0.1|1|h1999|Zeph|5.3");
 }
 
+TEST(ListOf_Partitions, HugeLineWithoutSeparatorsIsOnePartitionIDAsFarAsTheReaderKeepsIt) {
+    EXPECT_EQ(partitionsFromLine(std::string(200000, 'x')),
+              Strings{"1234-ABC_10ABCDE|" + std::string(65533, 'x') + "|||||"});
+}
+
 TEST(ListOf_Partitions, CopyKeepsTheRecords) {
     ListOf_Partitions original;
     original.push_back(::Quorvex::System::Partition(MTMS("1234-ABC", "10ABCDE"), "3", "h3"));
