@@ -27,8 +27,9 @@ function(quorvex_add_library subsystem)
   endforeach()
 endfunction()
 
-# quorvex_add_gtest(<name> SOURCES <files...> [LIBS <targets...>] [SANDBOX] [LABELS <labels...>])
+# quorvex_add_gtest(<name> SOURCES <files...> [LIBS <targets...>] [SANDBOX | LABEL <label>])
 # Builds one GoogleTest executable and registers each of its tests with ctest.
+# Discovered tests carry at most one label: "sandbox" for SANDBOX tests.
 # SANDBOX tests re-run themselves inside the private mount namespace of
 # tools/sandbox (see tests/support); where no namespace can be made they
 # exit with 77 and ctest reports them as skipped.
@@ -36,7 +37,7 @@ function(quorvex_add_gtest name)
   if(NOT QUORVEX_BUILD_TESTS)
     return()
   endif()
-  cmake_parse_arguments(ARG "SANDBOX" "" "SOURCES;LIBS;LABELS" ${ARGN})
+  cmake_parse_arguments(ARG "SANDBOX" "LABEL" "SOURCES;LIBS" ${ARGN})
   add_executable(${name} ${ARG_SOURCES})
   target_link_libraries(${name} PRIVATE quorvex_options ${ARG_LIBS} GTest::gtest)
   if(ARG_SANDBOX)
@@ -44,11 +45,12 @@ function(quorvex_add_gtest name)
   else()
     target_link_libraries(${name} PRIVATE GTest::gtest_main)
   endif()
-  set(labels ${ARG_LABELS})
+  set(properties SKIP_RETURN_CODE 77 TIMEOUT 300)
   if(ARG_SANDBOX)
-    list(APPEND labels sandbox)
+    set(ARG_LABEL sandbox)
   endif()
-  gtest_discover_tests(${name}
-    DISCOVERY_TIMEOUT 60
-    PROPERTIES SKIP_RETURN_CODE 77 LABELS "${labels}" TIMEOUT 300)
+  if(ARG_LABEL)
+    list(APPEND properties LABELS ${ARG_LABEL})
+  endif()
+  gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60 PROPERTIES ${properties})
 endfunction()
