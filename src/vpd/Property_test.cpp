@@ -11,6 +11,10 @@ using Quorvex::VPD::Value;
 
 std::string u_text(Value const& value) { return value; }
 
+// Made while the program starts, possibly before the unit that holds the
+// keyword table has run its own start-up code.
+std::string const gc_DisplayNameAtStartUp = Property("SE", "x").get_DisplayName();
+
 TEST(VPD_Property, KeywordSEGivesStringTypeAndTableDisplayName) {
     Property const property("SE", "10ABCDE");
     EXPECT_EQ(property.get_Keyword(), "SE");
@@ -104,6 +108,10 @@ TEST(VPD_Property, EqualityComparesKeywordAndTextButNotType) {
     EXPECT_FALSE(Property("SZ", "1") == Property("SE", "1"));
     EXPECT_TRUE(Property("SZ", "1") != Property("SZ", "2"));
     EXPECT_FALSE(Property("SZ", "1") != Property("SZ", "1"));
+}
+
+TEST(VPD_Property, PropertyMadeAtStartUpFindsTheKeywordTable) {
+    EXPECT_EQ(gc_DisplayNameAtStartUp, "Machine or Cabinet Serial Number");
 }
 
 TEST(VPD_Property, SharedTableIsTheBuiltInOne) {
