@@ -26,8 +26,7 @@ public:
     void operator()(::std::map<::std::string, ::std::string> const& m) const;
 
     // The number of decimal digits of the vector's size.
-    template <typename T>
-    static unsigned int get_IndexWidth_Vector(::std::vector<T> const& v) {
+    template <typename T> static unsigned int get_IndexWidth_Vector(::std::vector<T> const& v) {
         return static_cast<unsigned int>(::std::to_string(v.size()).size());
     }
 

@@ -24,7 +24,9 @@ Trace& u_get_Trace() {
 }
 
 void u_trace_Start(std::string const& fullCommand) {
-    u_get_Trace() << std::endl << "****** ShellCommand::execute ******\n" << fullCommand << std::endl;
+    u_get_Trace() << std::endl
+                  << "****** ShellCommand::execute ******\n"
+                  << fullCommand << std::endl;
 }
 
 void u_trace_Output(char const* title, ShellCommand::Lines const& lines) {

@@ -45,7 +45,8 @@ int main(int argc, char** argv) {
               << "returnCode " << command.get_ReturnCode() << "\n"
               << "stdout " << command.get_stdout().size() << "\n"
               << "stderr " << command.get_stderr().size() << "\n"
-              << "marker " << (std::filesystem::exists(marker, error) ? "present" : "absent") << "\n"
+              << "marker " << (std::filesystem::exists(marker, error) ? "present" : "absent")
+              << "\n"
               << "host " << Utility::get_HostName() << "\n"
               << "left " << countLeftTemporaryFiles() << std::endl;
     return 0;

@@ -27,8 +27,9 @@ TEST_F(TemporaryFileTest, CreatesEmptyOwnerOnlyFileNamedAfterBaseWithSixCharacte
     ASSERT_TRUE(file.isValid());
     EXPECT_EQ(file.get_BaseFileName(), _base);
     std::string const name = file.get_ActualFileName();
-    EXPECT_TRUE(std::regex_match(name, std::regex(std::regex_replace(_base, std::regex("\\."), "\\.") +
-                                                  "\\.[A-Za-z0-9]{6}")))
+    EXPECT_TRUE(std::regex_match(
+        name,
+        std::regex(std::regex_replace(_base, std::regex("\\."), "\\.") + "\\.[A-Za-z0-9]{6}")))
         << name;
     struct stat status {};
     ASSERT_EQ(::stat(name.c_str(), &status), 0);

@@ -93,8 +93,7 @@ TEST_F(TraceTest, SecondNameIsIgnoredAndWritesGoToFirstFile) {
         firstTrace << "first again" << std::endl;
         return 0;
     });
-    EXPECT_EQ(QuorvexTest::readFile(first),
-              "through the first\nthrough the second\nfirst again\n");
+    EXPECT_EQ(QuorvexTest::readFile(first), "through the first\nthrough the second\nfirst again\n");
     EXPECT_FALSE(QuorvexTest::fileExists(second));
 }
 
@@ -209,7 +208,8 @@ TEST_F(TraceTest, ShellCommandRunWritesExactBlock) {
     std::smatch names;
     ASSERT_TRUE(std::regex_search(
         trace, names,
-        std::regex(" > (/tmp/ShellCommand\\.[A-Za-z0-9]{6}) 2> (/tmp/ShellCommand\\.[A-Za-z0-9]{6})\n")));
+        std::regex(
+            " > (/tmp/ShellCommand\\.[A-Za-z0-9]{6}) 2> (/tmp/ShellCommand\\.[A-Za-z0-9]{6})\n")));
     EXPECT_NE(names[1].str(), names[2].str());
     EXPECT_FALSE(QuorvexTest::fileExists(names[1].str()));
     EXPECT_FALSE(QuorvexTest::fileExists(names[2].str()));
@@ -299,8 +299,8 @@ TEST(Utility_get_TimeStamp, HasThirteenDigitsEndingInThreeZeros) {
     std::string const stamp = Utility::get_TimeStamp();
     std::time_t const after = std::time(nullptr);
     EXPECT_TRUE(std::regex_match(stamp, std::regex("[0-9]{10}000"))) << stamp;
-    bool const inRange = stamp == std::to_string(before) + "000" ||
-                         stamp == std::to_string(after) + "000";
+    bool const inRange =
+        stamp == std::to_string(before) + "000" || stamp == std::to_string(after) + "000";
     EXPECT_TRUE(inRange) << stamp << " not at " << before << " or " << after;
 }
 
