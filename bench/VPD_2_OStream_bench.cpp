@@ -31,8 +31,7 @@ Quorvex::VPD::ResourceSet u_largeSet() {
         }
         machine.insert_Resource("Partitions", partition);
     }
-    Quorvex::VPD::ResourceSet set("com.zor.inventory.Hardware", "Hardware", "1.0",
-                                  "1700000000000");
+    Quorvex::VPD::ResourceSet set("com.zor.inventory.Hardware", "Hardware", "1.0", "1700000000000");
     set.set_Resource(machine);
     return set;
 }

@@ -37,7 +37,9 @@ ResourceSet u_hardwareSet(std::string const& timeStamp, Resource const& resource
     return set;
 }
 
-Resource u_leaf(std::string const& name) { return Resource(name, name); }
+Resource u_leaf(std::string const& name) {
+    return Resource(name, name);
+}
 
 // Machine M with property K (display name D, value R) and one partition P;
 // both unique IDs stay empty.

@@ -8,8 +8,8 @@ namespace Transform {
 VPD_PropertyGroup_2_XML_Element::VPD_PropertyGroup_2_XML_Element(XML::Element& target)
     : _Target(target) {}
 
-XML::Element& VPD_PropertyGroup_2_XML_Element::operator()(
-    Quorvex::VPD::PropertyGroup const& group) {
+XML::Element&
+VPD_PropertyGroup_2_XML_Element::operator()(Quorvex::VPD::PropertyGroup const& group) {
     if (group.empty()) {
         return _Target;
     }

@@ -22,10 +22,11 @@ TEST(Transform_VPD_ResourceList_2_XML_Element, ResourcesComeInUniqueIDOrder) {
     list.insert(Resource("first", "a"));
     XML::Element element;
     Transform::VPD_ResourceList_2_XML_Element{element}(list);
-    EXPECT_EQ(u_text(element), "<ResourceList displayName=\"Partitions\">\n"
-                               "   <Resource displayName=\"first\" uniqueId=\"a\">first</Resource>\n"
-                               "   <Resource displayName=\"second\" uniqueId=\"b\">second</Resource>\n"
-                               "</ResourceList>");
+    EXPECT_EQ(u_text(element),
+              "<ResourceList displayName=\"Partitions\">\n"
+              "   <Resource displayName=\"first\" uniqueId=\"a\">first</Resource>\n"
+              "   <Resource displayName=\"second\" uniqueId=\"b\">second</Resource>\n"
+              "</ResourceList>");
 }
 
 } // namespace

@@ -30,15 +30,16 @@ TEST(Transform_VPD_ResourceSet_2_XML_Element, AllSetListsAreWrittenInNameOrderEm
     set.insert_ResourceList(ResourceList("Adapters"));
     XML::Element element;
     Transform::VPD_ResourceSet_2_XML_Element{element}(set);
-    EXPECT_EQ(u_text(element), "<ResourceSet class=\"C\" timestamp=\"S\" type=\"T\" version=\"V\">\n"
-                               "   <Resource displayName=\"m\" uniqueId=\"m\">m</Resource>\n"
-                               "   <ResourceList displayName=\"Adapters\"></ResourceList>\n"
-                               "   <ResourceList displayName=\"Cards\">\n"
-                               "      <Resource displayName=\"c\" uniqueId=\"c\">c</Resource>\n"
-                               "   </ResourceList>\n"
-                               "   <ResourceList displayName=\"Disks\"></ResourceList>\n"
-                               "   <ResourceList displayName=\"Partitions\"></ResourceList>\n"
-                               "</ResourceSet>");
+    EXPECT_EQ(u_text(element),
+              "<ResourceSet class=\"C\" timestamp=\"S\" type=\"T\" version=\"V\">\n"
+              "   <Resource displayName=\"m\" uniqueId=\"m\">m</Resource>\n"
+              "   <ResourceList displayName=\"Adapters\"></ResourceList>\n"
+              "   <ResourceList displayName=\"Cards\">\n"
+              "      <Resource displayName=\"c\" uniqueId=\"c\">c</Resource>\n"
+              "   </ResourceList>\n"
+              "   <ResourceList displayName=\"Disks\"></ResourceList>\n"
+              "   <ResourceList displayName=\"Partitions\"></ResourceList>\n"
+              "</ResourceSet>");
 }
 
 } // namespace

@@ -31,10 +31,9 @@ VPD_Resource_2_XML_Element::VPD_Resource_2_XML_Element(XML::Element& target) : _
 XML::Element& VPD_Resource_2_XML_Element::operator()(Quorvex::VPD::Resource const& resource) {
     _Target.set_Tag(XML::Tag::Type_BeginTag);
     _Target.set_Name("Resource");
-    _Target.get_Content().reserve(_Target.get_NumberOfContent() + 1 +
-                                  resource.get_NumberOf_Properties() +
-                                  resource.get_NumberOf_PropertyGroups() +
-                                  resource.get_NumberOf_ResourceLists());
+    _Target.get_Content().reserve(
+        _Target.get_NumberOfContent() + 1 + resource.get_NumberOf_Properties() +
+        resource.get_NumberOf_PropertyGroups() + resource.get_NumberOf_ResourceLists());
     _Target.insert_Content(XML::Element(resource.get_DisplayName(), XML::Tag::Type_String));
     _insert_Attributes(resource);
     _insert_Properties(resource);

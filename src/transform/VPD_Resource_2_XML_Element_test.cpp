@@ -63,22 +63,23 @@ TEST(Transform_VPD_Resource_2_XML_Element, PropertiesThenGroupsThenLists) {
     resource.insert_PropertyGroup(group);
     resource.insert_Resource("Cards", Resource("c", ""));
     resource.insert_Property(Property("TM", "t"));
-    EXPECT_EQ(u_resourceText(resource), "<Resource displayName=\"m\">\n"
-                                        "   m\n"
-                                        "   <Property displayName=\"Machine Type-Model\" name=\"TM\">\n"
-                                        "      TM\n"
-                                        "      <Value type=\"string\">t</Value>\n"
-                                        "   </Property>\n"
-                                        "   <PropertyGroup displayName=\"G\">\n"
-                                        "      <Property displayName=\"Size\" name=\"SZ\">\n"
-                                        "         SZ\n"
-                                        "         <Value type=\"string\">1</Value>\n"
-                                        "      </Property>\n"
-                                        "   </PropertyGroup>\n"
-                                        "   <ResourceList displayName=\"Cards\">\n"
-                                        "      <Resource displayName=\"c\">c</Resource>\n"
-                                        "   </ResourceList>\n"
-                                        "</Resource>");
+    EXPECT_EQ(u_resourceText(resource),
+              "<Resource displayName=\"m\">\n"
+              "   m\n"
+              "   <Property displayName=\"Machine Type-Model\" name=\"TM\">\n"
+              "      TM\n"
+              "      <Value type=\"string\">t</Value>\n"
+              "   </Property>\n"
+              "   <PropertyGroup displayName=\"G\">\n"
+              "      <Property displayName=\"Size\" name=\"SZ\">\n"
+              "         SZ\n"
+              "         <Value type=\"string\">1</Value>\n"
+              "      </Property>\n"
+              "   </PropertyGroup>\n"
+              "   <ResourceList displayName=\"Cards\">\n"
+              "      <Resource displayName=\"c\">c</Resource>\n"
+              "   </ResourceList>\n"
+              "</Resource>");
 }
 
 TEST(Transform_VPD_Resource_2_XML_Element, EmptyPartitionsListIsWrittenButOtherEmptyListsAreNot) {
@@ -86,21 +87,23 @@ TEST(Transform_VPD_Resource_2_XML_Element, EmptyPartitionsListIsWrittenButOtherE
     resource.insert_ResourceList(ResourceList("Partitions"));
     resource.insert_ResourceList(ResourceList("Disks"));
     resource.insert_ResourceList(ResourceList("Adapters"));
-    EXPECT_EQ(u_resourceText(resource), "<Resource displayName=\"m\">\n"
-                                        "   m\n"
-                                        "   <ResourceList displayName=\"Partitions\"></ResourceList>\n"
-                                        "</Resource>");
+    EXPECT_EQ(u_resourceText(resource),
+              "<Resource displayName=\"m\">\n"
+              "   m\n"
+              "   <ResourceList displayName=\"Partitions\"></ResourceList>\n"
+              "</Resource>");
 }
 
 TEST(Transform_VPD_Resource_2_XML_Element, EmptyEnclosuresListIsWrittenAfterPartitions) {
     Resource resource("m", "");
     resource.insert_ResourceList(ResourceList("Enclosures"));
     resource.insert_ResourceList(ResourceList("Partitions"));
-    EXPECT_EQ(u_resourceText(resource), "<Resource displayName=\"m\">\n"
-                                        "   m\n"
-                                        "   <ResourceList displayName=\"Partitions\"></ResourceList>\n"
-                                        "   <ResourceList displayName=\"Enclosures\"></ResourceList>\n"
-                                        "</Resource>");
+    EXPECT_EQ(u_resourceText(resource),
+              "<Resource displayName=\"m\">\n"
+              "   m\n"
+              "   <ResourceList displayName=\"Partitions\"></ResourceList>\n"
+              "   <ResourceList displayName=\"Enclosures\"></ResourceList>\n"
+              "</Resource>");
 }
 
 TEST(Transform_VPD_Resource_2_XML_Element, OnlyEmptyOtherListsGiveAResourceWithItsTextOnly) {

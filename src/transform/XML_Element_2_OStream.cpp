@@ -56,8 +56,7 @@ void XML_Element_2_OStream::_print_Attribute(XML::Element const& element) {
 
 bool XML_Element_2_OStream::_printSpecial_Declaration_Attribute(XML::Element const& element) {
     if (element.get_Tag() != XML::Tag::Type_Declaration ||
-        element.get_Name() != gc_DeclarationTarget ||
-        !element.has_Attribute(gc_VersionAttribute)) {
+        element.get_Name() != gc_DeclarationTarget || !element.has_Attribute(gc_VersionAttribute)) {
         return false;
     }
     _print_OneAttribute(gc_VersionAttribute, element.get_AttributeValue(gc_VersionAttribute));
@@ -100,16 +99,19 @@ void XML_Element_2_OStream::_print_EndTag(XML::Element const& element) {
     }
 }
 
-void XML_Element_2_OStream::_print_String(XML::Element const& element) { _print_Name(element); }
+void XML_Element_2_OStream::_print_String(XML::Element const& element) {
+    _print_Name(element);
+}
 
-void XML_Element_2_OStream::_insert_NewLine() { _OStream << std::endl; }
+void XML_Element_2_OStream::_insert_NewLine() {
+    _OStream << std::endl;
+}
 
 void XML_Element_2_OStream::_insert_Indent() {
     _OStream << std::string(_IndentationLevel * gc_IndentWidth, ' ');
 }
 
-void XML_Element_2_OStream::_print_OneAttribute(std::string const& name,
-                                                std::string const& value) {
+void XML_Element_2_OStream::_print_OneAttribute(std::string const& name, std::string const& value) {
     _OStream << ' ' << name << "=\"" << value << '"';
 }
 

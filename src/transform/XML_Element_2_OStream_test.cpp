@@ -61,7 +61,8 @@ TEST(Transform_XML_Element_2_OStream, TwoTopLevelCallsPutBothElementsOnOneLine) 
 }
 
 TEST(Transform_XML_Element_2_OStream, OneTextChildStandsBetweenTheTagsOnOneLine) {
-    Element const element = u_withChildren("A", Tag::Type_BeginTag, {u_element("text", Tag::Type_String)});
+    Element const element =
+        u_withChildren("A", Tag::Type_BeginTag, {u_element("text", Tag::Type_String)});
     EXPECT_EQ(u_text(element), "<A>text</A>");
 }
 
@@ -103,8 +104,7 @@ TEST(Transform_XML_Element_2_OStream, DeclarationWritesOtherAttributesSortedAfte
     declaration.insert_Attribute("standalone", "yes");
     declaration.insert_Attribute("encoding", "UTF-8");
     declaration.insert_Attribute("version", "1.0");
-    EXPECT_EQ(u_text(declaration),
-              "<?xml version=\"1.0\" encoding=\"UTF-8\" standalone=\"yes\"?>");
+    EXPECT_EQ(u_text(declaration), "<?xml version=\"1.0\" encoding=\"UTF-8\" standalone=\"yes\"?>");
 }
 
 TEST(Transform_XML_Element_2_OStream, DeclarationWithoutVersionWritesSortedAttributes) {
@@ -122,8 +122,8 @@ TEST(Transform_XML_Element_2_OStream, OtherInstructionsWriteSortedAttributes) {
 }
 
 TEST(Transform_XML_Element_2_OStream, QuoteAndAmpersandInValuesAreWrittenUnchanged) {
-    Element element = u_withChildren("A", Tag::Type_BeginTag,
-                                     {u_element("x < y & \"z\"", Tag::Type_String)});
+    Element element =
+        u_withChildren("A", Tag::Type_BeginTag, {u_element("x < y & \"z\"", Tag::Type_String)});
     element.insert_Attribute("v", "say \"hi\" & <bye>");
     EXPECT_EQ(u_text(element), "<A v=\"say \"hi\" & <bye>\">x < y & \"z\"</A>");
 }

@@ -17,8 +17,8 @@ Quorvex::VPD::Value& XML_Element_2_VPD_Value::operator()(XML::Element const& ele
         if (!_isValueElement(element)) {
             throw Error_ElementIsNotValue();
         }
-        _Target = Quorvex::VPD::Value(element.get_Content().front().get_Name(),
-                                      gc_ValueType_String);
+        _Target =
+            Quorvex::VPD::Value(element.get_Content().front().get_Name(), gc_ValueType_String);
         return _Target;
     } catch (Error_ElementIsNotValue const&) {
         throw;

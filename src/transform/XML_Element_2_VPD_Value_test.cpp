@@ -20,7 +20,9 @@ Element u_valueElement(std::string const& type, Element const& child) {
     return element;
 }
 
-std::string u_text(Value const& value) { return value; }
+std::string u_text(Value const& value) {
+    return value;
+}
 
 TEST(Transform_XML_Element_2_VPD_Value, ValueElementGivesAStringValueWhateverItsType) {
     Value value("old", 3);

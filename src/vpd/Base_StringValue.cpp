@@ -3,7 +3,9 @@
 namespace Quorvex {
 namespace VPD {
 
-Base_StringValue::operator std::string() const { return __StringValue(); }
+Base_StringValue::operator std::string() const {
+    return __StringValue();
+}
 
 } // namespace VPD
 } // namespace Quorvex

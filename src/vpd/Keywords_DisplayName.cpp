@@ -138,11 +138,17 @@ std::string const& Keywords_DisplayName::operator[](std::string const& keyword) 
     return hit == _Table.end() ? keyword : hit->second;
 }
 
-Keywords_DisplayName::const_iterator Keywords_DisplayName::begin() const { return _Table.begin(); }
+Keywords_DisplayName::const_iterator Keywords_DisplayName::begin() const {
+    return _Table.begin();
+}
 
-Keywords_DisplayName::const_iterator Keywords_DisplayName::end() const { return _Table.end(); }
+Keywords_DisplayName::const_iterator Keywords_DisplayName::end() const {
+    return _Table.end();
+}
 
-std::size_t Keywords_DisplayName::size() const { return _Table.size(); }
+std::size_t Keywords_DisplayName::size() const {
+    return _Table.size();
+}
 
 void Keywords_DisplayName::_insert(std::string const& keyword, std::string const& displayName) {
     _Table.emplace(keyword, displayName);

@@ -11,8 +11,7 @@ namespace VPD {
 // byte order of the keys. An element whose key is present already is merged
 // into the one there with `+=`, so what was inserted first wins wherever the
 // element's merge keeps its own content.
-template <typename T>
-class ListOf_ {
+template <typename T> class ListOf_ {
 public:
     class Error_ElementNotFound {};
 

@@ -29,9 +29,13 @@ Property::Property(std::string const& keyword, Value const& value)
     _lookUp_DisplayName();
 }
 
-std::string const& Property::get_Keyword() const { return _Keyword; }
+std::string const& Property::get_Keyword() const {
+    return _Keyword;
+}
 
-Value const& Property::get_Value() const { return _Value; }
+Value const& Property::get_Value() const {
+    return _Value;
+}
 
 void Property::set_Keyword(std::string const& keyword) {
     _Keyword = keyword;
@@ -42,11 +46,17 @@ void Property::set_Value(std::string const& valueText) {
     _Value = Value(valueText, gc_ValueType_String);
 }
 
-void Property::set_Value(Value const& value) { _Value = value; }
+void Property::set_Value(Value const& value) {
+    _Value = value;
+}
 
-Property& Property::operator+=(Property const&) { return *this; }
+Property& Property::operator+=(Property const&) {
+    return *this;
+}
 
-std::string const& Property::__StringValue() const { return _Keyword; }
+std::string const& Property::__StringValue() const {
+    return _Keyword;
+}
 
 void Property::_lookUp_DisplayName() {
     std::string const& displayName = get_DisplayName();
@@ -56,12 +66,13 @@ void Property::_lookUp_DisplayName() {
 }
 
 bool operator==(Property const& a, Property const& b) {
-    return a.get_Keyword() == b.get_Keyword() &&
-           static_cast<std::string const&>(a.get_Value()) ==
-               static_cast<std::string const&>(b.get_Value());
+    return a.get_Keyword() == b.get_Keyword() && static_cast<std::string const&>(a.get_Value()) ==
+                                                     static_cast<std::string const&>(b.get_Value());
 }
 
-bool operator!=(Property const& a, Property const& b) { return !(a == b); }
+bool operator!=(Property const& a, Property const& b) {
+    return !(a == b);
+}
 
 } // namespace VPD
 } // namespace Quorvex

@@ -9,7 +9,9 @@ namespace {
 using Quorvex::VPD::Property;
 using Quorvex::VPD::Value;
 
-std::string u_text(Value const& value) { return value; }
+std::string u_text(Value const& value) {
+    return value;
+}
 
 // Made while the program starts, possibly before the unit that holds the
 // keyword table has run its own start-up code.

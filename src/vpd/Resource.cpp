@@ -53,7 +53,9 @@ bool Resource::insert_Resource(std::string const& listName, Resource const& reso
     return true;
 }
 
-std::string const& Resource::__StringValue() const { return get_UniqueID(); }
+std::string const& Resource::__StringValue() const {
+    return get_UniqueID();
+}
 
 } // namespace VPD
 } // namespace Quorvex

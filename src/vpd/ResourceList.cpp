@@ -7,7 +7,9 @@ ResourceList::ResourceList() = default;
 
 ResourceList::ResourceList(std::string const& name) : Base(name) {}
 
-std::string const& ResourceList::__StringValue() const { return get_DisplayName(); }
+std::string const& ResourceList::__StringValue() const {
+    return get_DisplayName();
+}
 
 } // namespace VPD
 } // namespace Quorvex

@@ -20,7 +20,9 @@ ResourceSet& ResourceSet::operator+=(ResourceSet const& other) {
     return *this;
 }
 
-std::string const& ResourceSet::__StringValue() const { return get_Class(); }
+std::string const& ResourceSet::__StringValue() const {
+    return get_Class();
+}
 
 } // namespace VPD
 } // namespace Quorvex

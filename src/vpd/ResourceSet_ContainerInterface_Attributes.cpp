@@ -10,9 +10,13 @@ ResourceSet_ContainerInterface_Attributes::ResourceSet_ContainerInterface_Attrib
     std::string const& timeStamp)
     : _Class(classText), _Type(type), _Version(version), _TimeStamp(timeStamp) {}
 
-std::string const& ResourceSet_ContainerInterface_Attributes::get_Class() const { return _Class; }
+std::string const& ResourceSet_ContainerInterface_Attributes::get_Class() const {
+    return _Class;
+}
 
-std::string const& ResourceSet_ContainerInterface_Attributes::get_Type() const { return _Type; }
+std::string const& ResourceSet_ContainerInterface_Attributes::get_Type() const {
+    return _Type;
+}
 
 std::string const& ResourceSet_ContainerInterface_Attributes::get_Version() const {
     return _Version;
@@ -26,7 +30,9 @@ void ResourceSet_ContainerInterface_Attributes::set_Class(std::string const& cla
     _Class = classText;
 }
 
-void ResourceSet_ContainerInterface_Attributes::set_Type(std::string const& type) { _Type = type; }
+void ResourceSet_ContainerInterface_Attributes::set_Type(std::string const& type) {
+    _Type = type;
+}
 
 void ResourceSet_ContainerInterface_Attributes::set_Version(std::string const& version) {
     _Version = version;

@@ -11,7 +11,8 @@ std::size_t Resource_ContainerInterface_ListOf_Properties::get_NumberOf_Properti
     return _ListOf_Properties.size();
 }
 
-ListOf_Properties const& Resource_ContainerInterface_ListOf_Properties::get_ListOf_Properties() const {
+ListOf_Properties const&
+Resource_ContainerInterface_ListOf_Properties::get_ListOf_Properties() const {
     return _ListOf_Properties;
 }
 

@@ -17,7 +17,8 @@ Resource_ContainerInterface_ListOf_PropertyGroups::get_ListOf_PropertyGroups() c
     return _ListOf_PropertyGroups;
 }
 
-ListOf_<PropertyGroup>& Resource_ContainerInterface_ListOf_PropertyGroups::get_ListOf_PropertyGroups() {
+ListOf_<PropertyGroup>&
+Resource_ContainerInterface_ListOf_PropertyGroups::get_ListOf_PropertyGroups() {
     return _ListOf_PropertyGroups;
 }
 

@@ -25,7 +25,8 @@ Resource_ContainerInterface_ListOf_ResourceLists::operator=(
     return *this;
 }
 
-Resource_ContainerInterface_ListOf_ResourceLists::~Resource_ContainerInterface_ListOf_ResourceLists() {
+Resource_ContainerInterface_ListOf_ResourceLists::
+    ~Resource_ContainerInterface_ListOf_ResourceLists() {
     delete _ContentPtr;
     _ContentPtr = nullptr;
 }
@@ -45,12 +46,14 @@ Resource_ContainerInterface_ListOf_ResourceLists::get_ListOf_ResourceLists() con
     return *_ContentPtr;
 }
 
-ListOf_<ResourceList>& Resource_ContainerInterface_ListOf_ResourceLists::get_ListOf_ResourceLists() {
+ListOf_<ResourceList>&
+Resource_ContainerInterface_ListOf_ResourceLists::get_ListOf_ResourceLists() {
     _verify_ContentPtr();
     return *_ContentPtr;
 }
 
-void Resource_ContainerInterface_ListOf_ResourceLists::insert_ResourceList(ResourceList const& list) {
+void Resource_ContainerInterface_ListOf_ResourceLists::insert_ResourceList(
+    ResourceList const& list) {
     get_ListOf_ResourceLists().insert(list);
 }
 

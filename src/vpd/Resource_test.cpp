@@ -37,11 +37,10 @@ Resource u_threeLevelTree() {
     return machine;
 }
 
-std::string const gc_ThreeLevelTree =
-    "(name-machine|machine|){TM=1234-ABC;}[Partitions/Partitions:"
-    "(name-lpar1|lpar1|){HN=host1;}[Adapters/Adapters:"
-    "(name-card1|card1|){FN=00E1234;}[Ports/Ports:"
-    "(name-port1|port1|){LO=P1-C1-T1;}]]]";
+std::string const gc_ThreeLevelTree = "(name-machine|machine|){TM=1234-ABC;}[Partitions/Partitions:"
+                                      "(name-lpar1|lpar1|){HN=host1;}[Adapters/Adapters:"
+                                      "(name-card1|card1|){FN=00E1234;}[Ports/Ports:"
+                                      "(name-port1|port1|){LO=P1-C1-T1;}]]]";
 
 TEST(VPD_Resource, DefaultIsEmpty) {
     Resource const resource;
@@ -171,8 +170,8 @@ TEST(VPD_Resource, CopiedResourceNestedListsAreIndependent) {
     Resource copy(source);
     Resource& partition =
         copy.get_ListOf_ResourceLists().find_orCreate("Partitions").find_orCreate("lpar1");
-    Resource& card = partition.get_ListOf_ResourceLists().find_orCreate("Adapters").find_orCreate(
-        "card1");
+    Resource& card =
+        partition.get_ListOf_ResourceLists().find_orCreate("Adapters").find_orCreate("card1");
     card.insert_Resource("Ports", Resource("port2", "port2"));
     card.insert_Property(Property("SN", "changed"));
     partition.insert_Resource("Disks", Resource("disk1", "disk1"));
@@ -185,7 +184,9 @@ TEST(VPD_Resource, CopiedResourceNestedListsAreIndependent) {
 TEST(VPD_Resource, ChangingTheSourceLeavesTheCopyUnchanged) {
     Resource source = u_threeLevelTree();
     Resource const copy(source);
-    source.get_ListOf_ResourceLists().find_orCreate("Partitions").find_orCreate("lpar1")
+    source.get_ListOf_ResourceLists()
+        .find_orCreate("Partitions")
+        .find_orCreate("lpar1")
         .insert_Resource("Adapters", Resource("card2", "card2"));
     EXPECT_EQ(u_resource(copy), gc_ThreeLevelTree);
 }
@@ -196,7 +197,9 @@ TEST(VPD_Resource, AssignedResourceIsADeepIndependentCopy) {
     target.insert_Resource("Old", Resource("o", "o"));
     target = source;
     EXPECT_EQ(u_resource(target), gc_ThreeLevelTree);
-    target.get_ListOf_ResourceLists().find_orCreate("Partitions").find_orCreate("lpar1")
+    target.get_ListOf_ResourceLists()
+        .find_orCreate("Partitions")
+        .find_orCreate("lpar1")
         .insert_Property(Property("OS", "changed"));
     EXPECT_EQ(u_resource(source), gc_ThreeLevelTree);
 }

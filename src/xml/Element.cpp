@@ -20,36 +20,62 @@ Element& Element::operator=(Element const& other) {
 
 Element::~Element() = default;
 
-Tag const& Element::get_Tag() const { return _Tag; }
+Tag const& Element::get_Tag() const {
+    return _Tag;
+}
 
-std::string const& Element::get_Namespace() const { return _Namespace; }
+std::string const& Element::get_Namespace() const {
+    return _Namespace;
+}
 
-std::string const& Element::get_Name() const { return _Name; }
+std::string const& Element::get_Name() const {
+    return _Name;
+}
 
-Element::Attributes const& Element::get_Attribute() const { return _Attribute; }
+Element::Attributes const& Element::get_Attribute() const {
+    return _Attribute;
+}
 
-std::vector<Element> const& Element::get_Content() const { return _Content; }
+std::vector<Element> const& Element::get_Content() const {
+    return _Content;
+}
 
-std::vector<Element>& Element::get_Content() { return _Content; }
+std::vector<Element>& Element::get_Content() {
+    return _Content;
+}
 
-unsigned long Element::get_NumberOfAttribute() const { return _Attribute.size(); }
+unsigned long Element::get_NumberOfAttribute() const {
+    return _Attribute.size();
+}
 
-unsigned long Element::get_NumberOfContent() const { return _Content.size(); }
+unsigned long Element::get_NumberOfContent() const {
+    return _Content.size();
+}
 
-void Element::set_Tag(unsigned long const& type) { _Tag.set_Type(type); }
+void Element::set_Tag(unsigned long const& type) {
+    _Tag.set_Type(type);
+}
 
-void Element::set_Tag(Tag const& tag) { _Tag = tag; }
+void Element::set_Tag(Tag const& tag) {
+    _Tag = tag;
+}
 
-void Element::set_Namespace(std::string const& nameSpace) { _Namespace = nameSpace; }
+void Element::set_Namespace(std::string const& nameSpace) {
+    _Namespace = nameSpace;
+}
 
-void Element::set_Name(std::string const& name) { _Name = name; }
+void Element::set_Name(std::string const& name) {
+    _Name = name;
+}
 
 std::string Element::get_AttributeValue(std::string const& name) const {
     Attributes::const_iterator const hit = _Attribute.find(name);
     return hit == _Attribute.end() ? std::string() : hit->second;
 }
 
-bool Element::has_Attribute(std::string const& name) const { return _Attribute.count(name) != 0; }
+bool Element::has_Attribute(std::string const& name) const {
+    return _Attribute.count(name) != 0;
+}
 
 unsigned long Element::insert_Attribute(std::string const& name, std::string const& value) {
     if (!_Attribute.emplace(name, value).second) {

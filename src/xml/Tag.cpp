@@ -43,15 +43,25 @@ Tag& Tag::operator=(unsigned long const& type) {
     return *this;
 }
 
-unsigned long const& Tag::get_Type() const { return _Type; }
+unsigned long const& Tag::get_Type() const {
+    return _Type;
+}
 
-void Tag::set_Type(unsigned long const& type) { _Type = type; }
+void Tag::set_Type(unsigned long const& type) {
+    _Type = type;
+}
 
-std::string Tag::get_BeginTag_StartDelimiter() const { return u_get_Row(_Type).start; }
+std::string Tag::get_BeginTag_StartDelimiter() const {
+    return u_get_Row(_Type).start;
+}
 
-std::string Tag::get_BeginTag_EndDelimiter() const { return u_get_Row(_Type).end; }
+std::string Tag::get_BeginTag_EndDelimiter() const {
+    return u_get_Row(_Type).end;
+}
 
-bool Tag::has_EndTag() const { return u_get_Row(_Type).endTagType != 0; }
+bool Tag::has_EndTag() const {
+    return u_get_Row(_Type).endTagType != 0;
+}
 
 std::string Tag::get_EndTag_StartDelimiter() const {
     return u_get_Row(u_get_Row(_Type).endTagType).start;
@@ -61,10 +71,16 @@ std::string Tag::get_EndTag_EndDelimiter() const {
     return u_get_Row(u_get_Row(_Type).endTagType).end;
 }
 
-bool operator==(Tag const& a, Tag const& b) { return a.get_Type() == b.get_Type(); }
+bool operator==(Tag const& a, Tag const& b) {
+    return a.get_Type() == b.get_Type();
+}
 
-bool operator==(Tag const& tag, unsigned long const& type) { return tag.get_Type() == type; }
+bool operator==(Tag const& tag, unsigned long const& type) {
+    return tag.get_Type() == type;
+}
 
-bool operator!=(Tag const& tag, unsigned long const& type) { return !(tag == type); }
+bool operator!=(Tag const& tag, unsigned long const& type) {
+    return !(tag == type);
+}
 
 } // namespace XML
