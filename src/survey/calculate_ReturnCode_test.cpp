@@ -1,0 +1,51 @@
+#include "survey/calculate_ReturnCode.h"
+
+#include "survey/SurveyTest_Utility.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+namespace {
+
+using SurveyTest_Utility::ChildOutput;
+
+constexpr char gc_Heading[] = "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n";
+
+// Standard output and standard error of calculate_ReturnCode in a child process.
+ChildOutput u_calculate(std::vector<std::string> const& returnCodes) {
+    return SurveyTest_Utility::u_run_InChild([&returnCodes]() {
+        calculate_ReturnCode(returnCodes);
+        return 0;
+    });
+}
+
+TEST(calculate_ReturnCode, AllPartitionsSurveyedPrintsZero) {
+    ChildOutput const output = u_calculate({"0", "0", "0"});
+    EXPECT_EQ(output.stderrText, std::string(gc_Heading) + "0");
+    EXPECT_EQ(output.stdoutText, "");
+}
+
+TEST(calculate_ReturnCode, SomePartitionsFailedPrintsFour) {
+    EXPECT_EQ(u_calculate({"8", "8", "0"}).stderrText, std::string(gc_Heading) + "4");
+}
+
+TEST(calculate_ReturnCode, AllPartitionsFailedPrintsEight) {
+    EXPECT_EQ(u_calculate({"8", "8"}).stderrText, std::string(gc_Heading) + "8");
+}
+
+TEST(calculate_ReturnCode, NoPartitionListedPrintsEight) {
+    EXPECT_EQ(u_calculate({}).stderrText, std::string(gc_Heading) + "8");
+}
+
+TEST(calculate_ReturnCode, OnlyCodesThatAreExactlyZeroCount) {
+    EXPECT_EQ(u_calculate({"0 ", " 0", "00", ""}).stderrText, std::string(gc_Heading) + "8");
+    EXPECT_EQ(u_calculate({"0", "00"}).stderrText, std::string(gc_Heading) + "4");
+}
+
+TEST(calculate_ReturnCode, OneSurveyedPartitionPrintsZero) {
+    EXPECT_EQ(u_calculate({"0"}).stderrText, std::string(gc_Heading) + "0");
+}
+
+} // namespace
