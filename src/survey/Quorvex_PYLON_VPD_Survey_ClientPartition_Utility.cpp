@@ -48,8 +48,7 @@ unsigned int _u_get_ActiveStatus(Quorvex::System::Partition const& partition) {
 void u_create_VPD_ResourceSet_forFailedPartition(Quorvex::System::Partition const& partition,
                                                  std::string const& reason,
                                                  Quorvex::VPD::ResourceSet& set) {
-    Quorvex::PYLON::Utility_VPD_XML::initialize_Default_VPD_ResourceSet(set,
-                                                                        partition.get_MTMS());
+    Quorvex::PYLON::Utility_VPD_XML::initialize_Default_VPD_ResourceSet(set, partition.get_MTMS());
     Quorvex::VPD::Resource resource;
     Transform::System_Partition_2_VPD_Resource()(partition, resource);
     resource.insert_Property(Quorvex::VPD::Property(gc_ReasonKeyword, reason));

@@ -131,7 +131,8 @@ std::string u_normalise_TemporaryNames(std::string const& text) {
     static std::regex const temporaryName("/tmp/ShellCommand\\.([A-Za-z0-9]{6})");
     std::map<std::string, std::string> generated;
     return u_replace_Matches(text, temporaryName, [&generated](std::smatch const& match) {
-        auto const placed = generated.emplace(match[1].str(), u_get_GeneratedName(generated.size()));
+        auto const placed =
+            generated.emplace(match[1].str(), u_get_GeneratedName(generated.size()));
         return "/tmp/ShellCommand." + placed.first->second;
     });
 }

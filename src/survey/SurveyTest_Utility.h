@@ -10,9 +10,9 @@
 namespace SurveyTest_Utility {
 
 struct ChildOutput {
-    int exitStatus = -1;     // work's result, or 128 + the signal that ended the child
-    std::string stdoutText;  // exact bytes
-    std::string stderrText;  // exact bytes
+    int exitStatus = -1;    // work's result, or 128 + the signal that ended the child
+    std::string stdoutText; // exact bytes
+    std::string stderrText; // exact bytes
 };
 
 // Runs work in a forked child, whose process-wide state (the shared trace,

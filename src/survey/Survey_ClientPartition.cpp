@@ -80,7 +80,8 @@ ResultNames u_form_ResultNames(::Quorvex::System::Partition const& partition) {
 }
 
 void u_trace_Banner() {
-    g_Trace << "\n\n" << ::std::string(80, '+') << "\n"
+    g_Trace << "\n\n"
+            << ::std::string(80, '+') << "\n"
             << "PYLON_VPD_Survey_ClientPartition\n\n";
 }
 
@@ -108,15 +109,14 @@ Outcome u_record_ClientFailure(::Quorvex::System::Partition const& partition,
                                ResultNames const& names, int const& result,
                                ::Quorvex::RELAY::ReturnCode const& returnCode) {
     bool const channelFailed = u_has_ChannelFailed(result, returnCode);
-    ::std::string const reason =
-        ::std::string(gc_NotSurveyedReason) +
-        (channelFailed ? gc_ChannelFailedReason : gc_ClientFailedReason) +
-        Survey_Utility::u_transform_RELAY_ReturnCode_2_String(returnCode);
+    ::std::string const reason = ::std::string(gc_NotSurveyedReason) +
+                                 (channelFailed ? gc_ChannelFailedReason : gc_ClientFailedReason) +
+                                 Survey_Utility::u_transform_RELAY_ReturnCode_2_String(returnCode);
     Survey_Utility::u_create_DefaultXML_forFailedPartition(partition, reason, names.localResult);
     ::std::string const status =
-        channelFailed ? u_write_OverSeed(gc_ClientFailedSeed, gc_ChannelFailed, returnCode.get_Rc())
-                      : u_write_OverSeed(gc_ClientFailedSeed, gc_ClientFailed,
-                                         returnCode.get_RcCmd());
+        channelFailed
+            ? u_write_OverSeed(gc_ClientFailedSeed, gc_ChannelFailed, returnCode.get_Rc())
+            : u_write_OverSeed(gc_ClientFailedSeed, gc_ClientFailed, returnCode.get_RcCmd());
     return {names.localResult, gc_NotSurveyed, status};
 }
 

@@ -186,21 +186,21 @@ TEST_F(Survey_ClientPartition, FetchFailingWithChannelCodeThreeReplacesTheSeedsF
 TEST_F(Survey_ClientPartition, FetchCodeTwelveReplacesTheSeedsFirstTwoLetters) {
     Quorvex::PYLON::ListOf_Partitions partitions;
     partitions.push_back(u_make_Partition("6", "3", "host6"));
-    LoopRun const run = u_run_Loop(std::string(gc_ClientOk) +
-                                       "[getFileFromPartition 6]\n"
-                                       "stdout Rc::12::RcCmd::0::RetStr1::x::RetStr2::\n",
-                                   partitions);
+    LoopRun const run =
+        u_run_Loop(std::string(gc_ClientOk) + "[getFileFromPartition 6]\n"
+                                              "stdout Rc::12::RcCmd::0::RetStr1::x::RetStr2::\n",
+                   partitions);
     EXPECT_EQ(run.outcomes, u_local_File("6") + "|8|12t result Failed, rc = \n");
 }
 
 TEST_F(Survey_ClientPartition, FetchExitCodeWithRcZeroStillFailsAndShowsRc) {
     Quorvex::PYLON::ListOf_Partitions partitions;
     partitions.push_back(u_make_Partition("6", "3", "host6"));
-    LoopRun const run = u_run_Loop(std::string(gc_ClientOk) +
-                                       "[getFileFromPartition 6]\n"
-                                       "stdout Rc::0::RcCmd::0::RetStr1::x::RetStr2::\n"
-                                       "exit 1\n",
-                                   partitions);
+    LoopRun const run =
+        u_run_Loop(std::string(gc_ClientOk) + "[getFileFromPartition 6]\n"
+                                              "stdout Rc::0::RcCmd::0::RetStr1::x::RetStr2::\n"
+                                              "exit 1\n",
+                   partitions);
     EXPECT_EQ(run.outcomes, u_local_File("6") + "|8|0et result Failed, rc = \n");
 }
 
@@ -255,18 +255,17 @@ TEST_F(Survey_ClientPartition, MissingClientCodeIsAClientFailureOf4294967295) {
 TEST_F(Survey_ClientPartition, NegativeClientCodeIsShownUnsigned) {
     Quorvex::PYLON::ListOf_Partitions partitions;
     partitions.push_back(u_make_Partition("5", "3", "host5"));
-    LoopRun const run =
-        u_run_Loop("[runCmdOnPartition 5]\nstdout Rc::0::RcCmd::-2\n", partitions);
+    LoopRun const run = u_run_Loop("[runCmdOnPartition 5]\nstdout Rc::0::RcCmd::-2\n", partitions);
     EXPECT_EQ(run.outcomes, u_local_File("5") + "|8|Partition Failed, RcCmd = 4294967294\n");
 }
 
 TEST_F(Survey_ClientPartition, SuccessIsRecordedWithoutTheToolWritingTheFile) {
     Quorvex::PYLON::ListOf_Partitions partitions;
     partitions.push_back(u_make_Partition("3", "3", "host3"));
-    LoopRun const run = u_run_Loop(std::string(gc_ClientOk) +
-                                       "[getFileFromPartition 3]\n"
-                                       "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n",
-                                   partitions);
+    LoopRun const run =
+        u_run_Loop(std::string(gc_ClientOk) + "[getFileFromPartition 3]\n"
+                                              "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n",
+                   partitions);
     EXPECT_EQ(run.outcomes, u_local_File("3") + "|0|Ok\n");
     EXPECT_TRUE(SurveyTest_Utility::u_list_Folder(gc_VPD_Folder).empty());
 }
@@ -299,7 +298,8 @@ TEST_F(Survey_ClientPartition, ConsoleReceivesTheClientRunAndTheFetchOfEachParti
     std::string const options = ".VPD.xml -c 1234-ABC_10ABCDE -pylonv 4.0.11::RemoteFN::";
     std::string const clientFile =
         ".QuorvexOutput::RemoteFileInfo::FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=system";
-    std::string const consoleFile = "::LocalFileInfo::FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon";
+    std::string const consoleFile =
+        "::LocalFileInfo::FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon";
     std::vector<Invocation> const expected{
         {"runact-api", "-c",
          target + "runCmdOnPartition" + machine + "3" + client + "3" + options +
@@ -330,15 +330,16 @@ TEST_F(Survey_ClientPartition, TraceOfAFailedAndASurveyedPartitionIsExact) {
     std::string const dashLine = "    " + std::string(40, '-');
     EXPECT_EQ(
         run.trace,
-        "\n\n" + plusLine + "\nPYLON_VPD_Survey_ClientPartition\n\n"
-        "    Partition    : 1234-ABC_10ABCDE-2\n"
-        "    MTMS         : 1234-ABC_10ABCDE\n"
-        "    Partition ID : 2\n"
-        "    HostName     : host2\n"
-        "    IP           : 10.1.1.12\n"
-        "    ActiveStatus : 3\n"
-        "    OS Name      : Zeph\n"
-        "    OS Version   : 7.2\n" +
+        "\n\n" + plusLine +
+            "\nPYLON_VPD_Survey_ClientPartition\n\n"
+            "    Partition    : 1234-ABC_10ABCDE-2\n"
+            "    MTMS         : 1234-ABC_10ABCDE\n"
+            "    Partition ID : 2\n"
+            "    HostName     : host2\n"
+            "    IP           : 10.1.1.12\n"
+            "    ActiveStatus : 3\n"
+            "    OS Name      : Zeph\n"
+            "    OS Version   : 7.2\n" +
             dashLine +
             "\n\n\t 1.  > > > VPD Survey Client < < < \n"
             "\n****** ShellCommand::execute ******\n"
@@ -358,15 +359,16 @@ TEST_F(Survey_ClientPartition, TraceOfAFailedAndASurveyedPartitionIsExact) {
             "\n"
             "\n"
             "\n\n" +
-            plusLine + "\nPYLON_VPD_Survey_ClientPartition\n\n"
-                       "    Partition    : 1234-ABC_10ABCDE-3\n"
-                       "    MTMS         : 1234-ABC_10ABCDE\n"
-                       "    Partition ID : 3\n"
-                       "    HostName     : host3\n"
-                       "    IP           : 10.1.1.13\n"
-                       "    ActiveStatus : 3\n"
-                       "    OS Name      : Zeph\n"
-                       "    OS Version   : 7.3\n" +
+            plusLine +
+            "\nPYLON_VPD_Survey_ClientPartition\n\n"
+            "    Partition    : 1234-ABC_10ABCDE-3\n"
+            "    MTMS         : 1234-ABC_10ABCDE\n"
+            "    Partition ID : 3\n"
+            "    HostName     : host3\n"
+            "    IP           : 10.1.1.13\n"
+            "    ActiveStatus : 3\n"
+            "    OS Name      : Zeph\n"
+            "    OS Version   : 7.3\n" +
             dashLine +
             "\n\n\t 1.  > > > VPD Survey Client < < < \n"
             "\n****** ShellCommand::execute ******\n"
@@ -429,8 +431,9 @@ TEST_F(Survey_ClientPartition, MachineWithoutDashListsTheFailedPartitionButWrite
     Quorvex::PYLON::ListOf_Partitions partitions;
     partitions.push_back(partition);
     LoopRun const run = u_run_Loop("[runCmdOnPartition 2]\nexit 1\n", partitions);
-    EXPECT_EQ(run.outcomes, "VPD/quorvexPYLON_VPD_Survey_ClientPartition_"
-                            "1234MMAERROR_10ABCDEERROR-2.VPD.xml|8|RELAY Failed, rc = 4294967295\n");
+    EXPECT_EQ(run.outcomes,
+              "VPD/quorvexPYLON_VPD_Survey_ClientPartition_"
+              "1234MMAERROR_10ABCDEERROR-2.VPD.xml|8|RELAY Failed, rc = 4294967295\n");
     EXPECT_TRUE(SurveyTest_Utility::u_list_Folder(gc_VPD_Folder).empty());
 }
 
@@ -438,8 +441,8 @@ TEST_F(Survey_ClientPartition, TwoPartitionsOfOneIdentityShareTheirLocalFile) {
     Quorvex::PYLON::ListOf_Partitions partitions;
     partitions.push_back(u_make_Partition("3", "3", "first"));
     partitions.push_back(u_make_Partition("3", "3", "second"));
-    LoopRun const run = u_run_Loop(std::string(gc_ClientOk) + "[getFileFromPartition 3]\nexit 1\n",
-                                   partitions);
+    LoopRun const run =
+        u_run_Loop(std::string(gc_ClientOk) + "[getFileFromPartition 3]\nexit 1\n", partitions);
     std::string const failed = u_local_File("3") + "|8|4294967295 Failed, rc = \n";
     EXPECT_EQ(run.outcomes, failed + failed);
     EXPECT_NE(u_document("3").find("displayName=\"second\""), std::string::npos);

@@ -14,8 +14,9 @@ System_Partition_2_VPD_Resource::operator()(Quorvex::System::Partition const& pa
     resource.set_DisplayName(hostName.empty() ? identity : hostName);
     resource.set_UniqueID(identity);
     resource.insert_Property(Quorvex::VPD::Property("HN", hostName));
-    resource.insert_Property(Quorvex::VPD::Property(
-        "OS", partition.get_OperatingSystem_Name() + " " + partition.get_OperatingSystem_Version()));
+    resource.insert_Property(
+        Quorvex::VPD::Property("OS", partition.get_OperatingSystem_Name() + " " +
+                                         partition.get_OperatingSystem_Version()));
     resource.insert_Property(Quorvex::VPD::Property("PT", partition.get_PartitionID()));
     resource.insert_Property(Quorvex::VPD::Property("SE", partition.get_MTMS().get_Serial()));
     resource.insert_Property(

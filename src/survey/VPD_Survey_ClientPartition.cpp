@@ -19,16 +19,17 @@ constexpr char gc_NoPartitions[] = "No ACTIVE Partition Found.";
 constexpr unsigned int gc_ManagedMachineType = 0;
 
 std::string u_get_StatusFileName(std::string const& machineIdentity) {
-    return std::string(Quorvex::PYLON::VPD::gc_QuorvexDirectory) + Quorvex::PYLON::VPD::gc_VPD_Folder +
-           Quorvex::PYLON::VPD::gc_ProgramName + "_" + machineIdentity + gc_StatusSuffix;
+    return std::string(Quorvex::PYLON::VPD::gc_QuorvexDirectory) +
+           Quorvex::PYLON::VPD::gc_VPD_Folder + Quorvex::PYLON::VPD::gc_ProgramName + "_" +
+           machineIdentity + gc_StatusSuffix;
 }
 
 // Per partition: the file name on standard output and the code on standard
 // error when a file name was recorded, and in every case the status line.
 void u_report_Partitions(Quorvex::PYLON::ListOf_Partitions const& partitions,
-                          std::vector<std::string> const& fileNames,
-                          std::vector<std::string> const& returnCodes,
-                          std::vector<std::string> const& statusTexts, std::ostream& status) {
+                         std::vector<std::string> const& fileNames,
+                         std::vector<std::string> const& returnCodes,
+                         std::vector<std::string> const& statusTexts, std::ostream& status) {
     for (std::size_t i = 0; i < fileNames.size(); ++i) {
         if (!fileNames[i].empty()) {
             // Flushed per line, so that names and codes interleave in order

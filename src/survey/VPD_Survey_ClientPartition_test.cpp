@@ -19,12 +19,11 @@ constexpr char gc_StatusFile[] =
 constexpr char gc_Heading[] = "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n";
 constexpr char gc_LocalPrefix[] = "VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-";
 
-constexpr char gc_ConsoleAnswersEverything[] =
-    "[runCmdOnPartition *]\n"
-    "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
-    "[getFileFromPartition *]\n"
-    "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
-    "document-nolf <fetched/>\n";
+constexpr char gc_ConsoleAnswersEverything[] = "[runCmdOnPartition *]\n"
+                                               "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
+                                               "[getFileFromPartition *]\n"
+                                               "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
+                                               "document-nolf <fetched/>\n";
 
 std::string u_local_File(std::string const& id) {
     return gc_LocalPrefix + id + ".VPD.xml";
@@ -66,10 +65,10 @@ protected:
 
 TEST_F(VPD_Survey_ClientPartition_Run, AllPartitionsSurveyedEndsStandardErrorWithZero) {
     SurveyRun const run = u_run_Survey(std::string("[lspartition 1234-ABC_10ABCDE]\n"
-                                             "stdout 1,10.1.1.11,3,host1,Zeph,7.1;"
-                                             "2,10.1.1.12,3,host2,Zeph,7.2;\n") +
-                                     gc_ConsoleAnswersEverything,
-                                 "1234-ABC_10ABCDE");
+                                                   "stdout 1,10.1.1.11,3,host1,Zeph,7.1;"
+                                                   "2,10.1.1.12,3,host2,Zeph,7.2;\n") +
+                                           gc_ConsoleAnswersEverything,
+                                       "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, u_local_File("1") + "\n" + u_local_File("2") + "\n");
     EXPECT_EQ(run.stderrText, std::string("0\n0\n") + gc_Heading + "0");
     EXPECT_EQ(run.status, "host1 [10.1.1.11] - VPD Survey - Ok\n"
@@ -77,13 +76,14 @@ TEST_F(VPD_Survey_ClientPartition_Run, AllPartitionsSurveyedEndsStandardErrorWit
 }
 
 TEST_F(VPD_Survey_ClientPartition_Run, SomePartitionsFailedEndsStandardErrorWithFour) {
-    SurveyRun const run = u_run_Survey(std::string("[lspartition 1234-ABC_10ABCDE]\n"
-                                             "stdout 1,10.1.1.11,3,host1,Zeph,7.1;"
-                                             "2,10.1.1.12,3,host2,Zeph,7.2;\n"
-                                             "[runCmdOnPartition 1]\n"
-                                             "stdout Rc::0::RcCmd::5::RetStr1::x::RetStr2::\n") +
-                                     gc_ConsoleAnswersEverything,
-                                 "1234-ABC_10ABCDE");
+    SurveyRun const run =
+        u_run_Survey(std::string("[lspartition 1234-ABC_10ABCDE]\n"
+                                 "stdout 1,10.1.1.11,3,host1,Zeph,7.1;"
+                                 "2,10.1.1.12,3,host2,Zeph,7.2;\n"
+                                 "[runCmdOnPartition 1]\n"
+                                 "stdout Rc::0::RcCmd::5::RetStr1::x::RetStr2::\n") +
+                         gc_ConsoleAnswersEverything,
+                     "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, u_local_File("1") + "\n" + u_local_File("2") + "\n");
     EXPECT_EQ(run.stderrText, std::string("8\n0\n") + gc_Heading + "4");
     EXPECT_EQ(run.status, "host1 [10.1.1.11] - VPD Survey - Partition Failed, RcCmd = 5\n"
@@ -91,10 +91,11 @@ TEST_F(VPD_Survey_ClientPartition_Run, SomePartitionsFailedEndsStandardErrorWith
 }
 
 TEST_F(VPD_Survey_ClientPartition_Run, AllPartitionsFailedEndsStandardErrorWithEight) {
-    SurveyRun const run = u_run_Survey("[lspartition 1234-ABC_10ABCDE]\n"
-                                 "stdout 1,10.1.1.11,3,host1,Zeph,7.1;2,10.1.1.12,1,host2,Zeph,7.2;\n"
-                                 "[runCmdOnPartition *]\nexit 1\n",
-                                 "1234-ABC_10ABCDE");
+    SurveyRun const run =
+        u_run_Survey("[lspartition 1234-ABC_10ABCDE]\n"
+                     "stdout 1,10.1.1.11,3,host1,Zeph,7.1;2,10.1.1.12,1,host2,Zeph,7.2;\n"
+                     "[runCmdOnPartition *]\nexit 1\n",
+                     "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, u_local_File("1") + "\n");
     EXPECT_EQ(run.stderrText, std::string("8\n") + gc_Heading + "8");
     EXPECT_EQ(run.status, "host1 [10.1.1.11] - VPD Survey - RELAY Failed, rc = 4294967295\n"
@@ -112,13 +113,13 @@ TEST_F(VPD_Survey_ClientPartition_Run, NoPartitionListedWritesNoActivePartitionF
 
 TEST_F(VPD_Survey_ClientPartition_Run, FailingListingCountsAsNoPartition) {
     SurveyRun const run = u_run_Survey("[lspartition *]\n"
-                                 "stdout 1,10.1.1.11,3,host1,Zeph,7.1;\n"
-                                 "stderr lspartition: unknown managed system\n"
-                                 "exit 1\n"
-                                 "[lspartition 1234-ABC_10ABCDE]\n"
-                                 "stderr lspartition: unknown managed system\n"
-                                 "exit 1\n",
-                                 "1234-ABC_10ABCDE");
+                                       "stdout 1,10.1.1.11,3,host1,Zeph,7.1;\n"
+                                       "stderr lspartition: unknown managed system\n"
+                                       "exit 1\n"
+                                       "[lspartition 1234-ABC_10ABCDE]\n"
+                                       "stderr lspartition: unknown managed system\n"
+                                       "exit 1\n",
+                                       "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, "");
     EXPECT_EQ(run.stderrText, std::string(gc_Heading) + "8");
     EXPECT_EQ(run.status, "No ACTIVE Partition Found.\n");
@@ -126,8 +127,8 @@ TEST_F(VPD_Survey_ClientPartition_Run, FailingListingCountsAsNoPartition) {
 
 TEST_F(VPD_Survey_ClientPartition_Run, InactivePartitionHasNoOutputLinesButAStatusLine) {
     SurveyRun const run = u_run_Survey("[lspartition 1234-ABC_10ABCDE]\n"
-                                 "stdout 1,10.1.1.11,2,host1,Zeph,7.1;\n",
-                                 "1234-ABC_10ABCDE");
+                                       "stdout 1,10.1.1.11,2,host1,Zeph,7.1;\n",
+                                       "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, "");
     EXPECT_EQ(run.stderrText, std::string(gc_Heading) + "8");
     EXPECT_EQ(run.status, "host1 [10.1.1.11] - VPD Survey - Failed - Active Status < 3\n");
@@ -136,17 +137,17 @@ TEST_F(VPD_Survey_ClientPartition_Run, InactivePartitionHasNoOutputLinesButAStat
 
 TEST_F(VPD_Survey_ClientPartition_Run, StatusLineOfAPartitionWithoutHostNameStartsWithABlank) {
     SurveyRun const run = u_run_Survey("[lspartition 1234-ABC_10ABCDE]\n"
-                                 "stdout 1,10.1.1.11,1,,Zeph,7.1;\n",
-                                 "1234-ABC_10ABCDE");
+                                       "stdout 1,10.1.1.11,1,,Zeph,7.1;\n",
+                                       "1234-ABC_10ABCDE");
     EXPECT_EQ(run.status, " [10.1.1.11] - VPD Survey - Failed - Active Status < 3\n");
 }
 
 TEST_F(VPD_Survey_ClientPartition_Run, PartitionsAreSurveyedInListingOrder) {
     SurveyRun const run = u_run_Survey(std::string("[lspartition 1234-ABC_10ABCDE]\n"
-                                             "stdout 9,10.1.1.19,3,host9,Zeph,7.1;"
-                                             "10,10.1.1.20,3,host10,Zeph,7.2;\n") +
-                                     gc_ConsoleAnswersEverything,
-                                 "1234-ABC_10ABCDE");
+                                                   "stdout 9,10.1.1.19,3,host9,Zeph,7.1;"
+                                                   "10,10.1.1.20,3,host10,Zeph,7.2;\n") +
+                                           gc_ConsoleAnswersEverything,
+                                       "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, u_local_File("9") + "\n" + u_local_File("10") + "\n");
     EXPECT_EQ(run.status, "host9 [10.1.1.19] - VPD Survey - Ok\n"
                           "host10 [10.1.1.20] - VPD Survey - Ok\n");
@@ -154,7 +155,7 @@ TEST_F(VPD_Survey_ClientPartition_Run, PartitionsAreSurveyedInListingOrder) {
 
 TEST_F(VPD_Survey_ClientPartition_Run, OnlyThePartitionListingOfTheNamedMachineIsRun) {
     SurveyRun const run = u_run_Survey("[lsvtc]\nstdout 0:1234-ABC_10ABCDE;0:5678-DEF_65XYZ12;\n",
-                                 "1234-ABC_10ABCDE");
+                                       "1234-ABC_10ABCDE");
     EXPECT_EQ(run.calls,
               (std::vector<Invocation>{{"lspartition", "-ix", "-c", "1234-ABC_10ABCDE"}}));
 }
@@ -167,9 +168,9 @@ TEST_F(VPD_Survey_ClientPartition_Run, StatusFileOfAnEarlierRunIsRewritten) {
 
 TEST_F(VPD_Survey_ClientPartition_Run, IdentityWithoutDashIsListedAsMarkedButNamesTheStatusFile) {
     SurveyRun const run = u_run_Survey("[lspartition 1234MMAERROR_10ABCDEERROR]\n"
-                                 "stdout 2,10.1.1.12,3,host2,Zeph,7.2;\n"
-                                 "[runCmdOnPartition *]\nexit 1\n",
-                                 "1234MMA_10ABCDE");
+                                       "stdout 2,10.1.1.12,3,host2,Zeph,7.2;\n"
+                                       "[runCmdOnPartition *]\nexit 1\n",
+                                       "1234MMA_10ABCDE");
     EXPECT_EQ(run.calls.front(),
               (Invocation{"lspartition", "-ix", "-c", "1234MMAERROR_10ABCDEERROR"}));
     EXPECT_EQ(run.stdoutText, "VPD/quorvexPYLON_VPD_Survey_ClientPartition_"
@@ -177,7 +178,8 @@ TEST_F(VPD_Survey_ClientPartition_Run, IdentityWithoutDashIsListedAsMarkedButNam
     EXPECT_EQ(run.stderrText, std::string("8\n") + gc_Heading + "8");
     EXPECT_EQ(run.status, "host2 [10.1.1.12] - VPD Survey - RELAY Failed, rc = 4294967295\n");
     EXPECT_EQ(SurveyTest_Utility::u_list_Folder(gc_VPD_Folder),
-              (std::vector<std::string>{"quorvexPYLON_VPD_Survey_ClientPartition_1234MMA_10ABCDE.status"}));
+              (std::vector<std::string>{
+                  "quorvexPYLON_VPD_Survey_ClientPartition_1234MMA_10ABCDE.status"}));
 }
 
 } // namespace

@@ -68,10 +68,11 @@ TEST_F(SurveyTool, FirstOfTwoMachineOptionsIsTheMachineSurveyed) {
     QuorvexTest::SimulatedConsole const console("");
     CommandResult const result = u_run_Tool({"-c", "1111-AAA_FIRST", "-c", "2222-BBB_SECOND"});
     EXPECT_EQ(result.exitStatus, 2);
-    EXPECT_EQ(console.invocations(),
-              (std::vector<QuorvexTest::Invocation>{{"lspartition", "-ix", "-c", "1111-AAA_FIRST"}}));
+    EXPECT_EQ(console.invocations(), (std::vector<QuorvexTest::Invocation>{
+                                         {"lspartition", "-ix", "-c", "1111-AAA_FIRST"}}));
     EXPECT_EQ(SurveyTest_Utility::u_list_Folder(gc_VPD_Folder),
-              (std::vector<std::string>{"quorvexPYLON_VPD_Survey_ClientPartition_1111-AAA_FIRST.status"}));
+              (std::vector<std::string>{
+                  "quorvexPYLON_VPD_Survey_ClientPartition_1111-AAA_FIRST.status"}));
 }
 
 TEST_F(SurveyTool, PlainArgumentBeforeMachineOptionIsIgnored) {
@@ -79,8 +80,8 @@ TEST_F(SurveyTool, PlainArgumentBeforeMachineOptionIsIgnored) {
     CommandResult const result = u_run_Tool({"extra", "-c", "1234-ABC_10ABCDE"});
     EXPECT_EQ(result.exitStatus, 2);
     EXPECT_EQ(result.stderrText, std::string(gc_Heading) + "8");
-    EXPECT_EQ(console.invocations(),
-              (std::vector<QuorvexTest::Invocation>{{"lspartition", "-ix", "-c", "1234-ABC_10ABCDE"}}));
+    EXPECT_EQ(console.invocations(), (std::vector<QuorvexTest::Invocation>{
+                                         {"lspartition", "-ix", "-c", "1234-ABC_10ABCDE"}}));
 }
 
 TEST_F(SurveyTool, ExitsWithTwoEvenWhenEveryPartitionFailed) {

@@ -40,7 +40,8 @@ bool u_is_ExecutableFile(std::string const& path) {
 void u_expect_ResultFolders(std::string const& destDir) {
     for (char const* folder : {"/var/adm/quorvex/VPD", "/var/adm/quorvex/Trace"}) {
         EXPECT_TRUE(fs::is_directory(destDir + folder)) << destDir + folder;
-        EXPECT_TRUE(SurveyTest_Utility::u_list_Folder(destDir + folder).empty()) << destDir + folder;
+        EXPECT_TRUE(SurveyTest_Utility::u_list_Folder(destDir + folder).empty())
+            << destDir + folder;
     }
 }
 
