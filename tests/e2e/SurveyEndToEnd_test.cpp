@@ -150,10 +150,12 @@ protected:
     }
 
     // What the run left in /tmp, apart from the folder of this test that the
-    // sandbox makes visible there.
+    // sandbox makes visible there (the top one when it lies deeper in /tmp).
     static std::vector<std::string> leftInTmp(std::string const& listingPath,
                                               std::string const& probeFolder) {
-        std::string const probeName = std::filesystem::path(probeFolder).filename().string();
+        std::filesystem::path const inTmp =
+            std::filesystem::path(probeFolder).lexically_relative("/tmp");
+        std::string const probeName = inTmp.empty() ? "" : inTmp.begin()->string();
         std::vector<std::string> left = u_read_Lines(listingPath);
         left.erase(std::remove(left.begin(), left.end(), probeName), left.end());
         return left;
