@@ -11,6 +11,12 @@ if(QUORVEX_SANITIZE)
     -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
   target_link_options(quorvex_options INTERFACE -fsanitize=address,undefined)
 endif()
+# Coverage feedback for libFuzzer (clang only); the fuzz targets themselves
+# link the fuzzer's main with -fsanitize=fuzzer.
+option(QUORVEX_FUZZ "Instrument the libraries for libFuzzer (clang only)" OFF)
+if(QUORVEX_FUZZ)
+  target_compile_options(quorvex_options INTERFACE -fsanitize=fuzzer-no-link)
+endif()
 
 # Root of the source tree, for tests and tools that need the sandbox runner
 # or the simulated console's scenarios.
