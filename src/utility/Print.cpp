@@ -7,8 +7,7 @@ namespace STL {
 
 Print::Print(::std::ostream& out) : _out(out) {}
 
-void Print::print_Vector_Of_String(::std::vector<::std::string> const& v,
-                                   bool const& withIndex) const {
+void Print::print_Vector_Of_String(::std::vector<::std::string> const& v, bool const& withIndex) {
     unsigned int const width = get_IndexWidth_Vector(v);
     unsigned int index = 0;
     for (::std::string const& element : v) {
@@ -20,11 +19,11 @@ void Print::print_Vector_Of_String(::std::vector<::std::string> const& v,
     }
 }
 
-void Print::operator()(::std::vector<::std::string> const& v, bool const& withIndex) const {
+void Print::operator()(::std::vector<::std::string> const& v, bool const& withIndex) {
     print_Vector_Of_String(v, withIndex);
 }
 
-void Print::print_Map_Of_String_String(::std::map<::std::string, ::std::string> const& m) const {
+void Print::print_Map_Of_String_String(::std::map<::std::string, ::std::string> const& m) {
     unsigned int const width = get_IndexWidth_Map(m);
     for (auto const& entry : m) {
         _out << "[" << ::std::setw(static_cast<int>(width)) << entry.first << "] = " << entry.second
@@ -32,7 +31,7 @@ void Print::print_Map_Of_String_String(::std::map<::std::string, ::std::string> 
     }
 }
 
-void Print::operator()(::std::map<::std::string, ::std::string> const& m) const {
+void Print::operator()(::std::map<::std::string, ::std::string> const& m) {
     print_Map_Of_String_String(m);
 }
 

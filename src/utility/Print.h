@@ -18,12 +18,12 @@ public:
 
     // Each line: "[" + index padded with blanks on the left + "] = " + element
     // when withIndex is true, else the element alone.
-    void print_Vector_Of_String(::std::vector<::std::string> const& v, bool const& withIndex) const;
-    void operator()(::std::vector<::std::string> const& v, bool const& withIndex) const;
+    void print_Vector_Of_String(::std::vector<::std::string> const& v, bool const& withIndex);
+    void operator()(::std::vector<::std::string> const& v, bool const& withIndex);
 
     // Each line: "[" + key padded with blanks on the left + "] = " + value.
-    void print_Map_Of_String_String(::std::map<::std::string, ::std::string> const& m) const;
-    void operator()(::std::map<::std::string, ::std::string> const& m) const;
+    void print_Map_Of_String_String(::std::map<::std::string, ::std::string> const& m);
+    void operator()(::std::map<::std::string, ::std::string> const& m);
 
     // The number of decimal digits of the vector's size.
     template <typename T> static unsigned int get_IndexWidth_Vector(::std::vector<T> const& v) {

@@ -37,8 +37,15 @@ TEST(DEBUG_STL_Print, VectorOfTenUsesDigitsOfSizeNotOfLastIndex) {
 
 TEST(DEBUG_STL_Print, VectorOfNineUsesOneColumn) {
     std::ostringstream out;
-    DEBUG::STL::Print(out).print_Vector_Of_String(makeStrings(2), true);
-    EXPECT_EQ(out.str(), "[0] = s0\n[1] = s1\n");
+    DEBUG::STL::Print(out).print_Vector_Of_String(makeStrings(9), true);
+    EXPECT_EQ(out.str(), "[0] = s0\n[1] = s1\n[2] = s2\n[3] = s3\n[4] = s4\n[5] = s5\n"
+                         "[6] = s6\n[7] = s7\n[8] = s8\n");
+}
+
+TEST(DEBUG_STL_Print, VectorOfOneUsesOneColumn) {
+    std::ostringstream out;
+    DEBUG::STL::Print(out).print_Vector_Of_String({"only"}, true);
+    EXPECT_EQ(out.str(), "[0] = only\n");
 }
 
 TEST(DEBUG_STL_Print, VectorWithoutIndexPrintsElementsOnly) {
@@ -57,11 +64,11 @@ TEST(DEBUG_STL_Print, VectorOperatorForwardsToPrintVector) {
     std::ostringstream named;
     std::ostringstream called;
     DEBUG::STL::Print(named).print_Vector_Of_String(makeStrings(11), true);
-    DEBUG::STL::Print const callPrint(called);
+    DEBUG::STL::Print callPrint(called);
     callPrint(makeStrings(11), true);
     EXPECT_EQ(called.str(), named.str());
     std::ostringstream plain;
-    DEBUG::STL::Print const plainPrint(plain);
+    DEBUG::STL::Print plainPrint(plain);
     plainPrint(makeStrings(2), false);
     EXPECT_EQ(plain.str(), "s0\ns1\n");
 }
@@ -74,7 +81,7 @@ TEST(DEBUG_STL_Print, MapPadsKeysToLongestKey) {
 
 TEST(DEBUG_STL_Print, MapPrintsInKeyOrder) {
     std::ostringstream out;
-    DEBUG::STL::Print const print(out);
+    DEBUG::STL::Print print(out);
     print(std::map<std::string, std::string>{{"b", "2"}, {"B", "1"}, {"a", ""}});
     EXPECT_EQ(out.str(), "[B] = 1\n[a] = \n[b] = 2\n");
 }
@@ -108,6 +115,25 @@ TEST(DEBUG_STL_Print, StreamSettingsAreLeftUnchanged) {
     // The index is written with the stream's own base and fill.
     EXPECT_NE(out.str().find("[*a] = s10\n"), std::string::npos);
     EXPECT_NE(out.str().find("[*****Rc] = 0\n"), std::string::npos);
+}
+
+// Callers may hold the printing operations as member pointers of exactly
+// these types.
+TEST(DEBUG_STL_Print, OperationsHaveTheirDocumentedTypes) {
+    using Print = DEBUG::STL::Print;
+    using Strings = std::vector<std::string>;
+    using Map = std::map<std::string, std::string>;
+    void (Print::*printVector)(Strings const&, bool const&) = &Print::print_Vector_Of_String;
+    void (Print::*callVector)(Strings const&, bool const&) = &Print::operator();
+    void (Print::*printMap)(Map const&) = &Print::print_Map_Of_String_String;
+    void (Print::*callMap)(Map const&) = &Print::operator();
+    std::ostringstream out;
+    Print print(out);
+    (print.*printVector)({"a"}, true);
+    (print.*callVector)({"b"}, false);
+    (print.*printMap)({{"k", "v"}});
+    (print.*callMap)({{"key", "w"}});
+    EXPECT_EQ(out.str(), "[0] = a\nb\n[k] = v\n[key] = w\n");
 }
 
 TEST(DEBUG_STL_Print, IndexWidthVectorIsDigitsOfSize) {
