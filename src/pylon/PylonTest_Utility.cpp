@@ -61,6 +61,10 @@ std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Partitions const& p
 std::vector<std::string> u_tracedCommandLines(std::string const& traceName,
                                               std::function<void()> const& work) {
     std::string const path = gc_TraceFolder + traceName;
+    // The child starts the test program afresh: a trace object that wrote
+    // before any trace file was open (an earlier test of this process ran a
+    // listing) stays failed, and a forked copy would inherit it.
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
     EXPECT_EXIT(
         {
             {

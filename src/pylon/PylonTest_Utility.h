@@ -18,9 +18,9 @@ std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Machines const& mac
 // record, in list order.
 std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Partitions const& partitions);
 
-// Runs work in a child process whose trace file is traceName in the trace
-// folder, and returns the command lines traced there, with the generated part
-// of each temporary file name replaced by "XXXXXX".
+// Runs work in a freshly started copy of the test program whose trace file is
+// traceName in the trace folder, and returns the command lines traced there,
+// with the generated part of each temporary file name replaced by "XXXXXX".
 std::vector<std::string> u_tracedCommandLines(std::string const& traceName,
                                               std::function<void()> const& work);
 

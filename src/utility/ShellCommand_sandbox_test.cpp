@@ -10,6 +10,7 @@
 
 #include <filesystem>
 #include <string>
+#include <sys/stat.h>
 #include <unistd.h>
 #include <vector>
 
@@ -35,6 +36,29 @@ Lines temporaryFilesInTmp() {
 QuorvexTest::CommandResult runProbe(std::vector<std::string> const& sandboxOptions) {
     return QuorvexTest::runInSandbox(sandboxOptions,
                                      {QUORVEX_UTILITY_PROBE, std::string(gc_MarkerFolder)});
+}
+
+// Runs the probe with a script of the given body standing in for /bin/hostname.
+QuorvexTest::CommandResult runProbeWithHostNameTool(std::string const& scriptBody) {
+    QuorvexTest::TemporaryDirectory const folder;
+    std::string const script = folder.file("hostname");
+    QuorvexTest::writeFile(script, "#!/bin/sh\n" + scriptBody);
+    ::chmod(script.c_str(), 0755);
+    return runProbe({"--bind", script + ":/bin/hostname"});
+}
+
+// The probe's report of a run in a writable /tmp, with the host name it got.
+std::string reportWithHost(std::string const& host) {
+    return "execute 0\n"
+           "wasExecuted 1\n"
+           "returnCode 0\n"
+           "stdout 1\n"
+           "stderr 1\n"
+           "marker present\n"
+           "host " +
+           host +
+           "\n"
+           "left 0\n";
 }
 
 std::string hostName() {
@@ -122,6 +146,29 @@ TEST(ShellCommandTmpWritable, ProbeRunsCommandAndFindsItsMarker) {
                                      hostName() +
                                      "\n"
                                      "left 0\n");
+}
+
+// The host name is the first line of the tool's output, taken as it is.
+TEST(HostNameQuery, FirstLineIsTakenAsItIs) {
+    QuorvexTest::CommandResult const result =
+        runProbeWithHostNameTool("printf ' console-1.example \\nsecond line\\n'\n");
+    EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
+    EXPECT_EQ(result.stdoutText, reportWithHost(" console-1.example "));
+}
+
+// A tool that ran with code 0 but printed nothing gives the empty first line,
+// not the fallback.
+TEST(HostNameQuery, ToolPrintingNothingGivesEmptyName) {
+    QuorvexTest::CommandResult const result = runProbeWithHostNameTool("exit 0\n");
+    EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
+    EXPECT_EQ(result.stdoutText, reportWithHost(""));
+}
+
+// A non-zero code gives the fallback even when the tool printed a name.
+TEST(HostNameQuery, ToolFailingGivesFallbackName) {
+    QuorvexTest::CommandResult const result = runProbeWithHostNameTool("echo console-1\nexit 1\n");
+    EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
+    EXPECT_EQ(result.stdoutText, reportWithHost("***Unknown***.hostname."));
 }
 
 } // namespace
