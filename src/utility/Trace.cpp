@@ -41,6 +41,8 @@ std::string u_format_LocalTime() {
 
 } // namespace
 
+std::filebuf& Trace::ms_FileHandle = Trace::_get_FileHandle();
+
 Trace::Trace(std::string const& fileName) : std::ofstream() {
     std::basic_ios<char>::rdbuf(&_get_FileHandle());
     if (!ms_IsInitialized && !fileName.empty()) {

@@ -28,15 +28,20 @@ public:
     // The shared file buffer, not the stream's own unused one.
     std::filebuf* rdbuf() const;
 
+    // The shared trace file: the buffer every trace object writes into.
+    static std::filebuf& ms_FileHandle;
+    // Set once a trace object with a non-empty file name has tried to open the file.
+    // Constant-initialised, like the counter, so both are valid before any
+    // start-up code runs.
+    inline static bool ms_IsInitialized = false;
+    // Number of live trace objects; the file is closed when it drops to 0.
+    inline static int ms_ObjectCounter = 0;
+
 private:
     // Never destroyed, so trace objects may be built and destroyed in any
     // order relative to it.
     static std::filebuf& _get_FileHandle();
     void _open(std::string const& fileName);
-
-    // Constant-initialised, so they are valid before any start-up code runs.
-    inline static bool ms_IsInitialized = false;
-    inline static int ms_ObjectCounter = 0;
 };
 
 // Writes the current local time as "%k:%M:%S" (hour padded with a blank,

@@ -170,6 +170,36 @@ TEST_F(TraceTest, LastTraceObjectClosesTheFileAndWritesBufferedText) {
     EXPECT_EQ(QuorvexTest::readFile(file), "buffered, no flush");
 }
 
+TEST_F(TraceTest, ClassWideMembersFollowTheObjectsLifetimes) {
+    std::string const file = path("main.Trace");
+    TestUtility::u_run_InFreshProcess([&] {
+        int const before = Utility::Trace::ms_ObjectCounter;
+        Utility::Trace unit("");
+        if (Utility::Trace::ms_IsInitialized) {
+            return failWith("an empty name marked the file as initialised");
+        }
+        if (Utility::Trace::ms_ObjectCounter != before + 1) {
+            return failWith("constructing a trace object did not count it");
+        }
+        {
+            Utility::Trace mainTrace(file);
+            if (!Utility::Trace::ms_IsInitialized || !Utility::Trace::ms_FileHandle.is_open()) {
+                return failWith("the first name did not open the shared file");
+            }
+            if (mainTrace.rdbuf() != &Utility::Trace::ms_FileHandle) {
+                return failWith("the stream does not write into the shared file");
+            }
+            if (Utility::Trace::ms_ObjectCounter != before + 2) {
+                return failWith("the second trace object was not counted");
+            }
+        }
+        if (Utility::Trace::ms_ObjectCounter != before + 1) {
+            return failWith("destroying a trace object did not uncount it");
+        }
+        return 0;
+    });
+}
+
 TEST_F(TraceTest, AllObjectsShareOneBuffer) {
     Utility::Trace first("");
     Utility::Trace second("");
