@@ -1,5 +1,6 @@
 #pragma once
 
+#include "transform/Utility__XML_Element_2_OStream.h"
 #include "xml/Element.h"
 
 #include <ostream>

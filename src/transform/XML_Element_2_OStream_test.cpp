@@ -1,7 +1,6 @@
 #include "transform/XML_Element_2_OStream.h"
 
 #include "transform/ElementText_test.h"
-#include "transform/Utility__XML_Element_2_OStream.h"
 
 #include <gtest/gtest.h>
 
@@ -128,6 +127,14 @@ TEST(Transform_XML_Element_2_OStream, QuoteAndAmpersandInValuesAreWrittenUnchang
     EXPECT_EQ(u_text(element), "<A v=\"say \"hi\" & <bye>\">x < y & \"z\"</A>");
 }
 
+TEST(Transform_XML_Element_2_OStream, ControlCharactersAndBytesAbove127AreWrittenUnchanged) {
+    std::string const odd = std::string("\t\x01\r\xC3\xA9\xFF", 6) + std::string(1, '\0') + "]]>";
+    Element element = u_withChildren(odd, Tag::Type_BeginTag, {u_element(odd, Tag::Type_String)});
+    element.insert_Attribute(odd, odd);
+    EXPECT_EQ(u_text(element),
+              "<" + odd + " " + odd + "=\"" + odd + "\">" + odd + "</" + odd + ">");
+}
+
 TEST(Transform_XML_Element_2_OStream, IndentationAtLevelFourIsTwelveSpaces) {
     std::ostringstream out;
     XML_Element_2_OStream writer(out, 4);
@@ -146,6 +153,15 @@ TEST(Transform_XML_Element_2_OStream, EmptyElementTagWithChildrenWritesThemAndNo
     Element const element =
         u_withChildren("A", Tag::Type_EmptyElementTag, {u_element("B"), u_element("C")});
     EXPECT_EQ(u_text(element), "<A/>\n   <B></B>\n   <C></C>\n");
+}
+
+TEST(Transform_XML_Element_2_OStream,
+     EmptyElementTagWithChildrenBelowTopLevelEndsAtItsOwnIndentation) {
+    Element const element =
+        u_withChildren("A", Tag::Type_EmptyElementTag, {u_element("B"), u_element("C")});
+    std::ostringstream out;
+    XML_Element_2_OStream(out, 1)(element, true, 1);
+    EXPECT_EQ(out.str(), "\n   <A/>\n      <B></B>\n      <C></C>\n   ");
 }
 
 TEST(Transform_XML_Element_2_OStream, EmptyElementTagWithoutChildrenIsOneShortTag) {
@@ -201,6 +217,7 @@ TEST(Transform_XML_Element_2_OStream, ReturnsTheStream) {
     EXPECT_EQ(&writer(u_element("A"), true, 0), &out);
 }
 
+// The writer's own header brings the holder of its predicate.
 TEST(Transform_Utility__XML_Element_2_OStream, EmptyElementTagIsAlwaysShortForm) {
     Element element = u_element("A", Tag::Type_EmptyElementTag);
     EXPECT_TRUE(Transform::Utility__XML_Element_2_OStream::_u_usingEmptyElementTag(element));

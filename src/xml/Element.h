@@ -61,3 +61,8 @@ private:
 };
 
 } // namespace XML
+
+// Lists of elements go with elements: make ListOf_Elements complete for every
+// unit that includes this header. It comes after Element, which it holds by
+// value.
+#include "xml/ListOf_Elements.h"

@@ -158,4 +158,14 @@ TEST(XML_Element, SelfAssignmentKeepsEverything) {
     EXPECT_EQ(element.get_NumberOfContent(), 1u);
 }
 
+// This unit includes nothing of the model but the element's own header.
+TEST(XML_Element, ListsOfElementsComeWithTheElementHeader) {
+    XML::ListOf_Elements children;
+    children.push_back(Element("a", Tag::Type_String));
+    children.push_back(Element("b", Tag::Type_BeginTag));
+    Element parent;
+    EXPECT_EQ(parent.insert_Content(children), 2u);
+    EXPECT_EQ(parent.get_Content()[1].get_Name(), "b");
+}
+
 } // namespace

@@ -18,7 +18,8 @@ public:
     static constexpr unsigned long Type_Declaration = 7;
 
     Tag();
-    explicit Tag(unsigned long const& type);
+    // Not explicit: a code stands wherever a tag is expected.
+    Tag(unsigned long const& type);
 
     Tag& operator=(unsigned long const& type);
 
@@ -40,5 +41,15 @@ private:
 bool operator==(Tag const& a, Tag const& b);
 bool operator==(Tag const& tag, unsigned long const& type);
 bool operator!=(Tag const& tag, unsigned long const& type);
+
+// The same codes under their names in the namespace itself.
+inline constexpr unsigned long Type_Undefined = Tag::Type_Undefined;
+inline constexpr unsigned long Type_BeginTag = Tag::Type_BeginTag;
+inline constexpr unsigned long Type_EmptyElementTag = Tag::Type_EmptyElementTag;
+inline constexpr unsigned long Type_EndTag = Tag::Type_EndTag;
+inline constexpr unsigned long Type_String = Tag::Type_String;
+inline constexpr unsigned long Type_Content = Tag::Type_Content;
+inline constexpr unsigned long Type_Comment = Tag::Type_Comment;
+inline constexpr unsigned long Type_Declaration = Tag::Type_Declaration;
 
 } // namespace XML

@@ -68,4 +68,22 @@ TEST(XML_Tag, CodesCanBeSetAssignedAndCompared) {
     EXPECT_FALSE(Tag(Tag::Type_BeginTag) == Tag(Tag::Type_EndTag));
 }
 
+TEST(XML_Tag, ACodeStandsWhereATagIsExpected) {
+    Tag const tag = Tag::Type_String;
+    EXPECT_EQ(tag.get_Type(), 4u);
+    EXPECT_TRUE(Tag::Type_Comment == Tag(Tag::Type_Comment));
+    EXPECT_FALSE(Tag::Type_Comment == tag);
+}
+
+TEST(XML_Tag, CodeNamesAreAlsoInTheNamespace) {
+    EXPECT_EQ(XML::Type_Undefined, 0u);
+    EXPECT_EQ(XML::Type_BeginTag, 1u);
+    EXPECT_EQ(XML::Type_EmptyElementTag, 2u);
+    EXPECT_EQ(XML::Type_EndTag, 3u);
+    EXPECT_EQ(XML::Type_String, 4u);
+    EXPECT_EQ(XML::Type_Content, 5u);
+    EXPECT_EQ(XML::Type_Comment, 6u);
+    EXPECT_EQ(XML::Type_Declaration, 7u);
+}
+
 } // namespace
