@@ -26,9 +26,9 @@ public:
                                                          std::string const& options,
                                                          FileInfo const& remoteFile);
 
-private:
     // Appends " -c <machine>" unless "-c" occurs anywhere, then
-    // " -pylonv <version>" unless "-pylonv" occurs anywhere.
+    // " -pylonv <version>" unless "-pylonv" occurs anywhere. Open to callers
+    // so that the completed options can be checked without a remote run.
     void _initialize_ClientQuorvexParameters(std::string& options);
 };
 

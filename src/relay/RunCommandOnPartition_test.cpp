@@ -1,5 +1,6 @@
 #include "relay/RunCommandOnPartition.h"
 
+#include "relay/RELAY_Test_Utility.h"
 #include "relay/RELAY_Utility.h"
 
 #include <gtest/gtest.h>
@@ -41,4 +42,47 @@ TEST(RunCommandOnPartition, RemoteFileAttributesAreTakenAsGiven) {
 
 TEST(RunCommandOnPartition, HasNoVirtualFunctions) {
     EXPECT_FALSE(std::is_polymorphic<RunCommandOnPartition>::value);
+}
+
+namespace {
+
+// The client survey options as completed for partition 3 of 1234-ABC_10ABCDE.
+std::string completedOptions(std::string options)
+{
+    RunCommandOnPartition run{
+        Quorvex::RELAY::TargetPartition(Quorvex::RELAY::u_make_TestPartition())};
+    run._initialize_ClientQuorvexParameters(options);
+    return options;
+}
+
+} // namespace
+
+TEST(RunCommandOnPartition, EmptyOptionsGetMachineAndVersionAfterALeadingBlank) {
+    EXPECT_EQ(completedOptions(""), " -c 1234-ABC_10ABCDE -pylonv 4.0.11");
+}
+
+TEST(RunCommandOnPartition, OptionsNamingTheMachineGetOnlyTheVersion) {
+    EXPECT_EQ(completedOptions("-c X"), "-c X -pylonv 4.0.11");
+}
+
+TEST(RunCommandOnPartition, OptionsNamingTheVersionGetOnlyTheMachine) {
+    EXPECT_EQ(completedOptions("-pylonv 5"), "-pylonv 5 -c 1234-ABC_10ABCDE");
+}
+
+TEST(RunCommandOnPartition, MinusCInsideAnotherWordCountsAsNamingTheMachine) {
+    EXPECT_EQ(completedOptions("-cfg /etc/q.cfg"), "-cfg /etc/q.cfg -pylonv 4.0.11");
+    EXPECT_EQ(completedOptions("x-cy"), "x-cy -pylonv 4.0.11");
+}
+
+TEST(RunCommandOnPartition, OptionsNamingBothAreLeftAlone) {
+    EXPECT_EQ(completedOptions("-pylonv 5 -c Y"), "-pylonv 5 -c Y");
+}
+
+TEST(RunCommandOnPartition, VersionCheckSeesTheMachineJustAppended) {
+    // The machine text itself may hold "-pylonv"; the version is then not added.
+    RunCommandOnPartition run{Quorvex::RELAY::TargetPartition(
+        Quorvex::System::Partition(Quorvex::System::MTMS("A-pylonv", "S"), "3", ""))};
+    std::string options;
+    run._initialize_ClientQuorvexParameters(options);
+    EXPECT_EQ(options, " -c A-pylonv_S");
 }
