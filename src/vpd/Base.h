@@ -9,7 +9,7 @@ namespace VPD {
 class Base {
 public:
     Base();
-    explicit Base(std::string const& displayName);
+    Base(std::string const& displayName);
 
     std::string const& get_DisplayName() const;
     void set_DisplayName(std::string const& displayName);

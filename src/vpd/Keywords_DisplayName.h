@@ -26,8 +26,9 @@ public:
     const_iterator end() const;
     std::size_t size() const;
 
-protected:
-    // An entry already present is kept.
+    // Adds one row; an entry already present is kept. Open to callers so
+    // that a table with rows of its own (wildcard rows, say) can be built;
+    // the shared table of the properties is const and never changes.
     void _insert(std::string const& keyword, std::string const& displayName);
 
 private:

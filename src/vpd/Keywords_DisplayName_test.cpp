@@ -10,12 +10,6 @@ namespace {
 
 using Quorvex::VPD::Keywords_DisplayName;
 
-// Opens the table's row insertion to tests.
-class TestableTable : public Keywords_DisplayName {
-public:
-    using Keywords_DisplayName::_insert;
-};
-
 std::string u_listTable(Keywords_DisplayName const& table) {
     std::ostringstream out;
     for (auto const& row : table) {
@@ -184,7 +178,7 @@ TEST(VPD_Keywords_DisplayName, IterationIsInByteOrderNotInsertionOrder) {
 }
 
 TEST(VPD_Keywords_DisplayName, SecondInsertKeepsFirstDisplayName) {
-    TestableTable table;
+    Keywords_DisplayName table;
     table._insert("SE", "Other Name");
     EXPECT_EQ(table["SE"], "Machine or Cabinet Serial Number");
     table._insert("QQ", "First");
@@ -193,7 +187,7 @@ TEST(VPD_Keywords_DisplayName, SecondInsertKeepsFirstDisplayName) {
 }
 
 TEST(VPD_Keywords_DisplayName, WildcardRowMatchesFirstOrSecondCharacter) {
-    TestableTable table;
+    Keywords_DisplayName table;
     table._insert("*Q", "Any then Q");
     table._insert("Q*", "Q then any");
     EXPECT_EQ(table["XQ"], "Any then Q");
@@ -203,7 +197,7 @@ TEST(VPD_Keywords_DisplayName, WildcardRowMatchesFirstOrSecondCharacter) {
 }
 
 TEST(VPD_Keywords_DisplayName, WildcardReplacesOnlyOneCharacter) {
-    TestableTable table;
+    Keywords_DisplayName table;
     table._insert("**", "Both");
     EXPECT_EQ(table["AB"], "AB");
     table._insert("*BC", "Three");
@@ -212,19 +206,19 @@ TEST(VPD_Keywords_DisplayName, WildcardReplacesOnlyOneCharacter) {
 }
 
 TEST(VPD_Keywords_DisplayName, WildcardIsNotTriedBeyondSecondCharacter) {
-    TestableTable table;
+    Keywords_DisplayName table;
     table._insert("AB*", "Third");
     EXPECT_EQ(table["ABC"], "ABC");
 }
 
 TEST(VPD_Keywords_DisplayName, OneCharacterKeywordTriesOnlyFirstPosition) {
-    TestableTable table;
+    Keywords_DisplayName table;
     table._insert("*", "Any single");
     EXPECT_EQ(table["Q"], "Any single");
 }
 
 TEST(VPD_Keywords_DisplayName, CopyHoldsTheSameRows) {
-    TestableTable table;
+    Keywords_DisplayName table;
     table._insert("QQ", "Extra");
     Keywords_DisplayName const copy(table);
     EXPECT_EQ(copy["QQ"], "Extra");

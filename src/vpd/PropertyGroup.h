@@ -14,7 +14,7 @@ namespace VPD {
 class PropertyGroup : public Base, public Base_StringValue, public ListOf_Properties {
 public:
     PropertyGroup();
-    explicit PropertyGroup(std::string const& name);
+    PropertyGroup(std::string const& name);
 
     std::string const& __StringValue() const override;
 };

@@ -27,6 +27,14 @@ TEST(VPD_PropertyGroup, KeyIsTheName) {
     EXPECT_EQ(static_cast<std::string>(group), "Cards");
 }
 
+TEST(VPD_PropertyGroup, NameAloneMakesAnEmptyGroup) {
+    PropertyGroup const group = std::string("Memory");
+    EXPECT_EQ(group.get_DisplayName(), "Memory");
+    EXPECT_TRUE(group.empty());
+    Quorvex::VPD::Base const base = std::string("Memory");
+    EXPECT_EQ(base.get_DisplayName(), "Memory");
+}
+
 TEST(VPD_PropertyGroup, GroupsOfTheSameNameMergeWithFirstValueKept) {
     ListOf_<PropertyGroup> groups;
     groups.insert(u_group("G", {Property("a", "1"), Property("b", "2")}));

@@ -15,7 +15,6 @@ namespace VPD {
 // One surveyed thing (machine, partition, card): display name, unique ID,
 // references, properties, property groups and named lists of further
 // resources, nested to any depth. Keyed by its unique ID. Copies are deep.
-// Reading its resource lists needs vpd/ResourceList.h.
 class Resource : public Base,
                  public Base_StringValue,
                  public Resource_ContainerInterface_ListOf_Properties,
@@ -44,3 +43,8 @@ public:
 
 } // namespace VPD
 } // namespace Quorvex
+
+// A resource is of little use without its lists: make ResourceList complete
+// for every unit that includes this header. It comes after the class,
+// because a resource list holds resources by value.
+#include "vpd/ResourceList.h"

@@ -14,7 +14,7 @@ namespace VPD {
 class ResourceList : public Base, public Base_StringValue, public ListOf_<Resource> {
 public:
     ResourceList();
-    explicit ResourceList(std::string const& name);
+    ResourceList(std::string const& name);
 
     std::string const& __StringValue() const override;
 };

@@ -16,6 +16,12 @@ TEST(VPD_ResourceList, KeyIsTheName) {
     EXPECT_EQ(ResourceList().get_DisplayName(), "");
 }
 
+TEST(VPD_ResourceList, NameAloneMakesAnEmptyList) {
+    ResourceList const list = std::string("Partitions");
+    EXPECT_EQ(list.get_DisplayName(), "Partitions");
+    EXPECT_TRUE(list.empty());
+}
+
 TEST(VPD_ResourceList, ResourcesIterateInByteOrderOfUniqueIDs) {
     ResourceList list("Partitions");
     list.insert(Resource("b", "1234-ABC-10ABCDE-2"));

@@ -1,11 +1,14 @@
 #include "vpd/Resource.h"
 
 #include "vpd/ResourceList.h"
+#include "vpd/ResourceSet.h"
 #include "vpd/TreeText_test.h"
 
 #include <gtest/gtest.h>
 
+#include <exception>
 #include <string>
+#include <type_traits>
 #include <utility>
 #include <vector>
 
@@ -255,6 +258,28 @@ TEST(VPD_Resource, PropertiesAndGroupsAreReachableByKey) {
     EXPECT_FALSE(resource.has_Property("HostName"));
     EXPECT_TRUE(resource.has_PropertyGroup("Cpu"));
     EXPECT_FALSE(resource.has_PropertyGroup("Memory"));
+}
+
+TEST(VPD_Resource, ModelClassesHaveOnlyTheKeyAsVirtualAndNoVirtualDestructor) {
+    EXPECT_FALSE(std::is_polymorphic<Quorvex::VPD::Base>::value);
+    EXPECT_TRUE(std::is_polymorphic<Resource>::value);
+    EXPECT_FALSE(std::has_virtual_destructor<Quorvex::VPD::Base_StringValue>::value);
+    EXPECT_FALSE(std::has_virtual_destructor<Property>::value);
+    EXPECT_FALSE(std::has_virtual_destructor<PropertyGroup>::value);
+    EXPECT_FALSE(std::has_virtual_destructor<Resource>::value);
+    EXPECT_FALSE(std::has_virtual_destructor<ResourceList>::value);
+    EXPECT_FALSE(std::has_virtual_destructor<Quorvex::VPD::ResourceSet>::value);
+}
+
+TEST(VPD_Resource, ErrorTypesAreEmptyAndOutsideTheStandardExceptions) {
+    using NullContent =
+        Quorvex::VPD::Resource_ContainerInterface_ListOf_ResourceLists::Error_ContentPtrIs_NULL;
+    using NotFound = Quorvex::VPD::ListOf_<ResourceList>::Error_ElementNotFound;
+    EXPECT_TRUE(std::is_empty<NullContent>::value);
+    EXPECT_TRUE(std::is_empty<NotFound>::value);
+    // A catch of the standard base anywhere must not swallow them.
+    EXPECT_FALSE((std::is_base_of<std::exception, NullContent>::value));
+    EXPECT_FALSE((std::is_base_of<std::exception, NotFound>::value));
 }
 
 } // namespace
