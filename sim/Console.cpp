@@ -10,11 +10,9 @@
 #include <iostream>
 #include <thread>
 
-namespace PylonSim
-{
+namespace PylonSim {
 
-namespace
-{
+namespace {
 
 constexpr char gc_ScenarioVariable[] = "PYLON_SIM_SCENARIO";
 constexpr char gc_LogVariable[] = "PYLON_SIM_LOG";
@@ -24,18 +22,14 @@ constexpr char gc_UnknownActionLine[] = "Rc::3::RcCmd::0::RetStr1::unknown actio
 constexpr char const* gc_Actions[] = {"runCmdOnPartition", "getFileFromPartition",
                                       "putFileToPartition"};
 
-std::string _environment(char const* name)
-{
+std::string _environment(char const* name) {
     char const* value = std::getenv(name);
     return value == nullptr ? "" : value;
 }
 
-bool _isAction(std::string const& action)
-{
-    for (char const* known : gc_Actions)
-    {
-        if (action == known)
-        {
+bool _isAction(std::string const& action) {
+    for (char const* known : gc_Actions) {
+        if (action == known) {
             return true;
         }
     }
@@ -43,94 +37,78 @@ bool _isAction(std::string const& action)
 }
 
 // Without PYLON_SIM_SCENARIO every tool answers nothing and exits 0.
-Scenario _loadScenario()
-{
+Scenario _loadScenario() {
     std::string const fileName = _environment(gc_ScenarioVariable);
     return fileName.empty() ? Scenario() : Scenario::load(fileName);
 }
 
-void _wait(double seconds)
-{
-    if (seconds > 0.0)
-    {
+void _wait(double seconds) {
+    if (seconds > 0.0) {
         std::this_thread::sleep_for(std::chrono::duration<double>(seconds));
     }
 }
 
-int _print(Response const& response, std::string const& diagnostic)
-{
-    std::cout.write(response.stdoutText.data(), static_cast<std::streamsize>(response.stdoutText.size()));
+int _print(Response const& response, std::string const& diagnostic) {
+    std::cout.write(response.stdoutText.data(),
+                    static_cast<std::streamsize>(response.stdoutText.size()));
     std::cout.flush();
     std::cerr << diagnostic;
-    std::cerr.write(response.stderrText.data(), static_cast<std::streamsize>(response.stderrText.size()));
+    std::cerr.write(response.stderrText.data(),
+                    static_cast<std::streamsize>(response.stderrText.size()));
     std::cerr.flush();
     return response.exitCode;
 }
 
 // The identity after the first "-c"; "*" (the default section) without one.
-std::string _identity(std::vector<std::string> const& arguments)
-{
-    for (std::size_t i = 0; i + 1 < arguments.size(); ++i)
-    {
-        if (arguments[i] == "-c")
-        {
+std::string _identity(std::vector<std::string> const& arguments) {
+    for (std::size_t i = 0; i + 1 < arguments.size(); ++i) {
+        if (arguments[i] == "-c") {
             return arguments[i + 1];
         }
     }
     return "*";
 }
 
-}  // namespace
+} // namespace
 
-bool Console::isTool(std::string const& name)
-{
+bool Console::isTool(std::string const& name) {
     return name == "lsvtc" || name == "lspartition" || name == "runact-api";
 }
 
-int Console::answer(std::string const& tool, std::vector<std::string> const& arguments)
-{
+int Console::answer(std::string const& tool, std::vector<std::string> const& arguments) {
     _log(tool, arguments);
-    try
-    {
-        return tool == "runact-api" ? _answerRemoteAction(arguments) : _answerListing(tool, arguments);
-    }
-    catch (ScenarioError const& error)
-    {
+    try {
+        return tool == "runact-api" ? _answerRemoteAction(arguments)
+                                    : _answerListing(tool, arguments);
+    } catch (ScenarioError const& error) {
         _reportBadScenario(error.describe());
         return gc_ExitBadScenario;
     }
 }
 
-int Console::check(std::string const& fileName)
-{
-    try
-    {
+int Console::check(std::string const& fileName) {
+    try {
         Scenario::load(fileName);
         return 0;
-    }
-    catch (ScenarioError const& error)
-    {
+    } catch (ScenarioError const& error) {
         _reportBadScenario(error.describe());
         return gc_ExitBadScenario;
     }
 }
 
-void Console::_log(std::string const& tool, std::vector<std::string> const& arguments)
-{
+void Console::_log(std::string const& tool, std::vector<std::string> const& arguments) {
     std::string const fileName = _environment(gc_LogVariable);
-    if (!fileName.empty() && !InvocationLog::append(fileName, InvocationLog::formatLine(tool, arguments)))
-    {
+    if (!fileName.empty() &&
+        !InvocationLog::append(fileName, InvocationLog::formatLine(tool, arguments))) {
         std::cerr << "pylon-sim: cannot append to the invocation log " << fileName << std::endl;
     }
 }
 
-void Console::_reportBadScenario(std::string const& description)
-{
+void Console::_reportBadScenario(std::string const& description) {
     std::cerr << "pylon-sim: bad scenario: " << description << std::endl;
 }
 
-int Console::_answerListing(std::string const& tool, std::vector<std::string> const& arguments)
-{
+int Console::_answerListing(std::string const& tool, std::vector<std::string> const& arguments) {
     Scenario const scenario = _loadScenario();
     std::string const name = tool == "lsvtc" ? "" : _identity(arguments);
     Response const response = scenario.find(tool, name);
@@ -138,12 +116,10 @@ int Console::_answerListing(std::string const& tool, std::vector<std::string> co
     return _print(response, "");
 }
 
-int Console::_answerRemoteAction(std::vector<std::string> const& arguments)
-{
+int Console::_answerRemoteAction(std::vector<std::string> const& arguments) {
     Scenario const scenario = _loadScenario();
     RemoteActionRequest const request(arguments);
-    if (!_isAction(request.get_Action()))
-    {
+    if (!_isAction(request.get_Action())) {
         Response unknown;
         unknown.stdoutText = gc_UnknownActionLine;
         unknown.exitCode = gc_ExitUnknownAction;
@@ -157,10 +133,9 @@ int Console::_answerRemoteAction(std::vector<std::string> const& arguments)
     return _print(response, diagnostic);
 }
 
-std::string Console::_placeDocument(RemoteActionRequest const& request, std::string const& document)
-{
-    if (!request.has_LocalFN())
-    {
+std::string Console::_placeDocument(RemoteActionRequest const& request,
+                                    std::string const& document) {
+    if (!request.has_LocalFN()) {
         return "runact-api: no LocalFN given, no document placed\n";
     }
     std::string const fileName = gc_QuorvexFolder + request.get_LocalFN();
@@ -170,4 +145,4 @@ std::string Console::_placeDocument(RemoteActionRequest const& request, std::str
     return out ? "" : "runact-api: cannot write " + fileName + "\n";
 }
 
-}  // namespace PylonSim
+} // namespace PylonSim

@@ -6,13 +6,11 @@
 #include <string>
 #include <vector>
 
-namespace PylonSim
-{
+namespace PylonSim {
 
 class RemoteActionRequest;
 
-class Console
-{
+class Console {
 public:
     // Exit status of a run whose scenario file cannot be used.
     static constexpr int gc_ExitBadScenario = 97;
@@ -34,7 +32,8 @@ private:
     static int _answerRemoteAction(std::vector<std::string> const& arguments);
     // Writes the fetched document at /var/adm/quorvex/ + LocalFN; returns a
     // diagnostic line for stderr, empty when the document was placed.
-    static std::string _placeDocument(RemoteActionRequest const& request, std::string const& document);
+    static std::string _placeDocument(RemoteActionRequest const& request,
+                                      std::string const& document);
 };
 
-}  // namespace PylonSim
+} // namespace PylonSim

@@ -2,22 +2,18 @@
 
 #include <fstream>
 
-namespace PylonSim
-{
+namespace PylonSim {
 
 std::string InvocationLog::formatLine(std::string const& tool,
-                                      std::vector<std::string> const& arguments)
-{
+                                      std::vector<std::string> const& arguments) {
     std::string line = tool;
-    for (std::string const& argument : arguments)
-    {
+    for (std::string const& argument : arguments) {
         line += '\t' + _escape(argument);
     }
     return line + '\n';
 }
 
-bool InvocationLog::append(std::string const& fileName, std::string const& line)
-{
+bool InvocationLog::append(std::string const& fileName, std::string const& line) {
     // One buffered write of the whole line keeps calls from several
     // processes on separate lines.
     std::ofstream out(fileName, std::ios::binary | std::ios::app);
@@ -26,29 +22,20 @@ bool InvocationLog::append(std::string const& fileName, std::string const& line)
     return static_cast<bool>(out);
 }
 
-std::string InvocationLog::_escape(std::string const& argument)
-{
+std::string InvocationLog::_escape(std::string const& argument) {
     std::string escaped;
-    for (char const c : argument)
-    {
-        if (c == '\\')
-        {
+    for (char const c : argument) {
+        if (c == '\\') {
             escaped += "\\\\";
-        }
-        else if (c == '\t')
-        {
+        } else if (c == '\t') {
             escaped += "\\t";
-        }
-        else if (c == '\n')
-        {
+        } else if (c == '\n') {
             escaped += "\\n";
-        }
-        else
-        {
+        } else {
             escaped += c;
         }
     }
     return escaped;
 }
 
-}  // namespace PylonSim
+} // namespace PylonSim

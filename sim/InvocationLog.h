@@ -5,15 +5,14 @@
 #include <string>
 #include <vector>
 
-namespace PylonSim
-{
+namespace PylonSim {
 
-class InvocationLog
-{
+class InvocationLog {
 public:
     // The tool's base name, then each argument preceded by a TAB; backslash,
     // TAB and line feed inside an argument are written as \\, \t and \n.
-    static std::string formatLine(std::string const& tool, std::vector<std::string> const& arguments);
+    static std::string formatLine(std::string const& tool,
+                                  std::vector<std::string> const& arguments);
 
     // Appends the line to the log file in one write; false when it cannot.
     static bool append(std::string const& fileName, std::string const& line);
@@ -22,4 +21,4 @@ private:
     static std::string _escape(std::string const& argument);
 };
 
-}  // namespace PylonSim
+} // namespace PylonSim

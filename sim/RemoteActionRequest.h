@@ -6,11 +6,9 @@
 #include <string>
 #include <vector>
 
-namespace PylonSim
-{
+namespace PylonSim {
 
-class RemoteActionRequest
-{
+class RemoteActionRequest {
 public:
     explicit RemoteActionRequest(std::vector<std::string> const& arguments);
 
@@ -35,4 +33,4 @@ private:
     std::string _localFN;
 };
 
-}  // namespace PylonSim
+} // namespace PylonSim

@@ -6,12 +6,10 @@
 #include <optional>
 #include <string>
 
-namespace PylonSim
-{
+namespace PylonSim {
 
 // One answer of a console tool.
-struct Response
-{
+struct Response {
     std::string stdoutText;
     std::string stderrText;
     int exitCode = 0;
@@ -23,8 +21,7 @@ struct Response
 
 // A scenario file that cannot be used; carries the line it was found on
 // (0 when the file itself cannot be read).
-struct ScenarioError
-{
+struct ScenarioError {
     std::string fileName;
     unsigned long line = 0;
     std::string problem;
@@ -33,8 +30,7 @@ struct ScenarioError
     std::string describe() const;
 };
 
-class Scenario
-{
+class Scenario {
 public:
     // The empty scenario: every tool prints nothing and exits 0.
     Scenario() = default;
@@ -59,4 +55,4 @@ private:
     std::map<std::string, Response> _sections;
 };
 
-}  // namespace PylonSim
+} // namespace PylonSim

@@ -8,11 +8,9 @@
 #include <string>
 #include <vector>
 
-namespace PylonSim
-{
+namespace PylonSim {
 
-class ScenarioParser
-{
+class ScenarioParser {
 public:
     explicit ScenarioParser(std::string const& fileName);
 
@@ -36,7 +34,7 @@ private:
 
     std::string _fileName;
     std::vector<std::string> _lines;
-    std::size_t _index = 0;  // of the line being parsed
+    std::size_t _index = 0; // of the line being parsed
     Scenario _scenario;
 
     // The section being filled; its tool is empty before the first header.
@@ -46,4 +44,4 @@ private:
     std::set<std::string> _keysSeen;
 };
 
-}  // namespace PylonSim
+} // namespace PylonSim

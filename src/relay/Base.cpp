@@ -19,27 +19,27 @@ constexpr char gc_NoAction[] = "ERROR_NO_ACTION";
 Base::Base() : _CallerID(0), _Action(gc_NoAction), _Target(), _Output(), _ReturnCodes() {}
 
 Base::Base(TargetPartition const& target)
-    : _CallerID(0), _Action(gc_NoAction), _Target(target), _Output(), _ReturnCodes()
-{
+    : _CallerID(0), _Action(gc_NoAction), _Target(target), _Output(), _ReturnCodes() {}
+
+void Base::set_Action(std::string const& action) {
+    _Action = action;
 }
 
-void Base::set_Action(std::string const& action) { _Action = action; }
+TargetPartition& Base::get_TargetPartition() {
+    return _Target;
+}
 
-TargetPartition& Base::get_TargetPartition() { return _Target; }
-
-std::string Base::createString_Command() const
-{
+std::string Base::createString_Command() const {
     // The tool expects an empty field between the class name and the action,
     // hence four colons in a row.
     std::ostringstream command;
-    command << gc_RemoteActionTool << gc_ServiceEventClass << "::" << _Action << "::"
-            << RELAY_Utility::create_Parameter("CallerID", _CallerID) << "::"
-            << _Target.createString_Target();
+    command << gc_RemoteActionTool << gc_ServiceEventClass << "::" << _Action
+            << "::" << RELAY_Utility::create_Parameter("CallerID", _CallerID)
+            << "::" << _Target.createString_Target();
     return command.str();
 }
 
-int Base::execute(std::string const& parameters)
-{
+int Base::execute(std::string const& parameters) {
     // A fresh runner per call: a runner executes its command only once.
     Utility::ShellCommand command(createString_Command());
     if (!parameters.empty()) {
@@ -60,14 +60,17 @@ int Base::execute(std::string const& parameters)
     return exitCode;
 }
 
-ReturnCode const& Base::get_ReturnCode() const
-{
+ReturnCode const& Base::get_ReturnCode() const {
     return _ReturnCodes.empty() ? cBlankReturnCode : _ReturnCodes.front();
 }
 
-std::vector<ReturnCode> const& Base::get_ListOf_ReturnCodes() const { return _ReturnCodes; }
+std::vector<ReturnCode> const& Base::get_ListOf_ReturnCodes() const {
+    return _ReturnCodes;
+}
 
-std::vector<std::string> const& Base::get_Output() const { return _Output; }
+std::vector<std::string> const& Base::get_Output() const {
+    return _Output;
+}
 
 } // namespace RELAY
 } // namespace Quorvex

@@ -32,8 +32,7 @@ std::string const gc_RunCommandPrefix =
     "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionId::\"3\"";
 
 // A Base that runs "runCmdOnPartition" on partition 3.
-Base runBase()
-{
+Base runBase() {
     Base base{TargetPartition(u_make_TestPartition())};
     base.set_Action("runCmdOnPartition");
     return base;
@@ -47,8 +46,8 @@ TEST_F(Base_Run, CompletePutCommandLineIsExecutedByteForByte) {
     base.set_Action("putFileToPartition");
     base.get_TargetPartition().use_PartitionArray();
 
-    int const exitCode =
-        base.execute(Quorvex::RELAY::PutFileToPartition::createString_PutFileParameters("/tmp/quorvex.tar"));
+    int const exitCode = base.execute(
+        Quorvex::RELAY::PutFileToPartition::createString_PutFileParameters("/tmp/quorvex.tar"));
 
     EXPECT_EQ(exitCode, 0);
     EXPECT_EQ(_trace.get_Text(),
@@ -61,7 +60,8 @@ TEST_F(Base_Run, CompletePutCommandLineIsExecutedByteForByte) {
     EXPECT_EQ(console.invocations(),
               (std::vector<Invocation>{
                   {"runact-api", "-c",
-                   "ZOR.ServiceEvent::::putFileToPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
+                   "ZOR.ServiceEvent::::putFileToPartition::CallerID::0::CecMT::1234-ABC::CecMS::"
+                   "10ABCDE::"
                    "PartitionArray::{3}::LocalFN::/tmp/quorvex.tar::RemoteFN::/tmp/quorvex.tar::"
                    "RemoteFileInfo::FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=system"}}));
 }
@@ -70,7 +70,8 @@ TEST_F(Base_Run, EmptyParametersAppendNothingToTheCommandLine) {
     SimulatedConsole const console("[runCmdOnPartition 3]\nstdout " + gc_DoneLine + "\n");
     Base base = runBase();
     EXPECT_EQ(base.execute(""), 0);
-    EXPECT_EQ(_trace.get_Text(), u_expected_TraceBlock(gc_RunCommandPrefix, 0, gc_DoneLine + "\n\n", "\n"));
+    EXPECT_EQ(_trace.get_Text(),
+              u_expected_TraceBlock(gc_RunCommandPrefix, 0, gc_DoneLine + "\n\n", "\n"));
     EXPECT_EQ(console.invocations(),
               (std::vector<Invocation>{{"runact-api", "-c",
                                         "ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::"
@@ -120,8 +121,10 @@ TEST_F(Base_Run, NonZeroExitLeavesOutputEmptyButParsesTheLines) {
 }
 
 TEST_F(Base_Run, FailedRunAfterASuccessfulOneLeavesNoOutput) {
-    SimulatedConsole const console("[runCmdOnPartition 3]\nstdout " + gc_DoneLine + "\n"
-                                   "[getFileFromPartition 3]\nstdout Rc::5::RetStr1::missing\nexit 4\n");
+    SimulatedConsole const console(
+        "[runCmdOnPartition 3]\nstdout " + gc_DoneLine +
+        "\n"
+        "[getFileFromPartition 3]\nstdout Rc::5::RetStr1::missing\nexit 4\n");
     Base base = runBase();
     EXPECT_EQ(base.execute(""), 0);
     EXPECT_FALSE(base.get_Output().empty());

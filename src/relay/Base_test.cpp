@@ -21,7 +21,8 @@ TEST(Base, ClassNameIsFollowedByFourColonsThenTheAction) {
     Base base{TargetPartition(u_make_TestPartition())};
     base.set_Action("runCmdOnPartition");
     std::string const command = base.createString_Command();
-    EXPECT_EQ(command.rfind("/usr/bin/runact-api -c ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::", 0),
+    EXPECT_EQ(command.rfind(
+                  "/usr/bin/runact-api -c ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::", 0),
               0u);
 }
 
@@ -47,11 +48,10 @@ TEST(Base, CompletePutCommandLineIsBuiltByteForByte) {
     std::string const line =
         base.createString_Command() + "::" +
         Quorvex::RELAY::PutFileToPartition::createString_PutFileParameters("/tmp/quorvex.tar");
-    EXPECT_EQ(line,
-              "/usr/bin/runact-api -c ZOR.ServiceEvent::::putFileToPartition::CallerID::0::"
-              "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionArray::{\"3\"}::"
-              "LocalFN::\"/tmp/quorvex.tar\"::RemoteFN::\"/tmp/quorvex.tar\"::"
-              "RemoteFileInfo::\"FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=system\"");
+    EXPECT_EQ(line, "/usr/bin/runact-api -c ZOR.ServiceEvent::::putFileToPartition::CallerID::0::"
+                    "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionArray::{\"3\"}::"
+                    "LocalFN::\"/tmp/quorvex.tar\"::RemoteFN::\"/tmp/quorvex.tar\"::"
+                    "RemoteFileInfo::\"FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=system\"");
 }
 
 TEST(Base, BeforeAnyRunTheReturnCodeIsTheBlankOne) {

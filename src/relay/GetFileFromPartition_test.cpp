@@ -5,9 +5,10 @@
 using Quorvex::RELAY::GetFileFromPartition;
 
 TEST(GetFileFromPartition, ParameterTextNamesRemoteThenLocalWithConsoleAttributes) {
-    EXPECT_EQ(GetFileFromPartition::createString_GetFileParameters("/tmp/quorvex.out", "/var/tmp/p3.out"),
-              "RemoteFN::\"/tmp/quorvex.out\"::LocalFN::\"/var/tmp/p3.out\"::"
-              "LocalFileInfo::\"FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon\"");
+    EXPECT_EQ(
+        GetFileFromPartition::createString_GetFileParameters("/tmp/quorvex.out", "/var/tmp/p3.out"),
+        "RemoteFN::\"/tmp/quorvex.out\"::LocalFN::\"/var/tmp/p3.out\"::"
+        "LocalFileInfo::\"FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon\"");
 }
 
 TEST(GetFileFromPartition, ValuesWithQuotesAndDoubleColonsAreWrittenUnescaped) {

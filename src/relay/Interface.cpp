@@ -7,9 +7,7 @@ namespace RELAY {
 // of each operation applies only when that operation stands alone.
 Interface::Interface(TargetPartition const& target)
     : Base(target), GetFileFromPartition(target), PutFileToPartition(target),
-      RunCommandOnPartition(target)
-{
-}
+      RunCommandOnPartition(target) {}
 
 Interface::~Interface() = default;
 

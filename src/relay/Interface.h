@@ -9,7 +9,9 @@ namespace RELAY {
 
 // All three remote operations over one shared Base: they share the target,
 // the action name and the last run's output and return codes.
-class Interface : public GetFileFromPartition, public PutFileToPartition, public RunCommandOnPartition {
+class Interface : public GetFileFromPartition,
+                  public PutFileToPartition,
+                  public RunCommandOnPartition {
 public:
     Interface(TargetPartition const& target);
     ~Interface();

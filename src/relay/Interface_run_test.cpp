@@ -38,18 +38,18 @@ std::string const gc_AllDone = "[putFileToPartition *]\nstdout " + gc_DoneLine +
 std::string const gc_Machine = "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::";
 std::string const gc_ClientAttributes = "FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=system";
 
-TargetPartition testTarget() { return TargetPartition(u_make_TestPartition()); }
+TargetPartition testTarget() {
+    return TargetPartition(u_make_TestPartition());
+}
 
 // The argument runact-api received for its action text ("-c" is the first).
-std::string actionArgument(SimulatedConsole const& console, std::size_t call)
-{
+std::string actionArgument(SimulatedConsole const& console, std::size_t call) {
     std::vector<Invocation> const calls = console.invocations();
     return call < calls.size() && calls[call].size() == 3 ? calls[call][2] : "<no such call>";
 }
 
 // The CmdOpts text the console received for the client survey on partition 3.
-std::string receivedClientOptions(SimulatedConsole const& console)
-{
+std::string receivedClientOptions(SimulatedConsole const& console) {
     std::string const argument = actionArgument(console, 0);
     std::string::size_type const start = argument.find("::CmdOpts::");
     std::string::size_type const end = argument.find("::RemoteFN::");
@@ -60,8 +60,7 @@ std::string receivedClientOptions(SimulatedConsole const& console)
 
 // Runs the client survey on partition 3 with the given options and returns
 // the CmdOpts text the console received.
-std::string clientOptionsSentFor(std::string const& options)
-{
+std::string clientOptionsSentFor(std::string const& options) {
     SimulatedConsole const console(gc_AllDone);
     Interface iface{testTarget()};
     iface.execute_PartitionQuorvex(options, "/tmp/quorvex.out");
@@ -74,35 +73,47 @@ TEST_F(Interface_Run, PutSendsItsParameterTextByteForByte) {
     SimulatedConsole const console(gc_AllDone);
     Interface iface{testTarget()};
     EXPECT_EQ(iface.putFileToPartition("/tmp/quorvex.tar"), 0);
-    EXPECT_EQ(_trace.get_Text(),
-              u_expected_TraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::putFileToPartition::"
-                                    "CallerID::0::" + gc_Machine + "PartitionArray::{\"3\"}::"
-                                    "LocalFN::\"/tmp/quorvex.tar\"::RemoteFN::\"/tmp/quorvex.tar\"::"
-                                    "RemoteFileInfo::\"" + gc_ClientAttributes + "\"",
-                                    0, gc_DoneLine + "\n\n", "\n"));
-    EXPECT_EQ(actionArgument(console, 0),
-              "ZOR.ServiceEvent::::putFileToPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
-              "PartitionArray::{3}::LocalFN::/tmp/quorvex.tar::RemoteFN::/tmp/quorvex.tar::"
-              "RemoteFileInfo::" + gc_ClientAttributes);
+    EXPECT_EQ(
+        _trace.get_Text(),
+        u_expected_TraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::putFileToPartition::"
+                              "CallerID::0::" +
+                                  gc_Machine +
+                                  "PartitionArray::{\"3\"}::"
+                                  "LocalFN::\"/tmp/quorvex.tar\"::RemoteFN::\"/tmp/quorvex.tar\"::"
+                                  "RemoteFileInfo::\"" +
+                                  gc_ClientAttributes + "\"",
+                              0, gc_DoneLine + "\n\n", "\n"));
+    EXPECT_EQ(
+        actionArgument(console, 0),
+        "ZOR.ServiceEvent::::putFileToPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
+        "PartitionArray::{3}::LocalFN::/tmp/quorvex.tar::RemoteFN::/tmp/quorvex.tar::"
+        "RemoteFileInfo::" +
+            gc_ClientAttributes);
 }
 
 TEST_F(Interface_Run, ClientSurveySendsItsParameterTextByteForByte) {
     SimulatedConsole const console(gc_AllDone);
     Interface iface{testTarget()};
     EXPECT_EQ(iface.execute_PartitionQuorvex("", "/tmp/quorvex.out"), 0);
-    EXPECT_EQ(_trace.get_Text(),
-              u_expected_TraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::runCmdOnPartition::"
-                                    "CallerID::0::" + gc_Machine + "PartitionId::\"3\"::"
-                                    "CmdID::0::CmdOpts::\" -c 1234-ABC_10ABCDE -pylonv 4.0.11\"::"
-                                    "RemoteFN::\"/tmp/quorvex.out\"::"
-                                    "RemoteFileInfo::\"" + gc_ClientAttributes + "\"",
-                                    0, gc_DoneLine + "\n\n", "\n"));
-    EXPECT_EQ(console.invocations(),
-              (std::vector<Invocation>{
-                  {"runact-api", "-c",
-                   "ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
-                   "PartitionId::3::CmdID::0::CmdOpts:: -c 1234-ABC_10ABCDE -pylonv 4.0.11::"
-                   "RemoteFN::/tmp/quorvex.out::RemoteFileInfo::" + gc_ClientAttributes}}));
+    EXPECT_EQ(
+        _trace.get_Text(),
+        u_expected_TraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::runCmdOnPartition::"
+                              "CallerID::0::" +
+                                  gc_Machine +
+                                  "PartitionId::\"3\"::"
+                                  "CmdID::0::CmdOpts::\" -c 1234-ABC_10ABCDE -pylonv 4.0.11\"::"
+                                  "RemoteFN::\"/tmp/quorvex.out\"::"
+                                  "RemoteFileInfo::\"" +
+                                  gc_ClientAttributes + "\"",
+                              0, gc_DoneLine + "\n\n", "\n"));
+    EXPECT_EQ(
+        console.invocations(),
+        (std::vector<Invocation>{
+            {"runact-api", "-c",
+             "ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
+             "PartitionId::3::CmdID::0::CmdOpts:: -c 1234-ABC_10ABCDE -pylonv 4.0.11::"
+             "RemoteFN::/tmp/quorvex.out::RemoteFileInfo::" +
+                 gc_ClientAttributes}}));
 }
 
 TEST_F(Interface_Run, GetSendsItsParameterTextByteForByte) {
@@ -110,25 +121,30 @@ TEST_F(Interface_Run, GetSendsItsParameterTextByteForByte) {
     Interface iface{testTarget()};
     EXPECT_EQ(iface.getFileFromPartition("/tmp/quorvex.out", "/var/tmp/p3.out"), 0);
     EXPECT_EQ(_trace.get_Text(),
-              u_expected_TraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::getFileFromPartition::"
-                                    "CallerID::0::" + gc_Machine + "PartitionId::\"3\"::"
-                                    "RemoteFN::\"/tmp/quorvex.out\"::LocalFN::\"/var/tmp/p3.out\"::"
-                                    "LocalFileInfo::\"FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon\"",
-                                    0, gc_DoneLine + "\n\n", "\n"));
-    EXPECT_EQ(actionArgument(console, 0),
-              "ZOR.ServiceEvent::::getFileFromPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
-              "PartitionId::3::RemoteFN::/tmp/quorvex.out::LocalFN::/var/tmp/p3.out::"
-              "LocalFileInfo::FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon");
+              u_expected_TraceBlock(
+                  "/usr/bin/runact-api -c ZOR.ServiceEvent::::getFileFromPartition::"
+                  "CallerID::0::" +
+                      gc_Machine +
+                      "PartitionId::\"3\"::"
+                      "RemoteFN::\"/tmp/quorvex.out\"::LocalFN::\"/var/tmp/p3.out\"::"
+                      "LocalFileInfo::\"FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon\"",
+                  0, gc_DoneLine + "\n\n", "\n"));
+    EXPECT_EQ(
+        actionArgument(console, 0),
+        "ZOR.ServiceEvent::::getFileFromPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
+        "PartitionId::3::RemoteFN::/tmp/quorvex.out::LocalFN::/var/tmp/p3.out::"
+        "LocalFileInfo::FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon");
 }
 
 TEST_F(Interface_Run, GetWithOneNameUsesItOnBothSides) {
     SimulatedConsole const console(gc_AllDone);
     Interface iface{testTarget()};
     EXPECT_EQ(iface.getFileFromPartition("p3.VPD.xml"), 0);
-    EXPECT_EQ(actionArgument(console, 0),
-              "ZOR.ServiceEvent::::getFileFromPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
-              "PartitionId::3::RemoteFN::p3.VPD.xml::LocalFN::p3.VPD.xml::"
-              "LocalFileInfo::FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon");
+    EXPECT_EQ(
+        actionArgument(console, 0),
+        "ZOR.ServiceEvent::::getFileFromPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
+        "PartitionId::3::RemoteFN::p3.VPD.xml::LocalFN::p3.VPD.xml::"
+        "LocalFileInfo::FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon");
 }
 
 TEST_F(Interface_Run, FetchedDocumentLandsWhereTheConsolePutsIt) {
@@ -147,7 +163,8 @@ TEST_F(Interface_Run, ClientOptionsNamingTheMachineGetOnlyTheVersion) {
 
 TEST_F(Interface_Run, ClientOptionsNamingTheVersionGetOnlyTheMachine) {
     EXPECT_EQ(clientOptionsSentFor("-pylonv 5"), "-pylonv 5 -c 1234-ABC_10ABCDE");
-    EXPECT_NE(_trace.get_Text().find("::CmdOpts::\"-pylonv 5 -c 1234-ABC_10ABCDE\"::"), std::string::npos);
+    EXPECT_NE(_trace.get_Text().find("::CmdOpts::\"-pylonv 5 -c 1234-ABC_10ABCDE\"::"),
+              std::string::npos);
 }
 
 TEST_F(Interface_Run, ClientOptionsWithMinusCInsideAWordGetNoMachine) {
@@ -166,14 +183,18 @@ TEST_F(Interface_Run, RunWithMinusOneAndEmptyOptionsWritesThemAsTheyAre) {
     EXPECT_EQ(iface.runCommandOnPartition(-1, "", info), 0);
     EXPECT_EQ(_trace.get_Text(),
               u_expected_TraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::runCmdOnPartition::"
-                                    "CallerID::0::" + gc_Machine + "PartitionId::\"3\"::"
-                                    "CmdID::-1::CmdOpts::\"\"::RemoteFN::\"/tmp/r.out\"::"
-                                    "RemoteFileInfo::\"" + gc_ClientAttributes + "\"",
+                                    "CallerID::0::" +
+                                        gc_Machine +
+                                        "PartitionId::\"3\"::"
+                                        "CmdID::-1::CmdOpts::\"\"::RemoteFN::\"/tmp/r.out\"::"
+                                        "RemoteFileInfo::\"" +
+                                        gc_ClientAttributes + "\"",
                                     0, gc_DoneLine + "\n\n", "\n"));
-    EXPECT_EQ(actionArgument(console, 0),
-              "ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
-              "PartitionId::3::CmdID::-1::CmdOpts::::RemoteFN::/tmp/r.out::RemoteFileInfo::" +
-                  gc_ClientAttributes);
+    EXPECT_EQ(
+        actionArgument(console, 0),
+        "ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
+        "PartitionId::3::CmdID::-1::CmdOpts::::RemoteFN::/tmp/r.out::RemoteFileInfo::" +
+            gc_ClientAttributes);
 }
 
 TEST_F(Interface_Run, PutThenGetAddressesByArrayThenByIdentifier) {
@@ -189,9 +210,10 @@ TEST_F(Interface_Run, PutThenGetAddressesByArrayThenByIdentifier) {
 }
 
 TEST_F(Interface_Run, OperationsShareTheActionTargetModeAndReturnCodes) {
-    SimulatedConsole const console("[putFileToPartition 3]\nstdout Rc::0::RetStr1::put\n"
-                                   "[runCmdOnPartition 3]\nstdout Rc::1::RcCmd::0::RetStr1::timeout\nexit 1\n"
-                                   "[getFileFromPartition 3]\nstdout Rc::0::RetStr1::got\nstdout Rc::9\n");
+    SimulatedConsole const console(
+        "[putFileToPartition 3]\nstdout Rc::0::RetStr1::put\n"
+        "[runCmdOnPartition 3]\nstdout Rc::1::RcCmd::0::RetStr1::timeout\nexit 1\n"
+        "[getFileFromPartition 3]\nstdout Rc::0::RetStr1::got\nstdout Rc::9\n");
     Interface iface{testTarget()};
     PutFileToPartition& put = iface;
     RunCommandOnPartition& run = iface;
@@ -200,8 +222,8 @@ TEST_F(Interface_Run, OperationsShareTheActionTargetModeAndReturnCodes) {
 
     EXPECT_EQ(put.putFileToPartition("/tmp/quorvex.tar"), 0);
     // Before the run operation runs, it sees what the put left behind.
-    EXPECT_EQ(run.createString_Command(),
-              prefix + "putFileToPartition::CallerID::0::" + gc_Machine + "PartitionArray::{\"3\"}");
+    EXPECT_EQ(run.createString_Command(), prefix + "putFileToPartition::CallerID::0::" +
+                                              gc_Machine + "PartitionArray::{\"3\"}");
     EXPECT_EQ(&run.get_ReturnCode(), &put.get_ReturnCode());
     EXPECT_EQ(get.get_ReturnCode().get_RetStr1(), "put");
     EXPECT_EQ(get.get_Output(), (std::vector<std::string>{"Rc::0::RetStr1::put", ""}));
@@ -231,10 +253,11 @@ TEST_F(Interface_Run, InterfaceSendsTheMachineItWasGiven) {
     SimulatedConsole const console(gc_AllDone);
     Interface iface{testTarget()};
     iface.execute_PartitionQuorvex("", "/tmp/quorvex.out");
-    EXPECT_EQ(actionArgument(console, 0).rfind(
-                  "ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
-                  "PartitionId::3::",
-                  0),
+    EXPECT_EQ(actionArgument(console, 0)
+                  .rfind("ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::CecMT::1234-ABC::"
+                         "CecMS::10ABCDE::"
+                         "PartitionId::3::",
+                         0),
               0u);
     EXPECT_EQ(receivedClientOptions(console), " -c 1234-ABC_10ABCDE -pylonv 4.0.11");
 }
@@ -249,8 +272,9 @@ TEST_F(Interface_Run, EachOperationStandingAloneSendsTheMachineItWasGiven) {
     get.getFileFromPartition("/tmp/quorvex.out");
     EXPECT_EQ(receivedClientOptions(console), " -c 1234-ABC_10ABCDE -pylonv 4.0.11");
     for (std::size_t call = 0; call < 3; ++call) {
-        EXPECT_NE(actionArgument(console, call).find("::CecMT::1234-ABC::CecMS::10ABCDE::Partition"),
-                  std::string::npos)
+        EXPECT_NE(
+            actionArgument(console, call).find("::CecMT::1234-ABC::CecMS::10ABCDE::Partition"),
+            std::string::npos)
             << call;
     }
 }
@@ -274,5 +298,6 @@ TEST_F(Interface_Run, LoneDoubleQuoteBreaksTheShellLineWithoutACrash) {
     EXPECT_TRUE(console.invocations().empty());
     EXPECT_TRUE(iface.get_Output().empty());
     EXPECT_EQ(iface.get_ReturnCode().get_Rc(), -1);
-    EXPECT_NE(_trace.get_Text().find("::RemoteFN::\"/tmp/a\"b\"::LocalFN::\"p3.out\"::"), std::string::npos);
+    EXPECT_NE(_trace.get_Text().find("::RemoteFN::\"/tmp/a\"b\"::LocalFN::\"p3.out\"::"),
+              std::string::npos);
 }

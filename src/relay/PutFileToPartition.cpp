@@ -12,22 +12,20 @@ PutFileToPartition::PutFileToPartition(TargetPartition const& target) : Base(tar
 
 PutFileToPartition::~PutFileToPartition() = default;
 
-int PutFileToPartition::putFileToPartition(std::string const& fileName)
-{
+int PutFileToPartition::putFileToPartition(std::string const& fileName) {
     set_Action("putFileToPartition");
     get_TargetPartition().use_PartitionArray();
     return execute(createString_PutFileParameters(fileName));
 }
 
-std::string PutFileToPartition::createString_PutFileParameters(std::string const& fileName)
-{
+std::string PutFileToPartition::createString_PutFileParameters(std::string const& fileName) {
     // The file keeps its path: the same name on the console and on the partition.
     FileInfo const local(fileName, "", "", "");
     FileInfo remote(fileName, "", "", "");
     RELAY_Utility::set_Default_Client_FileInfo(remote);
     std::ostringstream parameters;
-    parameters << RELAY_Utility::create_Parameter("LocalFN", local.get_FileName()) << "::"
-               << RELAY_Utility::create_Parameter("RemoteFN", remote.get_FileName()) << "::"
+    parameters << RELAY_Utility::create_Parameter("LocalFN", local.get_FileName())
+               << "::" << RELAY_Utility::create_Parameter("RemoteFN", remote.get_FileName()) << "::"
                << RELAY_Utility::create_Parameter("RemoteFileInfo", remote.get_FileInfoString());
     return parameters.str();
 }

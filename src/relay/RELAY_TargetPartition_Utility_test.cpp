@@ -32,5 +32,6 @@ TEST(RELAY_TargetPartition_Utility, EmptyPartitionGivesEmptyValues) {
     EXPECT_EQ(RELAY_TargetPartition_Utility::_u_get_MachineType_Model(empty), "CecMT::\"\"");
     EXPECT_EQ(RELAY_TargetPartition_Utility::_u_get_Machine_Serial(empty), "CecMS::\"\"");
     EXPECT_EQ(RELAY_TargetPartition_Utility::_u_get_PartitionID(empty), "PartitionId::\"\"");
-    EXPECT_EQ(RELAY_TargetPartition_Utility::_u_get_PartitionArray(empty), "PartitionArray::{\"\"}");
+    EXPECT_EQ(RELAY_TargetPartition_Utility::_u_get_PartitionArray(empty),
+              "PartitionArray::{\"\"}");
 }

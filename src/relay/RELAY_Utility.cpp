@@ -16,8 +16,7 @@ constexpr char gc_FilePermission[] = "660";
 constexpr char gc_PYLON_FileGroup[] = "pylon";
 constexpr char gc_Client_FileGroup[] = "system";
 
-void _u_set_Default_FileInfo(FileInfo& info, std::string const& group)
-{
+void _u_set_Default_FileInfo(FileInfo& info, std::string const& group) {
     info.set_FileOwner(gc_FileOwner);
     info.set_FileGroup(group);
     info.set_FilePermission(gc_FilePermission);
@@ -25,27 +24,24 @@ void _u_set_Default_FileInfo(FileInfo& info, std::string const& group)
 
 } // namespace
 
-std::string RELAY_Utility::create_Parameter(std::string const& name, std::string const& value)
-{
+std::string RELAY_Utility::create_Parameter(std::string const& name, std::string const& value) {
     std::ostringstream parameter;
-    parameter << name << "::" << "\"" << value << "\"";
+    parameter << name << "::"
+              << "\"" << value << "\"";
     return parameter.str();
 }
 
-std::string RELAY_Utility::create_Parameter(std::string const& name, long const& value)
-{
+std::string RELAY_Utility::create_Parameter(std::string const& name, long const& value) {
     std::ostringstream parameter;
     parameter << name << "::" << value;
     return parameter.str();
 }
 
-void RELAY_Utility::set_Default_PYLON_FileInfo(FileInfo& info)
-{
+void RELAY_Utility::set_Default_PYLON_FileInfo(FileInfo& info) {
     _u_set_Default_FileInfo(info, gc_PYLON_FileGroup);
 }
 
-void RELAY_Utility::set_Default_Client_FileInfo(FileInfo& info)
-{
+void RELAY_Utility::set_Default_Client_FileInfo(FileInfo& info) {
     _u_set_Default_FileInfo(info, gc_Client_FileGroup);
 }
 

@@ -15,8 +15,7 @@ namespace RELAY {
 
 ReturnCode::ReturnCode() = default;
 
-ReturnCode::ReturnCode(std::string const& line)
-{
+ReturnCode::ReturnCode(std::string const& line) {
     std::vector<std::string> tokens;
     StringUtility::splitString(line, "::", tokens);
     // The part that starts at "Rc" is added first, so its keys win over the
@@ -26,26 +25,36 @@ ReturnCode::ReturnCode(std::string const& line)
     _convert_Vector_2_Map(tokens.cbegin(), rc);
 }
 
-bool ReturnCode::contains(std::string const& key) const { return _Values.count(key) != 0; }
+bool ReturnCode::contains(std::string const& key) const {
+    return _Values.count(key) != 0;
+}
 
-std::string const& ReturnCode::get_ValueOf(std::string const& key) const
-{
+std::string const& ReturnCode::get_ValueOf(std::string const& key) const {
     auto const found = _Values.find(key);
     return found == _Values.end() ? _Blank : found->second;
 }
 
-int ReturnCode::get_Rc() const { return _get_Number("Rc"); }
+int ReturnCode::get_Rc() const {
+    return _get_Number("Rc");
+}
 
-int ReturnCode::get_RcCmd() const { return _get_Number("RcCmd"); }
+int ReturnCode::get_RcCmd() const {
+    return _get_Number("RcCmd");
+}
 
-std::string const& ReturnCode::get_RetStr1() const { return get_ValueOf("RetStr1"); }
+std::string const& ReturnCode::get_RetStr1() const {
+    return get_ValueOf("RetStr1");
+}
 
-std::string const& ReturnCode::get_RetStr2() const { return get_ValueOf("RetStr2"); }
+std::string const& ReturnCode::get_RetStr2() const {
+    return get_ValueOf("RetStr2");
+}
 
-std::map<std::string, std::string> const& ReturnCode::get_Values() const { return _Values; }
+std::map<std::string, std::string> const& ReturnCode::get_Values() const {
+    return _Values;
+}
 
-void ReturnCode::_convert_Vector_2_Map(Token_Iterator first, Token_Iterator last)
-{
+void ReturnCode::_convert_Vector_2_Map(Token_Iterator first, Token_Iterator last) {
     while (first != last) {
         std::string const& key = *first++;
         std::string const value = first == last ? std::string() : *first++;
@@ -53,8 +62,7 @@ void ReturnCode::_convert_Vector_2_Map(Token_Iterator first, Token_Iterator last
     }
 }
 
-int ReturnCode::_get_Number(std::string const& key) const
-{
+int ReturnCode::_get_Number(std::string const& key) const {
     // Read as an unsigned number and narrowed to 32 bits, so "-1" stays -1,
     // text without digits gives 0 and nothing a tool prints can fail.
     std::string const text = contains(key) ? get_ValueOf(key) : std::string("-1");

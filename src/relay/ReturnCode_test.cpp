@@ -23,9 +23,9 @@ bool const gc_BlankIsBuiltAtStartUp =
     cBlankReturnCode.get_RetStr1().c_str() != nullptr;
 
 // Every line of up to four pieces taken from tokens that break naive parsers.
-std::vector<std::string> hostileLines()
-{
-    std::vector<std::string> const pieces{"Rc", "RcCmd", "::", ":", "", "x", "-1", "abc", "\t", " "};
+std::vector<std::string> hostileLines() {
+    std::vector<std::string> const pieces{"Rc", "RcCmd", "::",  ":",  "",
+                                          "x",  "-1",    "abc", "\t", " "};
     std::vector<std::string> lines{""};
     for (std::size_t length = 0; length < 4; ++length) {
         std::vector<std::string> longer;

@@ -21,16 +21,14 @@ RunCommandOnPartition::RunCommandOnPartition(TargetPartition const& target) : Ba
 RunCommandOnPartition::~RunCommandOnPartition() = default;
 
 int RunCommandOnPartition::runCommandOnPartition(long const& commandID, std::string const& options,
-                                                 FileInfo const& remoteFile)
-{
+                                                 FileInfo const& remoteFile) {
     set_Action("runCmdOnPartition");
     get_TargetPartition().use_PartitionID();
     return execute(createString_RunCommandParameters(commandID, options, remoteFile));
 }
 
 int RunCommandOnPartition::execute_PartitionQuorvex(std::string const& options,
-                                                    std::string const& remoteFileName)
-{
+                                                    std::string const& remoteFileName) {
     FileInfo remoteFile(remoteFileName, "", "", "");
     RELAY_Utility::set_Default_Client_FileInfo(remoteFile);
     std::string completedOptions = options;
@@ -40,18 +38,18 @@ int RunCommandOnPartition::execute_PartitionQuorvex(std::string const& options,
 
 std::string RunCommandOnPartition::createString_RunCommandParameters(long const& commandID,
                                                                      std::string const& options,
-                                                                     FileInfo const& remoteFile)
-{
+                                                                     FileInfo const& remoteFile) {
     std::ostringstream parameters;
-    parameters << RELAY_Utility::create_Parameter("CmdID", commandID) << "::"
-               << RELAY_Utility::create_Parameter("CmdOpts", options) << "::"
-               << RELAY_Utility::create_Parameter("RemoteFN", remoteFile.get_FileName()) << "::"
-               << RELAY_Utility::create_Parameter("RemoteFileInfo", remoteFile.get_FileInfoString());
+    parameters << RELAY_Utility::create_Parameter("CmdID", commandID)
+               << "::" << RELAY_Utility::create_Parameter("CmdOpts", options)
+               << "::" << RELAY_Utility::create_Parameter("RemoteFN", remoteFile.get_FileName())
+               << "::"
+               << RELAY_Utility::create_Parameter("RemoteFileInfo",
+                                                  remoteFile.get_FileInfoString());
     return parameters.str();
 }
 
-void RunCommandOnPartition::_initialize_ClientQuorvexParameters(std::string& options)
-{
+void RunCommandOnPartition::_initialize_ClientQuorvexParameters(std::string& options) {
     // Plain substring checks: options that mention "-c" anywhere, even inside
     // another word, already name the machine.
     if (options.find("-c") == std::string::npos) {

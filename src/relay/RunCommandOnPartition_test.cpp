@@ -10,8 +10,7 @@ using Quorvex::RELAY::RunCommandOnPartition;
 
 namespace {
 
-FileInfo clientFile(std::string const& name)
-{
+FileInfo clientFile(std::string const& name) {
     FileInfo info(name, "", "", "");
     Quorvex::RELAY::RELAY_Utility::set_Default_Client_FileInfo(info);
     return info;
@@ -47,8 +46,7 @@ TEST(RunCommandOnPartition, HasNoVirtualFunctions) {
 namespace {
 
 // The client survey options as completed for partition 3 of 1234-ABC_10ABCDE.
-std::string completedOptions(std::string options)
-{
+std::string completedOptions(std::string options) {
     RunCommandOnPartition run{
         Quorvex::RELAY::TargetPartition(Quorvex::RELAY::u_make_TestPartition())};
     run._initialize_ClientQuorvexParameters(options);

@@ -11,7 +11,8 @@ using Quorvex::System::Partition;
 
 TEST(TargetPartition, AddressesByIdentifierWhenConstructed) {
     TargetPartition const target(u_make_TestPartition());
-    EXPECT_EQ(target.createString_Target(), "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionId::\"3\"");
+    EXPECT_EQ(target.createString_Target(),
+              "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionId::\"3\"");
 }
 
 TEST(TargetPartition, ArrayModeWritesTheIdentifierInBraces) {
@@ -25,7 +26,8 @@ TEST(TargetPartition, IdentifierModeAfterArrayModeSwitchesBack) {
     TargetPartition target(u_make_TestPartition());
     target.use_PartitionArray();
     target.use_PartitionID();
-    EXPECT_EQ(target.createString_Target(), "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionId::\"3\"");
+    EXPECT_EQ(target.createString_Target(),
+              "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionId::\"3\"");
 }
 
 TEST(TargetPartition, DefaultConstructedAddressesAnEmptyPartitionByIdentifier) {

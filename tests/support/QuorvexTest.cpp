@@ -13,41 +13,34 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-namespace QuorvexTest
-{
+namespace QuorvexTest {
 
-namespace
-{
+namespace {
 
 constexpr char gc_ScenarioVariable[] = "PYLON_SIM_SCENARIO";
 constexpr char gc_LogVariable[] = "PYLON_SIM_LOG";
 
-std::string _temporaryBase()
-{
+std::string _temporaryBase() {
     char const* base = std::getenv("TMPDIR");
     return (base != nullptr && *base != '\0') ? base : "/tmp";
 }
 
 // Replaces the child's descriptor fd by the file at path.
-void _redirect(int fd, char const* path, int flags)
-{
+void _redirect(int fd, char const* path, int flags) {
     int const opened = ::open(path, flags, 0600);
-    if (opened < 0 || ::dup2(opened, fd) < 0)
-    {
+    if (opened < 0 || ::dup2(opened, fd) < 0) {
         ::_exit(127);
     }
     ::close(opened);
 }
 
-[[noreturn]] void _execChild(std::vector<std::string> const& argv,
-                             std::string const& outPath, std::string const& errPath)
-{
+[[noreturn]] void _execChild(std::vector<std::string> const& argv, std::string const& outPath,
+                             std::string const& errPath) {
     _redirect(STDIN_FILENO, "/dev/null", O_RDONLY);
     _redirect(STDOUT_FILENO, outPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC);
     _redirect(STDERR_FILENO, errPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC);
     std::vector<char*> args;
-    for (std::string const& arg : argv)
-    {
+    for (std::string const& arg : argv) {
         args.push_back(const_cast<char*>(arg.c_str()));
     }
     args.push_back(nullptr);
@@ -58,31 +51,24 @@ void _redirect(int fd, char const* path, int flags)
     ::_exit(127);
 }
 
-int _waitFor(pid_t child)
-{
+int _waitFor(pid_t child) {
     int status = 0;
-    while (::waitpid(child, &status, 0) < 0)
-    {
-        if (errno != EINTR)
-        {
+    while (::waitpid(child, &status, 0) < 0) {
+        if (errno != EINTR) {
             return -1;
         }
     }
-    if (WIFEXITED(status))
-    {
+    if (WIFEXITED(status)) {
         return WEXITSTATUS(status);
     }
     return WIFSIGNALED(status) ? 128 + WTERMSIG(status) : -1;
 }
 
 // Undoes the log's escapes: "\\" -> "\", "\t" -> TAB, "\n" -> line feed.
-std::string _unescape(std::string const& field)
-{
+std::string _unescape(std::string const& field) {
     std::string text;
-    for (std::size_t i = 0; i < field.size(); ++i)
-    {
-        if (field[i] != '\\' || i + 1 == field.size())
-        {
+    for (std::size_t i = 0; i < field.size(); ++i) {
+        if (field[i] != '\\' || i + 1 == field.size()) {
             text += field[i];
             continue;
         }
@@ -94,17 +80,13 @@ std::string _unescape(std::string const& field)
 
 // The folders of the current scenario and invocation log: a nested sandbox
 // gets a /tmp of its own and would not see them otherwise.
-std::set<std::string> _simulatorFolders()
-{
+std::set<std::string> _simulatorFolders() {
     std::set<std::string> folders;
-    for (char const* variable : {gc_ScenarioVariable, gc_LogVariable})
-    {
+    for (char const* variable : {gc_ScenarioVariable, gc_LogVariable}) {
         char const* path = std::getenv(variable);
-        if (path != nullptr && *path != '\0')
-        {
+        if (path != nullptr && *path != '\0') {
             std::string const folder = std::filesystem::path(path).parent_path().string();
-            if (!folder.empty() && fileExists(folder))
-            {
+            if (!folder.empty() && fileExists(folder)) {
                 folders.insert(folder);
             }
         }
@@ -112,82 +94,67 @@ std::set<std::string> _simulatorFolders()
     return folders;
 }
 
-Invocation _parseLogLine(std::string const& line)
-{
+Invocation _parseLogLine(std::string const& line) {
     Invocation invocation;
     std::size_t start = 0;
-    while (true)
-    {
+    while (true) {
         std::size_t const tab = line.find('\t', start);
         invocation.push_back(_unescape(line.substr(start, tab - start)));
-        if (tab == std::string::npos)
-        {
+        if (tab == std::string::npos) {
             return invocation;
         }
         start = tab + 1;
     }
 }
 
-}  // namespace
+} // namespace
 
-std::string sourceRoot()
-{
+std::string sourceRoot() {
     return QUORVEX_SOURCE_ROOT;
 }
 
-std::string sandboxPath()
-{
+std::string sandboxPath() {
     return sourceRoot() + "/tools/sandbox";
 }
 
-std::string simulatorPath()
-{
+std::string simulatorPath() {
     return QUORVEX_SIMULATOR;
 }
 
-std::string shippedScenario(std::string const& fileName)
-{
+std::string shippedScenario(std::string const& fileName) {
     return sourceRoot() + "/sim/scenarios/" + fileName;
 }
 
-bool isInsideSandbox()
-{
+bool isInsideSandbox() {
     char const* flag = std::getenv("QUORVEX_IN_SANDBOX");
     return flag != nullptr && std::string(flag) == "1";
 }
 
-TemporaryDirectory::TemporaryDirectory()
-{
+TemporaryDirectory::TemporaryDirectory() {
     std::string pattern = _temporaryBase() + "/quorvex-test.XXXXXX";
-    if (::mkdtemp(pattern.data()) == nullptr)
-    {
+    if (::mkdtemp(pattern.data()) == nullptr) {
         throw std::runtime_error("cannot create a temporary folder from " + pattern + ": " +
                                  std::strerror(errno));
     }
     _path = pattern;
 }
 
-TemporaryDirectory::~TemporaryDirectory()
-{
+TemporaryDirectory::~TemporaryDirectory() {
     std::error_code ignored;
     std::filesystem::remove_all(_path, ignored);
 }
 
-std::string const& TemporaryDirectory::path() const
-{
+std::string const& TemporaryDirectory::path() const {
     return _path;
 }
 
-std::string TemporaryDirectory::file(std::string const& name) const
-{
+std::string TemporaryDirectory::file(std::string const& name) const {
     return _path + "/" + name;
 }
 
-std::string readFile(std::string const& path)
-{
+std::string readFile(std::string const& path) {
     std::ifstream in(path, std::ios::binary);
-    if (!in)
-    {
+    if (!in) {
         throw std::runtime_error("cannot read " + path);
     }
     std::ostringstream content;
@@ -195,39 +162,32 @@ std::string readFile(std::string const& path)
     return content.str();
 }
 
-void writeFile(std::string const& path, std::string const& text)
-{
+void writeFile(std::string const& path, std::string const& text) {
     std::ofstream out(path, std::ios::binary | std::ios::trunc);
     out << text;
     out.close();
-    if (!out)
-    {
+    if (!out) {
         throw std::runtime_error("cannot write " + path);
     }
 }
 
-bool fileExists(std::string const& path)
-{
+bool fileExists(std::string const& path) {
     struct stat info;
     return ::lstat(path.c_str(), &info) == 0;
 }
 
-CommandResult runCommand(std::vector<std::string> const& argv)
-{
-    if (argv.empty())
-    {
+CommandResult runCommand(std::vector<std::string> const& argv) {
+    if (argv.empty()) {
         throw std::invalid_argument("runCommand needs a program");
     }
     TemporaryDirectory captured;
     std::string const outPath = captured.file("stdout");
     std::string const errPath = captured.file("stderr");
     pid_t const child = ::fork();
-    if (child < 0)
-    {
+    if (child < 0) {
         throw std::runtime_error(std::string("fork failed: ") + std::strerror(errno));
     }
-    if (child == 0)
-    {
+    if (child == 0) {
         _execChild(argv, outPath, errPath);
     }
     CommandResult result;
@@ -237,17 +197,14 @@ CommandResult runCommand(std::vector<std::string> const& argv)
     return result;
 }
 
-CommandResult runShell(std::string const& commandLine)
-{
+CommandResult runShell(std::string const& commandLine) {
     return runCommand({"/bin/sh", "-c", commandLine});
 }
 
 CommandResult runInSandbox(std::vector<std::string> const& sandboxOptions,
-                           std::vector<std::string> const& command)
-{
+                           std::vector<std::string> const& command) {
     std::vector<std::string> argv{sandboxPath(), "--sim", simulatorPath()};
-    for (std::string const& folder : _simulatorFolders())
-    {
+    for (std::string const& folder : _simulatorFolders()) {
         argv.push_back("--bind");
         argv.push_back(folder + ":" + folder);
     }
@@ -258,67 +215,54 @@ CommandResult runInSandbox(std::vector<std::string> const& sandboxOptions,
 }
 
 SimulatedConsole::SimulatedConsole(std::string const& scenarioText)
-    : _scenarioPath(_directory.file("scenario.scn"))
-    , _logPath(_directory.file("invocations.log"))
-{
+    : _scenarioPath(_directory.file("scenario.scn")), _logPath(_directory.file("invocations.log")) {
     writeFile(_scenarioPath, scenarioText);
     _activate();
 }
 
 SimulatedConsole::SimulatedConsole(ScenarioFile const& scenario)
-    : _scenarioPath(scenario.path)
-    , _logPath(_directory.file("invocations.log"))
-{
+    : _scenarioPath(scenario.path), _logPath(_directory.file("invocations.log")) {
     _activate();
 }
 
-void SimulatedConsole::_activate() const
-{
+void SimulatedConsole::_activate() const {
     ::setenv(gc_ScenarioVariable, _scenarioPath.c_str(), 1);
     ::setenv(gc_LogVariable, _logPath.c_str(), 1);
 }
 
-SimulatedConsole::~SimulatedConsole()
-{
+SimulatedConsole::~SimulatedConsole() {
     ::unsetenv(gc_ScenarioVariable);
     ::unsetenv(gc_LogVariable);
 }
 
-std::string const& SimulatedConsole::directory() const
-{
+std::string const& SimulatedConsole::directory() const {
     return _directory.path();
 }
 
-std::string const& SimulatedConsole::scenarioPath() const
-{
+std::string const& SimulatedConsole::scenarioPath() const {
     return _scenarioPath;
 }
 
-std::string const& SimulatedConsole::logPath() const
-{
+std::string const& SimulatedConsole::logPath() const {
     return _logPath;
 }
 
-std::string SimulatedConsole::logText() const
-{
+std::string SimulatedConsole::logText() const {
     return fileExists(_logPath) ? readFile(_logPath) : std::string();
 }
 
-std::vector<Invocation> SimulatedConsole::invocations() const
-{
+std::vector<Invocation> SimulatedConsole::invocations() const {
     return parseInvocationLog(logText());
 }
 
-std::vector<Invocation> parseInvocationLog(std::string const& text)
-{
+std::vector<Invocation> parseInvocationLog(std::string const& text) {
     std::vector<Invocation> invocations;
     std::istringstream lines(text);
     std::string line;
-    while (std::getline(lines, line))
-    {
+    while (std::getline(lines, line)) {
         invocations.push_back(_parseLogLine(line));
     }
     return invocations;
 }
 
-}  // namespace QuorvexTest
+} // namespace QuorvexTest

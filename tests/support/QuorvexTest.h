@@ -10,8 +10,7 @@
 #include <string>
 #include <vector>
 
-namespace QuorvexTest
-{
+namespace QuorvexTest {
 
 // Absolute paths of the source tree, the sandbox runner, the simulator binary
 // and a scenario shipped in sim/scenarios/.
@@ -25,8 +24,7 @@ bool isInsideSandbox();
 
 // A fresh folder under $TMPDIR (or /tmp), removed with all its content when
 // the object goes away.
-class TemporaryDirectory
-{
+class TemporaryDirectory {
 public:
     TemporaryDirectory();
     ~TemporaryDirectory();
@@ -48,11 +46,10 @@ std::string readFile(std::string const& path);
 void writeFile(std::string const& path, std::string const& text);
 bool fileExists(std::string const& path);
 
-struct CommandResult
-{
-    int exitStatus = -1;     // exit code, or 128 + signal number
-    std::string stdoutText;  // exact bytes
-    std::string stderrText;  // exact bytes
+struct CommandResult {
+    int exitStatus = -1;    // exit code, or 128 + signal number
+    std::string stdoutText; // exact bytes
+    std::string stderrText; // exact bytes
 };
 
 // Runs argv[0] (searched in PATH when it has no "/") with the given
@@ -69,8 +66,7 @@ CommandResult runInSandbox(std::vector<std::string> const& sandboxOptions,
                            std::vector<std::string> const& command);
 
 // Names an existing scenario file, such as shippedScenario("demo.scn").
-struct ScenarioFile
-{
+struct ScenarioFile {
     std::string path;
 };
 
@@ -83,8 +79,7 @@ using Invocation = std::vector<std::string>;
 // this process (children inherit them). The scenario format is described in
 // sim/README.md; "document-file" paths are relative to the scenario file,
 // which for a scenario text lies in directory().
-class SimulatedConsole
-{
+class SimulatedConsole {
 public:
     // Writes the scenario text into a temporary file.
     explicit SimulatedConsole(std::string const& scenarioText);
@@ -114,4 +109,4 @@ private:
 // Decodes an invocation log text (see sim/README.md).
 std::vector<Invocation> parseInvocationLog(std::string const& text);
 
-}  // namespace QuorvexTest
+} // namespace QuorvexTest

@@ -15,23 +15,18 @@
 #include <unistd.h>
 #include <vector>
 
-namespace
-{
+namespace {
 
-bool _asksOnlyForTestList(int argc, char** argv)
-{
-    for (int i = 1; i < argc; ++i)
-    {
-        if (std::string(argv[i]).rfind("--gtest_list_tests", 0) == 0)
-        {
+bool _asksOnlyForTestList(int argc, char** argv) {
+    for (int i = 1; i < argc; ++i) {
+        if (std::string(argv[i]).rfind("--gtest_list_tests", 0) == 0) {
             return true;
         }
     }
     return false;
 }
 
-std::string _ownExecutable(char const* argv0)
-{
+std::string _ownExecutable(char const* argv0) {
     std::vector<char> buffer(4096);
     ssize_t const length = ::readlink("/proc/self/exe", buffer.data(), buffer.size() - 1);
     return length > 0 ? std::string(buffer.data(), static_cast<std::size_t>(length)) : argv0;
@@ -39,17 +34,14 @@ std::string _ownExecutable(char const* argv0)
 
 // Replaces this process by tools/sandbox running this executable; the
 // sandbox's exit status (77 when no namespace can be made) becomes ours.
-int _runInSandbox(int argc, char** argv)
-{
-    std::vector<std::string> args{QuorvexTest::sandboxPath(), "--sim",
-                                  QuorvexTest::simulatorPath(), "--", _ownExecutable(argv[0])};
-    for (int i = 1; i < argc; ++i)
-    {
+int _runInSandbox(int argc, char** argv) {
+    std::vector<std::string> args{QuorvexTest::sandboxPath(), "--sim", QuorvexTest::simulatorPath(),
+                                  "--", _ownExecutable(argv[0])};
+    for (int i = 1; i < argc; ++i) {
         args.emplace_back(argv[i]);
     }
     std::vector<char*> execArgs;
-    for (std::string& arg : args)
-    {
+    for (std::string& arg : args) {
         execArgs.push_back(arg.data());
     }
     execArgs.push_back(nullptr);
@@ -59,12 +51,10 @@ int _runInSandbox(int argc, char** argv)
     return 1;
 }
 
-}  // namespace
+} // namespace
 
-int main(int argc, char** argv)
-{
-    if (!QuorvexTest::isInsideSandbox() && !_asksOnlyForTestList(argc, argv))
-    {
+int main(int argc, char** argv) {
+    if (!QuorvexTest::isInsideSandbox() && !_asksOnlyForTestList(argc, argv)) {
         return _runInSandbox(argc, argv);
     }
     ::testing::InitGoogleTest(&argc, argv);
