@@ -1,0 +1,38 @@
+# The Debian package of the survey tool: `cpack -G DEB` in a build tree.
+# It carries what the install rules give a console: the executable, its
+# manual page, and the folders /var/adm/quorvex/VPD and /var/adm/quorvex/Trace
+# that the tool writes into but never creates.
+
+set(CPACK_PACKAGE_NAME "quorvex-pylon-vpd-survey")
+set(CPACK_PACKAGE_VERSION "${PROJECT_VERSION}")
+set(CPACK_PACKAGE_VENDOR "Quorvex")
+set(CPACK_PACKAGE_CONTACT "Quorvex PYLON survey maintainers <pylon-survey@quorvex.invalid>")
+set(CPACK_PACKAGE_DESCRIPTION_SUMMARY
+  "VPD survey of the client partitions of a PYLON managed machine")
+set(CPACK_PACKAGE_DESCRIPTION
+  "quorvexPYLON_VPD_Survey_ClientPartition runs on a PYLON hardware management
+console. One run surveys one managed machine: it lists the machine's client
+partitions, runs the inventory client on every active partition through the
+console's remote action command, fetches each partition's vital product data
+document as XML into /var/adm/quorvex/VPD, writes a default document with the
+reason for every partition that could not be surveyed, and leaves a status
+file and a trace log.")
+
+set(CPACK_PACKAGING_INSTALL_PREFIX "/usr")
+set(CPACK_STRIP_FILES ON)
+
+set(CPACK_DEBIAN_PACKAGE_MAINTAINER "${CPACK_PACKAGE_CONTACT}")
+set(CPACK_DEBIAN_PACKAGE_SECTION "admin")
+set(CPACK_DEBIAN_PACKAGE_PRIORITY "optional")
+set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
+# The run-time libraries are read from the executable where dpkg-shlibdeps is
+# there to do it; otherwise the C and C++ runtimes the tool links are named.
+find_program(QUORVEX_DPKG_SHLIBDEPS dpkg-shlibdeps)
+if(QUORVEX_DPKG_SHLIBDEPS)
+  set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
+else()
+  set(CPACK_DEBIAN_PACKAGE_DEPENDS "libc6, libstdc++6, libgcc-s1")
+endif()
+
+set(CPACK_GENERATOR "DEB")
+include(CPack)

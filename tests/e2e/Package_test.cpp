@@ -1,0 +1,163 @@
+// Builds the Debian package with cpack in the build tree, checks its control
+// fields and file list, unpacks it with dpkg -x into a scratch root inside the
+// build tree (nothing is installed on the host) and surveys the shipped demo
+// machine with the unpacked tool inside the sandbox.
+//
+// One test does it all: cpack first brings the whole build tree up to date,
+// and two of them at once in one tree could build the same target twice.
+
+#include "EndToEndScenario.h"
+
+#include "survey/SurveyTest_Utility.h"
+
+#include "QuorvexTest.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <map>
+#include <sstream>
+#include <string>
+#include <vector>
+
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr char gc_Tool[] = "quorvexPYLON_VPD_Survey_ClientPartition";
+constexpr char gc_PackageName[] = "quorvex-pylon-vpd-survey";
+constexpr int gc_SandboxUnavailable = 77;
+
+std::string u_trim_LineEnd(std::string text) {
+    while (!text.empty() && text.back() == '\n') {
+        text.pop_back();
+    }
+    return text;
+}
+
+std::string u_architecture() {
+    return u_trim_LineEnd(QuorvexTest::runCommand({"dpkg", "--print-architecture"}).stdoutText);
+}
+
+std::string u_package_FileName() {
+    return std::string(gc_PackageName) + "_" + QUORVEX_PACKAGE_VERSION + "_" + u_architecture() +
+           ".deb";
+}
+
+// The entries of the package, path to mode, from "dpkg-deb --contents":
+// the mode is the first field of a line and the path the last.
+std::map<std::string, std::string> u_package_Contents(std::string const& package) {
+    QuorvexTest::CommandResult const listing =
+        QuorvexTest::runCommand({"dpkg-deb", "--contents", package});
+    EXPECT_EQ(listing.exitStatus, 0) << listing.stderrText;
+    std::map<std::string, std::string> entries;
+    std::istringstream lines(listing.stdoutText);
+    std::string line;
+    while (std::getline(lines, line)) {
+        std::istringstream fields(line);
+        std::string mode;
+        std::string path;
+        fields >> mode;
+        for (std::string field; fields >> field;) {
+            path = field;
+        }
+        entries[path] = mode;
+    }
+    return entries;
+}
+
+std::vector<std::string> u_paths(std::map<std::string, std::string> const& entries) {
+    std::vector<std::string> paths;
+    for (auto const& entry : entries) {
+        paths.push_back(entry.first);
+    }
+    return paths;
+}
+
+// The tool is executable by all, the manual page readable by all, and the
+// result folders open to all; the modes of the folders above them follow the
+// umask of whoever builds the package, and dpkg leaves existing ones alone.
+void u_expect_Contents(std::string const& package) {
+    std::string const tool = std::string("./usr/bin/") + gc_Tool;
+    std::string const manualPage = std::string("./usr/share/man/man8/") + gc_Tool + ".8";
+    std::map<std::string, std::string> const entries = u_package_Contents(package);
+    std::vector<std::string> const expected{
+        "./usr/",
+        "./usr/bin/",
+        tool,
+        "./usr/share/",
+        "./usr/share/man/",
+        "./usr/share/man/man8/",
+        manualPage,
+        "./var/",
+        "./var/adm/",
+        "./var/adm/quorvex/",
+        "./var/adm/quorvex/Trace/",
+        "./var/adm/quorvex/VPD/",
+    };
+    ASSERT_EQ(u_paths(entries), expected);
+    EXPECT_EQ(entries.at(tool), "-rwxr-xr-x");
+    EXPECT_EQ(entries.at(manualPage), "-rw-r--r--");
+    EXPECT_EQ(entries.at("./var/adm/quorvex/Trace/"), "drwxr-xr-x");
+    EXPECT_EQ(entries.at("./var/adm/quorvex/VPD/"), "drwxr-xr-x");
+}
+
+std::string u_control_Field(std::string const& package, std::string const& field) {
+    return u_trim_LineEnd(
+        QuorvexTest::runCommand({"dpkg-deb", "--field", package, field}).stdoutText);
+}
+
+void u_expect_Control(std::string const& package) {
+    EXPECT_EQ(u_control_Field(package, "Package"), gc_PackageName);
+    EXPECT_EQ(u_control_Field(package, "Version"), QUORVEX_PACKAGE_VERSION);
+    EXPECT_EQ(u_control_Field(package, "Section"), "admin");
+    EXPECT_EQ(u_control_Field(package, "Architecture"), u_architecture());
+    EXPECT_NE(u_control_Field(package, "Maintainer"), "");
+    EXPECT_NE(u_control_Field(package, "Description"), "");
+    std::string const depends = u_control_Field(package, "Depends");
+    EXPECT_NE(depends.find("libc6"), std::string::npos) << depends;
+    EXPECT_NE(depends.find("libstdc++6"), std::string::npos) << depends;
+}
+
+void u_expect_Unpacked(std::string const& root) {
+    fs::file_status const tool = fs::status(root + "/usr/bin/" + gc_Tool);
+    EXPECT_TRUE(fs::is_regular_file(tool));
+    EXPECT_NE(tool.permissions() & fs::perms::owner_exec, fs::perms::none);
+    std::string const manualPage = root + "/usr/share/man/man8/" + gc_Tool + ".8";
+    ASSERT_TRUE(QuorvexTest::fileExists(manualPage));
+    EXPECT_EQ(QuorvexTest::readFile(manualPage), QuorvexTest::readFile(QUORVEX_MANUAL_PAGE));
+    for (char const* folder : {"/var/adm/quorvex/VPD", "/var/adm/quorvex/Trace"}) {
+        EXPECT_TRUE(fs::is_directory(root + folder)) << folder;
+        EXPECT_EQ(SurveyTest_Utility::u_list_Folder(root + folder), std::vector<std::string>{})
+            << folder;
+    }
+}
+
+TEST(SurveyPackage, DebianPackageInstallsToolManualPageAndFoldersAndItsToolSurveysTheDemo) {
+    std::string const scratch = QUORVEX_PACKAGE_SCRATCH;
+    std::error_code ignored;
+    fs::remove_all(scratch, ignored);
+    QuorvexTest::CommandResult const build = QuorvexTest::runCommand(
+        {QUORVEX_CPACK_COMMAND, "-G", "DEB", "--config", QUORVEX_CPACK_CONFIG, "-B", scratch});
+    ASSERT_EQ(build.exitStatus, 0) << build.stdoutText << build.stderrText;
+    std::string const package = scratch + "/" + u_package_FileName();
+    ASSERT_TRUE(QuorvexTest::fileExists(package)) << build.stdoutText;
+
+    u_expect_Control(package);
+    u_expect_Contents(package);
+
+    std::string const root = scratch + "/root";
+    QuorvexTest::CommandResult const unpack =
+        QuorvexTest::runCommand({"dpkg", "-x", package, root});
+    ASSERT_EQ(unpack.exitStatus, 0) << unpack.stderrText;
+    u_expect_Unpacked(root);
+
+    EndToEndScenario demo("shipped-demo");
+    QuorvexTest::CommandResult const run = demo.run({root + "/usr/bin/" + gc_Tool});
+    if (run.exitStatus == gc_SandboxUnavailable) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    demo.expectExpectedOutcome(run);
+}
+
+} // namespace
