@@ -4,10 +4,12 @@
 #include "RemoteActionRequest.h"
 #include "Scenario.h"
 
+#include <algorithm>
 #include <chrono>
 #include <cstdlib>
 #include <fstream>
 #include <iostream>
+#include <iterator>
 #include <thread>
 
 namespace PylonSim {
@@ -28,12 +30,8 @@ std::string _environment(char const* name) {
 }
 
 bool _isAction(std::string const& action) {
-    for (char const* known : gc_Actions) {
-        if (action == known) {
-            return true;
-        }
-    }
-    return false;
+    return std::any_of(std::begin(gc_Actions), std::end(gc_Actions),
+                       [&action](char const* known) { return action == known; });
 }
 
 // Without PYLON_SIM_SCENARIO every tool answers nothing and exits 0.

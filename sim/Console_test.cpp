@@ -48,7 +48,7 @@ std::string _getFileLine(std::string const& partition, std::string const& localF
            "\"10ABCDE\"::"
            "PartitionId::\"" +
            partition + "\"::RemoteFN::\"1234-ABC_10ABCDE-" + partition + ".VPD.xml\"::LocalFN::\"" +
-           localFN + "\"::LocalFileInfo::\"FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon\"";
+           localFN + R"("::LocalFileInfo::"FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon")";
 }
 
 std::string _remoteAction(std::string const& action, std::string const& partition) {

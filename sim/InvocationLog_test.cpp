@@ -25,7 +25,7 @@ TEST(InvocationLog, BackslashTabAndLineFeedAreEscaped) {
 }
 
 TEST(InvocationLog, OtherBytesAreWrittenAsTheyAre) {
-    std::string const odd = std::string("\"quoted\" ;{x}\r\x01\xff", 17);
+    std::string const odd = "\"quoted\" ;{x}\r\x01\xff";
     EXPECT_EQ("lsvtc\t" + odd + "\n", InvocationLog::formatLine("lsvtc", {odd}));
 }
 

@@ -1,10 +1,12 @@
 #include "ScenarioParser.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cmath>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <iterator>
 #include <sstream>
 
 namespace PylonSim {
@@ -24,12 +26,8 @@ std::string _readAll(std::ifstream& in) {
 }
 
 bool _isKnownTool(std::string const& tool) {
-    for (char const* known : gc_Tools) {
-        if (tool == known) {
-            return true;
-        }
-    }
-    return false;
+    return std::any_of(std::begin(gc_Tools), std::end(gc_Tools),
+                       [&tool](char const* known) { return tool == known; });
 }
 
 bool _isBlankOrComment(std::string const& line) {

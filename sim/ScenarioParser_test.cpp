@@ -30,7 +30,7 @@ protected:
             return error;
         }
         ADD_FAILURE() << "scenario accepted: " << fileName;
-        return ScenarioError();
+        return {};
     }
 
     std::string path() const { return folder.file("test.scn"); }

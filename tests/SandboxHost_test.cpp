@@ -5,6 +5,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <iterator>
 #include <string>
 #include <unistd.h>
 #include <vector>
@@ -46,12 +48,10 @@ TEST(SandboxHost, OutputOfTheCommandPassesThrough) {
 }
 
 TEST(SandboxHost, NothingAppearsOnTheHost) {
+    std::vector<std::string> const paths = _consolePaths();
     std::vector<std::string> absentBefore;
-    for (std::string const& path : _consolePaths()) {
-        if (!fileExists(path)) {
-            absentBefore.push_back(path);
-        }
-    }
+    std::copy_if(paths.begin(), paths.end(), std::back_inserter(absentBefore),
+                 [](std::string const& path) { return !fileExists(path); });
     if (absentBefore.empty()) {
         GTEST_SKIP() << "the host already has every console path";
     }
@@ -72,7 +72,7 @@ TEST(SandboxHost, TmpInsideIsNotTheHostTmp) {
     QuorvexTest::TemporaryDirectory hostFolder;
     std::string const insideName = hostFolder.path() + "-made-inside";
     CommandResult const run =
-        runInSandbox({}, {"sh", "-c", "test ! -e \"$0\" && mkdir \"$1\" && touch \"$1/file\"",
+        runInSandbox({}, {"sh", "-c", R"(test ! -e "$0" && mkdir "$1" && touch "$1/file")",
                           hostFolder.path(), insideName});
     if (run.exitStatus == gc_ExitSkip) {
         GTEST_SKIP() << run.stderrText;

@@ -3,9 +3,7 @@
 #include <iostream>
 #include <string>
 
-namespace Quorvex {
-namespace PYLON {
-namespace DEBUG {
+namespace Quorvex::PYLON::DEBUG {
 
 void print_Partition(::Quorvex::System::Partition const& partition) {
     std::cout << "----------------------------------------\n";
@@ -25,6 +23,4 @@ void print_ListOf_Partitions(::Quorvex::PYLON::ListOf_Partitions const& partitio
     }
 }
 
-} // namespace DEBUG
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON::DEBUG

@@ -8,8 +8,7 @@
 #include <cstdint>
 #include <sstream>
 
-namespace Quorvex {
-namespace PYLON {
+namespace Quorvex::PYLON {
 
 namespace {
 
@@ -54,5 +53,4 @@ void ListOf_Machines::_insert_Machine(std::string const& entry) {
                                         ::Quorvex::System::MTMS(typeModel, serial)));
 }
 
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON

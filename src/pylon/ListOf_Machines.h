@@ -5,8 +5,7 @@
 #include <string>
 #include <vector>
 
-namespace Quorvex {
-namespace PYLON {
+namespace Quorvex::PYLON {
 
 // The console's managed machines in the order its listing tool prints them.
 // Filled once by the constructor, which runs the listing tool.
@@ -19,5 +18,4 @@ private:
     void _insert_Machine(std::string const& entry);
 };
 
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON

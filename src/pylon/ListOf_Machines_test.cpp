@@ -189,6 +189,7 @@ TEST(ListOf_Machines, HugeLineWithoutSeparatorsIsSkipped) {
 TEST(ListOf_Machines, CopyKeepsTheMachines) {
     SimulatedConsole const console("[lsvtc]\nstdout 0:A-1_S;2:B-2_T\n");
     ListOf_Machines const original;
+    // NOLINTNEXTLINE(performance-unnecessary-copy-initialization): the copy is under test
     ListOf_Machines const copy(original);
     EXPECT_EQ(u_describe(copy), (Strings{"0|A-1|S", "2|B-2|T"}));
     EXPECT_EQ(console.invocations().size(), 1U);

@@ -5,8 +5,7 @@
 
 #include <cstddef>
 
-namespace Quorvex {
-namespace PYLON {
+namespace Quorvex::PYLON {
 
 namespace {
 
@@ -58,5 +57,4 @@ void ListOf_Partitions::_insert_Partition(::Quorvex::System::MTMS const& mtms,
     push_back(partition);
 }
 
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON

@@ -7,8 +7,7 @@
 #include <string>
 #include <vector>
 
-namespace Quorvex {
-namespace PYLON {
+namespace Quorvex::PYLON {
 
 // Partition records as the console's partition listing tool prints them.
 class ListOf_Partitions : public std::vector<::Quorvex::System::Partition> {
@@ -23,5 +22,4 @@ private:
     void _insert_Partition(::Quorvex::System::MTMS const& mtms, std::string const& record);
 };
 
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON

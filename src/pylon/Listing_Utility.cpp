@@ -3,9 +3,7 @@
 #include "utility/ShellCommand.h"
 #include "utility/StringUtility.h"
 
-namespace Quorvex {
-namespace PYLON {
-namespace Listing_Utility {
+namespace Quorvex::PYLON::Listing_Utility {
 
 namespace {
 
@@ -26,6 +24,4 @@ std::vector<std::string> u_run_Listing(std::string const& tool, std::string cons
     return entries;
 }
 
-} // namespace Listing_Utility
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON::Listing_Utility

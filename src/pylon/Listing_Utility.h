@@ -3,9 +3,7 @@
 #include <string>
 #include <vector>
 
-namespace Quorvex {
-namespace PYLON {
-namespace Listing_Utility {
+namespace Quorvex::PYLON::Listing_Utility {
 
 // Runs a console listing tool (tool + arguments, appended without a blank) and
 // returns the ";"-separated entries of the first line it prints. The console's
@@ -13,6 +11,4 @@ namespace Listing_Utility {
 // are ignored. No output at all gives no entries.
 std::vector<std::string> u_run_Listing(std::string const& tool, std::string const& arguments);
 
-} // namespace Listing_Utility
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON::Listing_Utility

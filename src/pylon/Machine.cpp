@@ -2,8 +2,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace PYLON {
+namespace Quorvex::PYLON {
 
 Machine::Machine() : _ObjectType(0) {}
 
@@ -25,5 +24,4 @@ bool operator<(Machine const& a, Machine const& b) {
     return std::string(a.get_MTMS()) < std::string(b.get_MTMS());
 }
 
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON

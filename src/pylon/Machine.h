@@ -2,8 +2,7 @@
 
 #include "system/MTMS.h"
 
-namespace Quorvex {
-namespace PYLON {
+namespace Quorvex::PYLON {
 
 // One managed object of the console: its object type and machine identity.
 class Machine {
@@ -25,5 +24,4 @@ private:
 // Smaller object type first, then by machine identity text.
 bool operator<(Machine const& a, Machine const& b);
 
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON

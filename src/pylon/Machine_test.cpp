@@ -44,10 +44,9 @@ TEST(Machine, SortingByTypeThenIdentity) {
     std::vector<Machine> machines{Machine(1U, MTMS("B", "1")), Machine(0U, MTMS("Z", "9")),
                                   Machine(0U, MTMS("A", "2"))};
     std::sort(machines.begin(), machines.end());
-    std::vector<std::string> order;
-    for (auto const& machine : machines) {
-        order.push_back(std::to_string(machine.get_ObjectType()) + ":" +
-                        std::string(machine.get_MTMS()));
-    }
+    std::vector<std::string> order(machines.size());
+    std::transform(machines.begin(), machines.end(), order.begin(), [](Machine const& machine) {
+        return std::to_string(machine.get_ObjectType()) + ":" + std::string(machine.get_MTMS());
+    });
     EXPECT_EQ(order, (std::vector<std::string>{"0:A_2", "0:Z_9", "1:B_1"}));
 }

@@ -6,6 +6,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdlib>
 #include <regex>
 #include <sched.h>
@@ -38,23 +39,26 @@ bool _u_makeTmpReadOnly() {
 } // namespace
 
 std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Machines const& machines) {
-    std::vector<std::string> described;
-    for (auto const& machine : machines) {
-        described.push_back(std::to_string(machine.get_ObjectType()) + "|" +
-                            machine.get_MTMS().get_MachineType_Model() + "|" +
-                            machine.get_MTMS().get_Serial());
-    }
+    std::vector<std::string> described(machines.size());
+    std::transform(machines.begin(), machines.end(), described.begin(),
+                   [](::Quorvex::PYLON::Machine const& machine) {
+                       return std::to_string(machine.get_ObjectType()) + "|" +
+                              machine.get_MTMS().get_MachineType_Model() + "|" +
+                              machine.get_MTMS().get_Serial();
+                   });
     return described;
 }
 
 std::vector<std::string> u_describe(::Quorvex::PYLON::ListOf_Partitions const& partitions) {
-    std::vector<std::string> described;
-    for (auto const& partition : partitions) {
-        described.push_back(std::string(partition.get_MTMS()) + "|" + partition.get_PartitionID() +
-                            "|" + partition.get_IP() + "|" + partition.get_ActiveStatus() + "|" +
-                            partition.get_HostName() + "|" + partition.get_OperatingSystem_Name() +
-                            "|" + partition.get_OperatingSystem_Version());
-    }
+    std::vector<std::string> described(partitions.size());
+    std::transform(partitions.begin(), partitions.end(), described.begin(),
+                   [](::Quorvex::System::Partition const& partition) {
+                       return std::string(partition.get_MTMS()) + "|" +
+                              partition.get_PartitionID() + "|" + partition.get_IP() + "|" +
+                              partition.get_ActiveStatus() + "|" + partition.get_HostName() + "|" +
+                              partition.get_OperatingSystem_Name() + "|" +
+                              partition.get_OperatingSystem_Version();
+                   });
     return described;
 }
 

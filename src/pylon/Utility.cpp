@@ -4,9 +4,7 @@
 
 #include <algorithm>
 
-namespace Quorvex {
-namespace PYLON {
-namespace Utility {
+namespace Quorvex::PYLON::Utility {
 
 int get_AllManagedPartitions(::Quorvex::PYLON::ListOf_Partitions& partitions) {
     ::Quorvex::PYLON::ListOf_Machines machines;
@@ -22,6 +20,4 @@ int get_AllManagedPartitions(::Quorvex::PYLON::ListOf_Partitions& partitions) {
     return static_cast<int>(partitions.size());
 }
 
-} // namespace Utility
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON::Utility

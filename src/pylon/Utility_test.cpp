@@ -8,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <string>
 #include <vector>
 
@@ -143,9 +144,8 @@ TEST(PYLON_Utility, RecordsWithEqualKeysKeepThePrintedOrder) {
         "[lspartition *]\nstdout 2,ip-a,1,h;1,ip-b,1,h;2,ip-c,1,h;1,ip-d,1,h;2,ip-e,1,h\n");
     ListOf_Partitions partitions;
     EXPECT_EQ(get_AllManagedPartitions(partitions), 5);
-    Strings addresses;
-    for (auto const& partition : partitions) {
-        addresses.push_back(partition.get_IP());
-    }
+    Strings addresses(partitions.size());
+    std::transform(partitions.begin(), partitions.end(), addresses.begin(),
+                   [](Partition const& partition) { return partition.get_IP(); });
     EXPECT_EQ(addresses, (Strings{"ip-b", "ip-d", "ip-a", "ip-c", "ip-e"}));
 }

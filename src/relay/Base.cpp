@@ -5,8 +5,7 @@
 
 #include <sstream>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 namespace {
 
@@ -72,5 +71,4 @@ std::vector<std::string> const& Base::get_Output() const {
     return _Output;
 }
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

@@ -7,8 +7,7 @@
 #include <string>
 #include <vector>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // One run of the console's remote action tool against a target partition:
 // builds the command line, runs it and keeps its output and return codes.
@@ -17,6 +16,8 @@ namespace RELAY {
 class Base {
 public:
     Base();
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared: a target stands wherever a
+    // remote action is expected
     Base(TargetPartition const& target);
 
     void set_Action(std::string const& action);
@@ -43,5 +44,4 @@ private:
     std::vector<ReturnCode> _ReturnCodes;
 };
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

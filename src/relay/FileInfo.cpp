@@ -2,8 +2,7 @@
 
 #include <sstream>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 FileInfo::FileInfo() = default;
 
@@ -49,5 +48,4 @@ std::string FileInfo::get_FileInfoString() const {
     return text.str();
 }
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

@@ -2,8 +2,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // A transferred file's path and the owner, group and permission it gets.
 class FileInfo {
@@ -33,5 +32,4 @@ private:
     std::string _FilePermission;
 };
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

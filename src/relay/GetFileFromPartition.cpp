@@ -5,8 +5,7 @@
 
 #include <sstream>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 GetFileFromPartition::GetFileFromPartition(TargetPartition const& target) : Base(target) {}
 
@@ -36,5 +35,4 @@ std::string GetFileFromPartition::createString_GetFileParameters(std::string con
     return parameters.str();
 }
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

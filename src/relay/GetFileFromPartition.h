@@ -4,12 +4,13 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // Copies a file from the partition to the console.
 class GetFileFromPartition : public virtual Base {
 public:
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared: a target stands wherever
+    // the operation is expected
     GetFileFromPartition(TargetPartition const& target);
     ~GetFileFromPartition();
 
@@ -23,5 +24,4 @@ public:
                                                       std::string const& localFileName);
 };
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

@@ -1,7 +1,6 @@
 #include "relay/Interface.h"
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // The shared Base is built here, by the most derived class; the Base(target)
 // of each operation applies only when that operation stands alone.
@@ -11,5 +10,4 @@ Interface::Interface(TargetPartition const& target)
 
 Interface::~Interface() = default;
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

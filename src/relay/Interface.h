@@ -4,8 +4,7 @@
 #include "relay/PutFileToPartition.h"
 #include "relay/RunCommandOnPartition.h"
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // All three remote operations over one shared Base: they share the target,
 // the action name and the last run's output and return codes.
@@ -13,9 +12,10 @@ class Interface : public GetFileFromPartition,
                   public PutFileToPartition,
                   public RunCommandOnPartition {
 public:
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared: a target stands wherever
+    // an interface is expected
     Interface(TargetPartition const& target);
     ~Interface();
 };
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

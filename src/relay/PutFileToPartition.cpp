@@ -5,8 +5,7 @@
 
 #include <sstream>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 PutFileToPartition::PutFileToPartition(TargetPartition const& target) : Base(target) {}
 
@@ -30,5 +29,4 @@ std::string PutFileToPartition::createString_PutFileParameters(std::string const
     return parameters.str();
 }
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

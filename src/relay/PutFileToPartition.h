@@ -4,12 +4,13 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // Copies a file from the console to the same path on the partition.
 class PutFileToPartition : public virtual Base {
 public:
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared: a target stands wherever
+    // the operation is expected
     PutFileToPartition(TargetPartition const& target);
     ~PutFileToPartition();
 
@@ -20,5 +21,4 @@ public:
     static std::string createString_PutFileParameters(std::string const& fileName);
 };
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

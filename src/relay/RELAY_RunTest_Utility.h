@@ -11,8 +11,7 @@
 #include <string>
 #include <vector>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // The trace of this test process, opened on a temporary file before the first
 // command runs: a trace object that wrote while no file was open stays mute.
@@ -57,5 +56,4 @@ protected:
     TestTraceRecorder _trace;
 };
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

@@ -4,8 +4,7 @@
 
 #include <sstream>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 std::string RELAY_TargetPartition_Utility::_u_get_MachineType_Model(
     Quorvex::System::Partition const& partition) {
@@ -32,5 +31,4 @@ RELAY_TargetPartition_Utility::_u_get_PartitionArray(Quorvex::System::Partition 
     return parameter.str();
 }
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

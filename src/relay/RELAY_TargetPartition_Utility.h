@@ -4,8 +4,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // The target parameters of a remote action, taken from a partition record.
 class RELAY_TargetPartition_Utility {
@@ -17,5 +16,4 @@ public:
     static std::string _u_get_PartitionArray(Quorvex::System::Partition const& partition);
 };
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

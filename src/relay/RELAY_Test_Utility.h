@@ -5,8 +5,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // Partitions the remote channel tests address: machine 1234-ABC, serial
 // 10ABCDE, the given partition identifier.
@@ -15,5 +14,4 @@ inline Quorvex::System::Partition u_make_TestPartition(std::string const& partit
                                       "p" + partitionID + ".example");
 }
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

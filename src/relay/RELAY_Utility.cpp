@@ -4,8 +4,7 @@
 
 #include <sstream>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 namespace {
 
@@ -45,5 +44,4 @@ void RELAY_Utility::set_Default_Client_FileInfo(FileInfo& info) {
     _u_set_Default_FileInfo(info, gc_Client_FileGroup);
 }
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

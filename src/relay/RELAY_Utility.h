@@ -2,8 +2,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 class FileInfo;
 
@@ -22,5 +21,4 @@ public:
     static void set_Default_Client_FileInfo(FileInfo& info);
 };
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

@@ -6,8 +6,7 @@
 #include <cstdint>
 #include <cstdlib>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // Constructed ahead of every ordinary start-up object, so that code run by
 // another unit's start-up (or destroyed late at exit) still finds it whole.
@@ -20,7 +19,7 @@ ReturnCode::ReturnCode(std::string const& line) {
     StringUtility::splitString(line, "::", tokens);
     // The part that starts at "Rc" is added first, so its keys win over the
     // same keys in the leading part.
-    Token_Iterator const rc = std::find(tokens.cbegin(), tokens.cend(), "Rc");
+    auto const rc = std::find(tokens.cbegin(), tokens.cend(), "Rc");
     _convert_Vector_2_Map(rc, tokens.cend());
     _convert_Vector_2_Map(tokens.cbegin(), rc);
 }
@@ -70,5 +69,4 @@ int ReturnCode::_get_Number(std::string const& key) const {
     return static_cast<int>(static_cast<std::uint32_t>(value));
 }
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

@@ -4,8 +4,7 @@
 #include <string>
 #include <vector>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // The key/value pairs of one output line of the remote action tool,
 // e.g. Rc::0::RcCmd::0::RetStr1::done::RetStr2::
@@ -13,6 +12,8 @@ class ReturnCode {
 public:
     ReturnCode();
     // Never fails: any line, however malformed, gives some (possibly empty) map.
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared: an output line stands
+    // wherever a return code is expected
     ReturnCode(std::string const& line);
 
     bool contains(std::string const& key) const;
@@ -43,5 +44,4 @@ private:
 // The return code of a run that printed nothing: Rc and RcCmd -1, no strings.
 extern ReturnCode const cBlankReturnCode;
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

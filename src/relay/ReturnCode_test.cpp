@@ -2,7 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <climits>
+#include <iterator>
 #include <map>
 #include <string>
 #include <vector>
@@ -30,9 +32,8 @@ std::vector<std::string> hostileLines() {
     for (std::size_t length = 0; length < 4; ++length) {
         std::vector<std::string> longer;
         for (std::string const& line : lines) {
-            for (std::string const& piece : pieces) {
-                longer.push_back(line + piece);
-            }
+            std::transform(pieces.begin(), pieces.end(), std::back_inserter(longer),
+                           [&line](std::string const& piece) { return line + piece; });
         }
         lines.insert(lines.end(), longer.begin(), longer.end());
     }
@@ -174,6 +175,7 @@ TEST(ReturnCode, VeryLongLineIsParsedWhole) {
 
 TEST(ReturnCode, CopiesAndAssignmentsKeepTheValues) {
     ReturnCode const original("Rc::1::RetStr1::x");
+    // NOLINTNEXTLINE(performance-unnecessary-copy-initialization): the copy is under test
     ReturnCode const copy(original);
     ReturnCode assigned;
     assigned = original;

@@ -4,8 +4,7 @@
 
 #include <sstream>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 namespace {
 
@@ -60,5 +59,4 @@ void RunCommandOnPartition::_initialize_ClientQuorvexParameters(std::string& opt
     }
 }
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

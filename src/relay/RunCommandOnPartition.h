@@ -5,12 +5,13 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // Runs a command on the partition; the client survey is one such command.
 class RunCommandOnPartition : public virtual Base {
 public:
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared: a target stands wherever
+    // the operation is expected
     RunCommandOnPartition(TargetPartition const& target);
     ~RunCommandOnPartition();
 
@@ -32,5 +33,4 @@ public:
     void _initialize_ClientQuorvexParameters(std::string& options);
 };
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

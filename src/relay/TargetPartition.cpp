@@ -4,8 +4,7 @@
 
 #include <sstream>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 TargetPartition::TargetPartition() : _Partition(), _UsePartitionArray(false) {}
 
@@ -36,5 +35,4 @@ std::string TargetPartition::createString_Target() const {
     return target.str();
 }
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

@@ -4,14 +4,15 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace RELAY {
+namespace Quorvex::RELAY {
 
 // The partition a remote action addresses, and whether the action names it
 // by "PartitionId" or by "PartitionArray".
 class TargetPartition {
 public:
     TargetPartition();
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared: a partition stands
+    // wherever a target is expected
     TargetPartition(Quorvex::System::Partition const& partition);
 
     Quorvex::System::Partition const& get_Partition() const;
@@ -28,5 +29,4 @@ private:
     bool _UsePartitionArray;
 };
 
-} // namespace RELAY
-} // namespace Quorvex
+} // namespace Quorvex::RELAY

@@ -11,6 +11,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <iterator>
 #include <sstream>
 #include <stdexcept>
 #include <string>
@@ -39,9 +41,9 @@ unsigned int u_read_ActiveStatus(std::string const& text) {
 // The keywords of a resource's properties, in their order.
 std::vector<std::string> u_get_Keywords(Quorvex::VPD::Resource const& resource) {
     std::vector<std::string> keywords;
-    for (auto const& entry : resource.get_ListOf_Properties()) {
-        keywords.push_back(entry.second.get_Keyword());
-    }
+    std::transform(resource.get_ListOf_Properties().begin(), resource.get_ListOf_Properties().end(),
+                   std::back_inserter(keywords),
+                   [](auto const& entry) { return entry.second.get_Keyword(); });
     return keywords;
 }
 

@@ -101,7 +101,7 @@ ChildOutput u_run_InChild(std::function<int()> const& work) {
     std::cerr.flush();
     pid_t const child = ::fork();
     if (child < 0) {
-        return ChildOutput();
+        return {};
     }
     if (child == 0) {
         out.redirect(STDOUT_FILENO);

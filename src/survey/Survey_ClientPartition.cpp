@@ -11,9 +11,7 @@
 #include <ostream>
 #include <sstream>
 
-namespace Quorvex {
-namespace PYLON {
-namespace VPD {
+namespace Quorvex::PYLON::VPD {
 
 namespace {
 
@@ -177,6 +175,4 @@ void Survey_ClientPartition::operator()(::Quorvex::PYLON::ListOf_Partitions cons
     }
 }
 
-} // namespace VPD
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON::VPD

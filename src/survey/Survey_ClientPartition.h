@@ -5,9 +5,7 @@
 #include <string>
 #include <vector>
 
-namespace Quorvex {
-namespace PYLON {
-namespace VPD {
+namespace Quorvex::PYLON::VPD {
 
 // Surveys every partition of a listing in turn: runs the client survey on
 // each active partition through the remote action channel and fetches its
@@ -25,6 +23,4 @@ public:
                     ::std::vector<::std::string>& statusTexts) const;
 };
 
-} // namespace VPD
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON::VPD

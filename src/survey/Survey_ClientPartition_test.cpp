@@ -9,7 +9,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <iostream>
+#include <iterator>
 #include <string>
 #include <vector>
 
@@ -121,10 +123,11 @@ TEST_F(Survey_ClientPartition, PartitionWithActiveStatusTwoIsSkippedWithNoTraceT
 }
 
 TEST_F(Survey_ClientPartition, UnreadableActiveStatusesAreSkipped) {
+    std::vector<std::string> const statuses{"", "abc", "0", "1", "4294967296"};
     Quorvex::PYLON::ListOf_Partitions partitions;
-    for (std::string const status : {"", "abc", "0", "1", "4294967296"}) {
-        partitions.push_back(u_make_Partition("1", status, "host1"));
-    }
+    std::transform(
+        statuses.begin(), statuses.end(), std::back_inserter(partitions),
+        [](std::string const& status) { return u_make_Partition("1", status, "host1"); });
     LoopRun const run = u_run_Loop(gc_ClientOk, partitions);
     std::string const skipped = "|8|Failed - Active Status < 3\n";
     EXPECT_EQ(run.outcomes, skipped + skipped + skipped + skipped + skipped);

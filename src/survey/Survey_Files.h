@@ -1,8 +1,6 @@
 #pragma once
 
-namespace Quorvex {
-namespace PYLON {
-namespace VPD {
+namespace Quorvex::PYLON::VPD {
 
 // Names of the files a survey run writes. Constant arrays, so they are ready
 // before any other unit's start-up code runs.
@@ -15,6 +13,4 @@ inline constexpr char gc_QuorvexDirectory[] = "/var/adm/quorvex/";
 // The folder of the status and result files, relative to gc_QuorvexDirectory.
 inline constexpr char gc_VPD_Folder[] = "VPD/";
 
-} // namespace VPD
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON::VPD

@@ -5,9 +5,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace PYLON {
-namespace Utility_VPD_XML {
+namespace Quorvex::PYLON::Utility_VPD_XML {
 
 namespace {
 
@@ -28,6 +26,4 @@ void initialize_Default_VPD_ResourceSet(::Quorvex::VPD::ResourceSet& set,
     set.set_Resource(resource);
 }
 
-} // namespace Utility_VPD_XML
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON::Utility_VPD_XML

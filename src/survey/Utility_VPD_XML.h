@@ -3,9 +3,7 @@
 #include "system/MTMS.h"
 #include "vpd/ResourceSet.h"
 
-namespace Quorvex {
-namespace PYLON {
-namespace Utility_VPD_XML {
+namespace Quorvex::PYLON::Utility_VPD_XML {
 
 // Gives set the attributes of a hardware survey (current time stamp, class
 // "com.zor.inventory.Hardware", type "Hardware", version "1.0") and the
@@ -15,6 +13,4 @@ namespace Utility_VPD_XML {
 void initialize_Default_VPD_ResourceSet(::Quorvex::VPD::ResourceSet& set,
                                         ::Quorvex::System::MTMS const& mtms);
 
-} // namespace Utility_VPD_XML
-} // namespace PYLON
-} // namespace Quorvex
+} // namespace Quorvex::PYLON::Utility_VPD_XML

@@ -2,9 +2,7 @@
 
 #include <string>
 
-namespace DEBUG {
-namespace Quorvex {
-namespace System {
+namespace DEBUG::Quorvex::System {
 
 void print_Partition(std::ostream& out, ::Quorvex::System::Partition const& partition,
                      unsigned int const& indent) {
@@ -21,6 +19,4 @@ void print_Partition(std::ostream& out, ::Quorvex::System::Partition const& part
     out << text << std::endl;
 }
 
-} // namespace System
-} // namespace Quorvex
-} // namespace DEBUG
+} // namespace DEBUG::Quorvex::System

@@ -4,14 +4,10 @@
 
 #include <ostream>
 
-namespace DEBUG {
-namespace Quorvex {
-namespace System {
+namespace DEBUG::Quorvex::System {
 
 // Writes the record as one block of labelled lines, each indented by indent blanks.
 void print_Partition(std::ostream& out, ::Quorvex::System::Partition const& partition,
                      unsigned int const& indent);
 
-} // namespace System
-} // namespace Quorvex
-} // namespace DEBUG
+} // namespace DEBUG::Quorvex::System

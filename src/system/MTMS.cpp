@@ -2,8 +2,7 @@
 
 #include "system/MTMS_Utility.h"
 
-namespace Quorvex {
-namespace System {
+namespace Quorvex::System {
 
 namespace {
 
@@ -90,5 +89,4 @@ bool operator<(MTMS const& a, MTMS const& b) {
     return std::string(a) < std::string(b);
 }
 
-} // namespace System
-} // namespace Quorvex
+} // namespace Quorvex::System

@@ -2,8 +2,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace System {
+namespace Quorvex::System {
 
 // Joins type-model and serial in the text form of a machine identity.
 // A constant array, so it is ready before any other unit's start-up code runs.
@@ -17,6 +16,8 @@ public:
     MTMS(std::string const& machineType_Model, std::string const& serial);
     // Splits a text form (type-model "_" serial) at its last "_"; a type-model
     // without "-" marks both fields with an appended "ERROR".
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared: an identity text stands
+    // wherever an identity is expected
     MTMS(std::string const& text);
     MTMS(MTMS const& other) = default;
     MTMS& operator=(MTMS const& other) = default;
@@ -49,5 +50,4 @@ bool operator==(MTMS const& a, MTMS const& b);
 bool operator!=(MTMS const& a, MTMS const& b);
 bool operator<(MTMS const& a, MTMS const& b);
 
-} // namespace System
-} // namespace Quorvex
+} // namespace Quorvex::System

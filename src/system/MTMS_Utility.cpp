@@ -4,17 +4,13 @@
 
 #include <cstdint>
 
-namespace Quorvex {
-namespace System {
-namespace MTMS_Utility {
+namespace Quorvex::System::MTMS_Utility {
 
 void u_split_TM_SE(std::string const& name, std::string& typeModel, std::string& serial) {
-    std::uint32_t const position = static_cast<std::uint32_t>(name.rfind(gc_TM_SE_Delimiter));
+    auto const position = static_cast<std::uint32_t>(name.rfind(gc_TM_SE_Delimiter));
     std::uint32_t const serialStart = position + 1U;
     typeModel = name.substr(0, position);
     serial = name.substr(serialStart);
 }
 
-} // namespace MTMS_Utility
-} // namespace System
-} // namespace Quorvex
+} // namespace Quorvex::System::MTMS_Utility

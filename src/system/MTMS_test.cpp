@@ -85,12 +85,13 @@ TEST(MTMS, AssignCleansLikeTheTwoStringConstructor) {
 
 TEST(MTMS, CopyAndAssignmentCopyBothFields) {
     MTMS const original("1234-ABC", "10ABCDE");
+    // NOLINTNEXTLINE(performance-unnecessary-copy-initialization): the copy is under test
     MTMS const copy(original);
     expectFields(copy, "1234-ABC", "10ABCDE");
     MTMS assigned;
     assigned = original;
     expectFields(assigned, "1234-ABC", "10ABCDE");
-    MTMS& self = assigned;
+    MTMS const& self = assigned;
     assigned = self;
     expectFields(assigned, "1234-ABC", "10ABCDE");
 }

@@ -1,7 +1,6 @@
 #include "system/Partition.h"
 
-namespace Quorvex {
-namespace System {
+namespace Quorvex::System {
 
 namespace {
 
@@ -104,5 +103,4 @@ bool operator<(Partition const& a, Partition const& b) {
     return a.get_HostName() < b.get_HostName();
 }
 
-} // namespace System
-} // namespace Quorvex
+} // namespace Quorvex::System

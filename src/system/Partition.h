@@ -4,8 +4,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace System {
+namespace Quorvex::System {
 
 // One logical partition of a managed machine as the console lists it.
 class Partition {
@@ -51,5 +50,4 @@ private:
 // By machine identity text, then partition ID as text ("10" before "9"), then host name.
 bool operator<(Partition const& a, Partition const& b);
 
-} // namespace System
-} // namespace Quorvex
+} // namespace Quorvex::System

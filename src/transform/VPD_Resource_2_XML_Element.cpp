@@ -6,6 +6,8 @@
 #include "vpd/ResourceList.h"
 #include "xml/ListOf_Elements.h"
 
+#include <algorithm>
+#include <iterator>
 #include <string>
 
 namespace Transform {
@@ -16,12 +18,8 @@ namespace {
 constexpr const char* gc_LeadingResourceLists[] = {"Partitions", "Enclosures"};
 
 bool u_is_LeadingResourceList(std::string const& name) {
-    for (const char* leading : gc_LeadingResourceLists) {
-        if (name == leading) {
-            return true;
-        }
-    }
-    return false;
+    return std::any_of(std::begin(gc_LeadingResourceLists), std::end(gc_LeadingResourceLists),
+                       [&name](char const* leading) { return name == leading; });
 }
 
 } // namespace

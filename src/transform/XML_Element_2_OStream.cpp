@@ -14,7 +14,7 @@ constexpr char gc_VersionAttribute[] = "version";
 
 XML_Element_2_OStream::XML_Element_2_OStream(std::ostream& out,
                                              unsigned long const& indentationLevel)
-    : _IndentationLevel(indentationLevel), _OStream(out), _Depth(0) {}
+    : _IndentationLevel(indentationLevel), _OStream(out) {}
 
 std::ostream& XML_Element_2_OStream::operator()(XML::Element const& element, bool const& newLine,
                                                 unsigned int const& depth) {

@@ -36,7 +36,7 @@ private:
 
     unsigned long _IndentationLevel;
     std::ostream& _OStream;
-    unsigned int _Depth;
+    unsigned int _Depth{0};
 };
 
 } // namespace Transform

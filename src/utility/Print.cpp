@@ -2,8 +2,7 @@
 
 #include <iomanip>
 
-namespace DEBUG {
-namespace STL {
+namespace DEBUG::STL {
 
 Print::Print(::std::ostream& out) : _out(out) {}
 
@@ -35,5 +34,4 @@ void Print::operator()(::std::map<::std::string, ::std::string> const& m) {
     print_Map_Of_String_String(m);
 }
 
-} // namespace STL
-} // namespace DEBUG
+} // namespace DEBUG::STL

@@ -6,8 +6,7 @@
 #include <string>
 #include <vector>
 
-namespace DEBUG {
-namespace STL {
+namespace DEBUG::STL {
 
 // Writes string containers for the trace, one element a line with a
 // right-aligned index column. Only the width of the one padded item is set;
@@ -48,5 +47,4 @@ private:
     ::std::ostream& _out;
 };
 
-} // namespace STL
-} // namespace DEBUG
+} // namespace DEBUG::STL

@@ -41,9 +41,8 @@ void u_trace_End() {
 } // namespace
 
 ShellCommand::ShellCommand(std::string const& command)
-    : _command(command), _executed(false), _executeOnlyOnce(true),
-      _temporaryDirectory(ms_Default_Directory), _temporaryBaseFileName(ms_Default_BaseFileName),
-      _returnCode(0), _stdoutLines(), _stderrLines() {}
+    : _command(command), _temporaryDirectory(ms_Default_Directory),
+      _temporaryBaseFileName(ms_Default_BaseFileName), _stdoutLines(), _stderrLines() {}
 
 void ShellCommand::append_Command(std::string const& text) {
     _command += text;

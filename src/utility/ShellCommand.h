@@ -62,11 +62,11 @@ public:
 
 private:
     std::string _command;
-    bool _executed;
-    bool _executeOnlyOnce;
+    bool _executed{false};
+    bool _executeOnlyOnce{true};
     std::string _temporaryDirectory;
     std::string _temporaryBaseFileName;
-    std::int32_t _returnCode;
+    std::int32_t _returnCode{0};
     Lines _stdoutLines;
     Lines _stderrLines;
 };

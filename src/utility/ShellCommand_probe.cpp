@@ -10,6 +10,7 @@
 #include "utility/ShellCommand.h"
 #include "utility/Trace.h"
 
+#include <algorithm>
 #include <filesystem>
 #include <iostream>
 #include <string>
@@ -18,15 +19,13 @@ namespace {
 
 int countLeftTemporaryFiles() {
     std::string const prefix = std::string(Utility::ShellCommand::ms_Default_BaseFileName) + ".";
-    int count = 0;
     std::error_code error;
-    for (auto const& entry :
-         std::filesystem::directory_iterator(Utility::ShellCommand::ms_Default_Directory, error)) {
-        if (entry.path().filename().string().rfind(prefix, 0) == 0) {
-            ++count;
-        }
-    }
-    return count;
+    std::filesystem::directory_iterator const entries(Utility::ShellCommand::ms_Default_Directory,
+                                                      error);
+    return static_cast<int>(std::count_if(
+        begin(entries), end(entries), [&prefix](std::filesystem::directory_entry const& entry) {
+            return entry.path().filename().string().rfind(prefix, 0) == 0;
+        }));
 }
 
 } // namespace

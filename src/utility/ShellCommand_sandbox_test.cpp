@@ -93,7 +93,7 @@ TEST_F(ShellCommandPrivateTmp, FailingRunsLeaveNoTemporaryFile) {
 }
 
 TEST_F(ShellCommandPrivateTmp, RunWithOverLongLineLeavesNoTemporaryFile) {
-    runAndExpectNoFileLeft("sh -c \"head -c 200000 /dev/zero | tr '\\\\000' x; echo; echo z\"", 0);
+    runAndExpectNoFileLeft(R"(sh -c "head -c 200000 /dev/zero | tr '\\000' x; echo; echo z")", 0);
 }
 
 TEST_F(ShellCommandPrivateTmp, RepeatedRunsLeaveNoTemporaryFile) {

@@ -128,7 +128,7 @@ TEST_F(ShellCommandTest, CommandNotFoundGives127AndShellMessageOnStderr) {
 }
 
 TEST_F(ShellCommandTest, StandardErrorIsCapturedSeparately) {
-    Utility::ShellCommand command("sh -c \"printf 'out\\n'; printf 'e1\\ne2' >&2\"");
+    Utility::ShellCommand command(R"(sh -c "printf 'out\n'; printf 'e1\ne2' >&2")");
     EXPECT_EQ(command.execute(), 0);
     EXPECT_EQ(command.get_stdout(), (Lines{"out", ""}));
     EXPECT_EQ(command.get_stderr(), (Lines{"e1", "e2"}));

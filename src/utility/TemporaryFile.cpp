@@ -15,7 +15,7 @@ constexpr char gc_UniqueSuffix[] = ".XXXXXX";
 } // namespace
 
 TemporaryFile::TemporaryFile(std::string const& baseFileName)
-    : _baseFileName(baseFileName), _actualFileName(), _valid(false) {
+    : _baseFileName(baseFileName), _actualFileName() {
     std::string const pattern = _baseFileName + gc_UniqueSuffix;
     // mkstemp writes the generated name into its argument.
     std::vector<char> name(pattern.begin(), pattern.end());

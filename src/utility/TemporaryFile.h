@@ -27,7 +27,7 @@ public:
 private:
     std::string _baseFileName;
     std::string _actualFileName;
-    bool _valid;
+    bool _valid{false};
 };
 
 } // namespace Utility

@@ -94,6 +94,7 @@ TEST_F(TemporaryFileTest, MissingDirectoryGivesInvalidObjectWithBaseNameKept) {
 
 TEST_F(TemporaryFileTest, CopyTakesAllThreeFields) {
     Utility::TemporaryFile file(_base);
+    // NOLINTNEXTLINE(performance-unnecessary-copy-initialization): the copy is under test
     Utility::TemporaryFile copy(file);
     EXPECT_TRUE(copy.isValid());
     EXPECT_EQ(copy.get_ActualFileName(), file.get_ActualFileName());

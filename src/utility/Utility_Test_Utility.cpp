@@ -7,8 +7,7 @@
 #include <regex>
 #include <vector>
 
-namespace Utility {
-namespace Utility_Test_Utility {
+namespace Utility::Utility_Test_Utility {
 
 namespace {
 
@@ -51,5 +50,4 @@ std::string u_normalise_TemporaryNames(std::string const& text) {
     return std::regex_replace(text, temporaryName, "/tmp/ShellCommand.XXXXXX");
 }
 
-} // namespace Utility_Test_Utility
-} // namespace Utility
+} // namespace Utility::Utility_Test_Utility

@@ -4,8 +4,7 @@
 #include <sstream>
 #include <string>
 
-namespace Utility {
-namespace Utility_Test_Utility {
+namespace Utility::Utility_Test_Utility {
 
 // A string buffer that counts the flushes reaching it.
 class FlushCountingBuffer : public std::stringbuf {
@@ -38,5 +37,4 @@ void u_run_InFreshProcess(std::function<int()> const& body);
 // with "/tmp/ShellCommand.XXXXXX".
 std::string u_normalise_TemporaryNames(std::string const& text);
 
-} // namespace Utility_Test_Utility
-} // namespace Utility
+} // namespace Utility::Utility_Test_Utility

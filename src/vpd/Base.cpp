@@ -1,7 +1,6 @@
 #include "vpd/Base.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 Base::Base() = default;
 
@@ -15,5 +14,4 @@ void Base::set_DisplayName(std::string const& displayName) {
     _DisplayName = displayName;
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -2,13 +2,14 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // The display name that every model object carries.
 class Base {
 public:
     Base();
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared: a display name stands
+    // wherever a model base is expected
     Base(std::string const& displayName);
 
     std::string const& get_DisplayName() const;
@@ -18,5 +19,4 @@ private:
     std::string _DisplayName;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

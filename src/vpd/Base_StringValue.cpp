@@ -1,11 +1,9 @@
 #include "vpd/Base_StringValue.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 Base_StringValue::operator std::string() const {
     return __StringValue();
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -2,8 +2,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // Gives a model object the text under which keyed lists store it.
 // Objects are never deleted through this class, so it has no virtual
@@ -22,5 +21,4 @@ protected:
     ~Base_StringValue() = default;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

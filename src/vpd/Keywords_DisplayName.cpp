@@ -1,7 +1,6 @@
 #include "vpd/Keywords_DisplayName.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 namespace {
 
@@ -131,7 +130,7 @@ Keywords_DisplayName::Keywords_DisplayName() {
 }
 
 std::string const& Keywords_DisplayName::operator[](std::string const& keyword) const {
-    const_iterator hit = _Table.find(keyword);
+    auto hit = _Table.find(keyword);
     if (hit == _Table.end()) {
         hit = _find_Wildcard(keyword);
     }
@@ -160,7 +159,7 @@ Keywords_DisplayName::_find_Wildcard(std::string const& keyword) const {
          ++i) {
         std::string pattern = keyword;
         pattern[i] = gc_Wildcard;
-        const_iterator const hit = _Table.find(pattern);
+        auto const hit = _Table.find(pattern);
         if (hit != _Table.end()) {
             return hit;
         }
@@ -168,5 +167,4 @@ Keywords_DisplayName::_find_Wildcard(std::string const& keyword) const {
     return _Table.end();
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -4,8 +4,7 @@
 #include <map>
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // The fixed dictionary from two-character VPD keyword to the human-readable
 // name that goes with every property into the VPD documents.
@@ -39,5 +38,4 @@ private:
     std::map<std::string, std::string> _Table;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

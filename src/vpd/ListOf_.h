@@ -4,8 +4,7 @@
 #include <map>
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // Model objects kept by value under their key text (`__StringValue()`), in
 // byte order of the keys. An element whose key is present already is merged
@@ -20,14 +19,14 @@ public:
 
     ListOf_() = default;
     ListOf_(ListOf_ const& other) = default;
-    ListOf_(ListOf_&& other) = default;
+    ListOf_(ListOf_&& other) noexcept = default;
     // Copies before it lets the old content go: other may live inside it.
     ListOf_& operator=(ListOf_ const& other) {
         std::map<std::string, T> copy(other._Elements);
         _Elements.swap(copy);
         return *this;
     }
-    ListOf_& operator=(ListOf_&& other) = default;
+    ListOf_& operator=(ListOf_&& other) noexcept = default;
     ~ListOf_() = default;
 
     void insert(T const& element) {
@@ -41,7 +40,7 @@ public:
 
     // Throws Error_ElementNotFound when no element has that key.
     T const& find(std::string const& key) const {
-        const_iterator const hit = _Elements.find(key);
+        auto const hit = _Elements.find(key);
         if (hit == _Elements.end()) {
             throw Error_ElementNotFound();
         }
@@ -76,5 +75,4 @@ private:
     std::map<std::string, T> _Elements;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

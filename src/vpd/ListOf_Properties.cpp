@@ -1,7 +1,6 @@
 #include "vpd/ListOf_Properties.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 ListOf_Properties::ListOf_Properties() = default;
 
@@ -11,5 +10,4 @@ ListOf_Properties& ListOf_Properties::operator=(ListOf_Properties const& other) 
 
 ListOf_Properties::~ListOf_Properties() = default;
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -3,8 +3,7 @@
 #include "vpd/ListOf_.h"
 #include "vpd/Property.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // Properties keyed by keyword; the first property of a keyword is kept.
 class ListOf_Properties : public ListOf_<Property> {
@@ -15,5 +14,4 @@ public:
     ~ListOf_Properties();
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <iterator>
 #include <string>
 #include <vector>
 
@@ -12,9 +14,8 @@ using Quorvex::VPD::Property;
 
 std::vector<std::string> u_keywords(ListOf_Properties const& list) {
     std::vector<std::string> keywords;
-    for (auto const& entry : list) {
-        keywords.push_back(entry.first);
-    }
+    std::transform(list.begin(), list.end(), std::back_inserter(keywords),
+                   [](auto const& entry) { return entry.first; });
     return keywords;
 }
 

@@ -1,7 +1,6 @@
 #include "vpd/Property.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 namespace {
 
@@ -74,5 +73,4 @@ bool operator!=(Property const& a, Property const& b) {
     return !(a == b);
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

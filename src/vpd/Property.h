@@ -7,8 +7,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // One piece of VPD: a keyword, its typed value and the keyword's display
 // name. Keyed by its keyword.
@@ -53,5 +52,4 @@ private:
 bool operator==(Property const& a, Property const& b);
 bool operator!=(Property const& a, Property const& b);
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -1,7 +1,6 @@
 #include "vpd/PropertyGroup.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 PropertyGroup::PropertyGroup() = default;
 
@@ -11,5 +10,4 @@ std::string const& PropertyGroup::__StringValue() const {
     return get_DisplayName();
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

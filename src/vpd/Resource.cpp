@@ -2,8 +2,7 @@
 
 #include "vpd/ResourceList.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 Resource::Resource() = default;
 
@@ -57,5 +56,4 @@ std::string const& Resource::__StringValue() const {
     return get_UniqueID();
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

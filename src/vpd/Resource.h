@@ -9,8 +9,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // One surveyed thing (machine, partition, card): display name, unique ID,
 // references, properties, property groups and named lists of further
@@ -41,8 +40,7 @@ public:
     std::string const& __StringValue() const override;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD
 
 // A resource is of little use without its lists: make ResourceList complete
 // for every unit that includes this header. It comes after the class,

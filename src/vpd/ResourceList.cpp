@@ -1,7 +1,6 @@
 #include "vpd/ResourceList.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 ResourceList::ResourceList() = default;
 
@@ -11,5 +10,4 @@ std::string const& ResourceList::__StringValue() const {
     return get_DisplayName();
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

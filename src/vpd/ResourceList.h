@@ -7,17 +7,17 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // A named list of resources, keyed by unique ID. Keyed by its name.
 class ResourceList : public Base, public Base_StringValue, public ListOf_<Resource> {
 public:
     ResourceList();
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared: a name stands wherever a
+    // list is expected
     ResourceList(std::string const& name);
 
     std::string const& __StringValue() const override;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -1,7 +1,6 @@
 #include "vpd/ResourceSet.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 ResourceSet::ResourceSet() = default;
 
@@ -24,5 +23,4 @@ std::string const& ResourceSet::__StringValue() const {
     return get_Class();
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -8,8 +8,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // One survey result: class, type, version and time stamp, one top resource
 // and named resource lists. Keyed by its class. Copies are deep.
@@ -31,5 +30,4 @@ public:
     std::string const& __StringValue() const override;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -1,7 +1,6 @@
 #include "vpd/ResourceSet_ContainerInterface_Attributes.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 ResourceSet_ContainerInterface_Attributes::ResourceSet_ContainerInterface_Attributes() = default;
 
@@ -42,5 +41,4 @@ void ResourceSet_ContainerInterface_Attributes::set_TimeStamp(std::string const&
     _TimeStamp = timeStamp;
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

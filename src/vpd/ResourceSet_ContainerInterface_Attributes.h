@@ -2,8 +2,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // The document attributes of a resource set.
 class ResourceSet_ContainerInterface_Attributes {
@@ -29,5 +28,4 @@ private:
     std::string _TimeStamp;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

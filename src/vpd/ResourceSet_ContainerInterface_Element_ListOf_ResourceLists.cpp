@@ -1,11 +1,9 @@
 #include "vpd/ResourceSet_ContainerInterface_Element_ListOf_ResourceLists.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 ResourceSet_ContainerInterface_Element_ListOf_ResourceLists::
-    ResourceSet_ContainerInterface_Element_ListOf_ResourceLists()
-    : _IsActive(false) {}
+    ResourceSet_ContainerInterface_Element_ListOf_ResourceLists() = default;
 
 bool ResourceSet_ContainerInterface_Element_ListOf_ResourceLists::isActive() const {
     return _IsActive;
@@ -32,5 +30,4 @@ void ResourceSet_ContainerInterface_Element_ListOf_ResourceLists::insert_Resourc
     _ListOf_ResourceLists.insert(list);
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -5,8 +5,7 @@
 
 #include <cstddef>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // Gives a resource set its named resource lists, with a flag that records
 // whether a list was ever inserted. The writers do not consult the flag.
@@ -23,9 +22,8 @@ public:
     void insert_ResourceList(ResourceList const& list);
 
 private:
-    bool _IsActive;
+    bool _IsActive{false};
     ListOf_<ResourceList> _ListOf_ResourceLists;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -1,10 +1,9 @@
 #include "vpd/ResourceSet_ContainerInterface_Element_Resource.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
-ResourceSet_ContainerInterface_Element_Resource::ResourceSet_ContainerInterface_Element_Resource()
-    : _IsActive(false) {}
+ResourceSet_ContainerInterface_Element_Resource::ResourceSet_ContainerInterface_Element_Resource() =
+    default;
 
 bool ResourceSet_ContainerInterface_Element_Resource::isActive() const {
     return _IsActive;
@@ -23,5 +22,4 @@ void ResourceSet_ContainerInterface_Element_Resource::set_Resource(Resource cons
     _Resource = resource;
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -2,8 +2,7 @@
 
 #include "vpd/Resource.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // Gives a resource set its one top resource, with a flag that records
 // whether a resource was ever set. The writers do not consult the flag.
@@ -18,9 +17,8 @@ public:
     void set_Resource(Resource const& resource);
 
 private:
-    bool _IsActive;
+    bool _IsActive{false};
     Resource _Resource;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

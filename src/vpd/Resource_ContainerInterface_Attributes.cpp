@@ -1,7 +1,6 @@
 #include "vpd/Resource_ContainerInterface_Attributes.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 Resource_ContainerInterface_Attributes::Resource_ContainerInterface_Attributes() = default;
 
@@ -25,5 +24,4 @@ void Resource_ContainerInterface_Attributes::set_References(std::string const& r
     _References = references;
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

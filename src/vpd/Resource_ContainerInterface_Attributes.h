@@ -2,8 +2,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // A resource's identity (its key in a resource list) and its references.
 class Resource_ContainerInterface_Attributes {
@@ -22,5 +21,4 @@ private:
     std::string _References;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

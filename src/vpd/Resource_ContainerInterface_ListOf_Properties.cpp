@@ -1,7 +1,6 @@
 #include "vpd/Resource_ContainerInterface_ListOf_Properties.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 bool Resource_ContainerInterface_ListOf_Properties::has_Property(std::string const& keyword) const {
     return _ListOf_Properties.contains(keyword);
@@ -24,5 +23,4 @@ void Resource_ContainerInterface_ListOf_Properties::insert_Property(Property con
     _ListOf_Properties.insert(property);
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -5,8 +5,7 @@
 #include <cstddef>
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // Gives a resource its properties, keyed by keyword.
 class Resource_ContainerInterface_ListOf_Properties {
@@ -22,5 +21,4 @@ private:
     ListOf_Properties _ListOf_Properties;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -1,7 +1,6 @@
 #include "vpd/Resource_ContainerInterface_ListOf_PropertyGroups.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 bool Resource_ContainerInterface_ListOf_PropertyGroups::has_PropertyGroup(
     std::string const& name) const {
@@ -27,5 +26,4 @@ void Resource_ContainerInterface_ListOf_PropertyGroups::insert_PropertyGroup(
     _ListOf_PropertyGroups.insert(group);
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

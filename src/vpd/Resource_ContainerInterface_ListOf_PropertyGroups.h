@@ -6,8 +6,7 @@
 #include <cstddef>
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // Gives a resource its property groups, keyed by group name.
 class Resource_ContainerInterface_ListOf_PropertyGroups {
@@ -23,5 +22,4 @@ private:
     ListOf_<PropertyGroup> _ListOf_PropertyGroups;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

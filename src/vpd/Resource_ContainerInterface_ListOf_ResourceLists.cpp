@@ -2,8 +2,7 @@
 
 #include "vpd/ResourceList.h"
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 Resource_ContainerInterface_ListOf_ResourceLists::Resource_ContainerInterface_ListOf_ResourceLists()
     : _ContentPtr(new ListOf_<ResourceList>()) {}
@@ -17,8 +16,7 @@ Resource_ContainerInterface_ListOf_ResourceLists&
 Resource_ContainerInterface_ListOf_ResourceLists::operator=(
     Resource_ContainerInterface_ListOf_ResourceLists const& other) {
     if (this != &other) {
-        ListOf_<ResourceList>* const copy =
-            new ListOf_<ResourceList>(other.get_ListOf_ResourceLists());
+        auto* const copy = new ListOf_<ResourceList>(other.get_ListOf_ResourceLists());
         delete _ContentPtr;
         _ContentPtr = copy;
     }
@@ -63,5 +61,4 @@ void Resource_ContainerInterface_ListOf_ResourceLists::_verify_ContentPtr() cons
     }
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -5,8 +5,7 @@
 #include <cstddef>
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // Complete only once vpd/ResourceList.h is included, because a resource list
 // holds resources by value.
@@ -41,5 +40,4 @@ private:
     ListOf_<ResourceList>* _ContentPtr;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -222,14 +222,17 @@ TEST(VPD_Resource, AssigningANestedResourceToItsOwnAncestorIsSafe) {
                                    "(name-port1|port1|){LO=P1-C1-T1;}]]");
 }
 
+// A resource owns its resource lists through a pointer that only its copy
+// operations fill, with a deep copy: moving copies, and the test reads the
+// source after the move to show it kept its lists.
 TEST(VPD_Resource, MovingCopiesAndLeavesTheSourceWhole) {
     Resource source = u_threeLevelTree();
-    Resource const moved(std::move(source));
+    Resource const moved(std::move(source)); // NOLINT(performance-move-const-arg)
     EXPECT_EQ(u_resource(moved), gc_ThreeLevelTree);
-    EXPECT_EQ(u_resource(source), gc_ThreeLevelTree);
+    EXPECT_EQ(u_resource(source), gc_ThreeLevelTree); // NOLINT(bugprone-use-after-move)
     Resource target;
-    target = std::move(source);
-    EXPECT_EQ(u_resource(source), gc_ThreeLevelTree);
+    target = std::move(source);                       // NOLINT(performance-move-const-arg)
+    EXPECT_EQ(u_resource(source), gc_ThreeLevelTree); // NOLINT(bugprone-use-after-move)
     EXPECT_TRUE(source.insert_Resource("Partitions", Resource("p", "p")));
 }
 

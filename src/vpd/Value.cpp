@@ -2,8 +2,7 @@
 
 #include <cassert>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 namespace {
 
@@ -33,5 +32,4 @@ std::string Value::get_String_ValueType() const {
     return gcString_ValueType[_ValueType];
 }
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -2,8 +2,7 @@
 
 #include <string>
 
-namespace Quorvex {
-namespace VPD {
+namespace Quorvex::VPD {
 
 // A property's value: its text, readable wherever a string is, and a type
 // code naming how the text is to be read (0 "string" ... 5 "hex").
@@ -22,5 +21,4 @@ private:
     unsigned int _ValueType;
 };
 
-} // namespace VPD
-} // namespace Quorvex
+} // namespace Quorvex::VPD

@@ -24,7 +24,7 @@ TEST(VPD_Value, EveryTypeCodeHasItsName) {
 
 TEST(VPD_Value, ReadsAsItsText) {
     Value const value("4096", 2);
-    std::string const text = value;
+    std::string const& text = value;
     EXPECT_EQ(text, "4096");
     EXPECT_EQ(value.size(), 4u);
 }
@@ -39,6 +39,7 @@ TEST(VPD_Value, SetValueTypeChangesOnlyTheType) {
 
 TEST(VPD_Value, CopyKeepsTextAndType) {
     Value const value("true", 4);
+    // NOLINTNEXTLINE(performance-unnecessary-copy-initialization): the copy is under test
     Value const copy(value);
     EXPECT_EQ(static_cast<std::string const&>(copy), "true");
     EXPECT_EQ(copy.get_ValueType(), 4u);

@@ -1,5 +1,9 @@
 #include "xml/Element.h"
 
+#include <algorithm>
+#include <cstddef>
+#include <iterator>
+
 namespace XML {
 
 Element::Element() : _Tag(Tag::Type_BeginTag) {}
@@ -69,7 +73,7 @@ void Element::set_Name(std::string const& name) {
 }
 
 std::string Element::get_AttributeValue(std::string const& name) const {
-    Attributes::const_iterator const hit = _Attribute.find(name);
+    auto const hit = _Attribute.find(name);
     return hit == _Attribute.end() ? std::string() : hit->second;
 }
 
@@ -92,12 +96,11 @@ unsigned long Element::insert_Content(Element const& child) {
 
 unsigned long Element::insert_Content(std::vector<Element> const& children) {
     unsigned long const before = _Content.size();
-    if (&children == &_Content) {
-        std::vector<Element> const copy(children);
-        _Content.insert(_Content.end(), copy.begin(), copy.end());
-    } else {
-        _Content.insert(_Content.end(), children.begin(), children.end());
-    }
+    // The children may be this element's own content: with the room made
+    // first, appending never moves the elements still to be read.
+    std::size_t const count = children.size();
+    _Content.reserve(before + count);
+    std::copy_n(children.begin(), count, std::back_inserter(_Content));
     return _Content.size() > before ? _Content.size() : 0;
 }
 

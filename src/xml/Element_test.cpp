@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <iterator>
 #include <string>
 #include <vector>
 
@@ -12,9 +14,9 @@ using XML::Tag;
 
 std::vector<std::string> u_attributeNames(Element const& element) {
     std::vector<std::string> names;
-    for (auto const& attribute : element.get_Attribute()) {
-        names.push_back(attribute.first);
-    }
+    std::transform(element.get_Attribute().begin(), element.get_Attribute().end(),
+                   std::back_inserter(names),
+                   [](auto const& attribute) { return attribute.first; });
     return names;
 }
 

@@ -19,6 +19,7 @@ public:
 
     Tag();
     // Not explicit: a code stands wherever a tag is expected.
+    // cppcheck-suppress noExplicitConstructor ; converting, as declared
     Tag(unsigned long const& type);
 
     Tag& operator=(unsigned long const& type);

@@ -1,11 +1,13 @@
 #include "QuorvexTest.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
 #include <fcntl.h>
 #include <filesystem>
 #include <fstream>
+#include <iterator>
 #include <set>
 #include <sstream>
 #include <stdexcept>
@@ -40,9 +42,9 @@ void _redirect(int fd, char const* path, int flags) {
     _redirect(STDOUT_FILENO, outPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC);
     _redirect(STDERR_FILENO, errPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC);
     std::vector<char*> args;
-    for (std::string const& arg : argv) {
-        args.push_back(const_cast<char*>(arg.c_str()));
-    }
+    args.reserve(argv.size() + 1);
+    std::transform(argv.begin(), argv.end(), std::back_inserter(args),
+                   [](std::string const& arg) { return const_cast<char*>(arg.c_str()); });
     args.push_back(nullptr);
     ::execvp(args[0], args.data());
     std::string const message = "cannot run " + argv[0] + ": " + std::strerror(errno) + "\n";
@@ -92,6 +94,11 @@ std::set<std::string> _simulatorFolders() {
         }
     }
     return folders;
+}
+
+// The sandbox option value that shows a host folder at the same path.
+std::string _sameBinding(std::string const& folder) {
+    return folder + ":" + folder;
 }
 
 Invocation _parseLogLine(std::string const& line) {
@@ -205,11 +212,11 @@ CommandResult runInSandbox(std::vector<std::string> const& sandboxOptions,
                            std::vector<std::string> const& command) {
     std::vector<std::string> argv{sandboxPath(), "--sim", simulatorPath()};
     for (std::string const& folder : _simulatorFolders()) {
-        argv.push_back("--bind");
-        argv.push_back(folder + ":" + folder);
+        argv.emplace_back("--bind");
+        argv.push_back(_sameBinding(folder));
     }
     argv.insert(argv.end(), sandboxOptions.begin(), sandboxOptions.end());
-    argv.push_back("--");
+    argv.emplace_back("--");
     argv.insert(argv.end(), command.begin(), command.end());
     return runCommand(argv);
 }

@@ -7,10 +7,12 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
 #include <iostream>
+#include <iterator>
 #include <string>
 #include <unistd.h>
 #include <vector>
@@ -41,9 +43,9 @@ int _runInSandbox(int argc, char** argv) {
         args.emplace_back(argv[i]);
     }
     std::vector<char*> execArgs;
-    for (std::string& arg : args) {
-        execArgs.push_back(arg.data());
-    }
+    execArgs.reserve(args.size() + 1);
+    std::transform(args.begin(), args.end(), std::back_inserter(execArgs),
+                   [](std::string& arg) { return arg.data(); });
     execArgs.push_back(nullptr);
     ::setenv("QUORVEX_IN_SANDBOX", "1", 1);
     ::execv(execArgs[0], execArgs.data());
