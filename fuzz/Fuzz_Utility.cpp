@@ -28,7 +28,7 @@ void u_fail(char const* what, std::string const& detail) {
     if (!detail.empty()) {
         std::fprintf(stderr, "  at (%zu bytes): ", detail.size());
         for (char const c : detail.substr(0, gc_ShownLength)) {
-            unsigned char const byte = static_cast<unsigned char>(c);
+            auto const byte = static_cast<unsigned char>(c);
             if (byte >= 0x20 && byte < 0x7F) {
                 std::fputc(byte, stderr);
             } else {
@@ -113,7 +113,7 @@ unsigned long long u_expected_Unsigned(std::string const& text, bool& overflow, 
     unsigned long long value = 0;
     for (; i < text.size() && text[i] >= '0' && text[i] <= '9'; ++i) {
         hasDigits = true;
-        unsigned long long const digit = static_cast<unsigned long long>(text[i] - '0');
+        auto const digit = static_cast<unsigned long long>(text[i] - '0');
         if (value > (largest - digit) / 10) {
             overflow = true;
         }

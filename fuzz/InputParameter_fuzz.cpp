@@ -6,8 +6,10 @@
 
 #include "survey/InputParameter.h"
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <iterator>
 #include <map>
 #include <string>
 #include <vector>
@@ -45,6 +47,8 @@ std::vector<std::string> u_split_Arguments(std::string const& input) {
     return arguments;
 }
 
+// Not const: the map's look-up adds an option it does not hold.
+// cppcheck-suppress constParameter
 void u_check(Utility::InputParameter& parameters, std::vector<std::string> const& arguments,
              std::string const& input) {
     std::map<std::string, std::string> const expected = u_expect_Parameters(arguments);
@@ -71,9 +75,9 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const* data, std::size_t size
         storage.emplace_back(argument.begin(), argument.end());
         storage.back().push_back('\0');
     }
-    for (std::vector<char>& argument : storage) {
-        argv.push_back(argument.data());
-    }
+    argv.reserve(storage.size() + 1);
+    std::transform(storage.begin(), storage.end(), std::back_inserter(argv),
+                   [](std::vector<char>& argument) { return argument.data(); });
     argv.push_back(nullptr);
 
     Utility::InputParameter parameters(static_cast<unsigned int>(arguments.size()), argv.data());

@@ -35,7 +35,8 @@ std::string u_write_File(std::string const& contents) {
 }
 
 void u_check_Entries(std::string const& contents, std::vector<std::string> const& lines) {
-    std::vector<std::string> const added(lines.begin() + gc_EarlierLines.size(), lines.end());
+    std::vector<std::string> const added(
+        lines.begin() + static_cast<std::ptrdiff_t>(gc_EarlierLines.size()), lines.end());
     std::size_t const lineEnds =
         static_cast<std::size_t>(std::count(contents.begin(), contents.end(), '\n'));
     Fuzz_Utility::u_require(!added.empty() && added.size() <= lineEnds + 1,

@@ -72,7 +72,7 @@ QuorvexTest::CommandResult EndToEndScenario::run(std::vector<std::string> const&
     _placeEarlierFiles();
     ConsoleEnvironment const console(_consoleScenario(), probeFile(gc_InvocationLog));
     _first = static_cast<long>(std::time(nullptr));
-    QuorvexTest::CommandResult const result =
+    QuorvexTest::CommandResult result =
         QuorvexTest::runInSandbox(_sandboxOptions(), _command(tool));
     _last = static_cast<long>(std::time(nullptr));
     return result;
@@ -104,8 +104,9 @@ std::string EndToEndScenario::_consoleScenario() const {
 
 void EndToEndScenario::_placeEarlierFiles() const {
     std::string const before = _scenarioFile("before/VPD");
+    std::string const beforePrefix = before + "/";
     for (std::string const& name : SurveyTest_Utility::u_list_Folder(before)) {
-        QuorvexTest::writeFile(_vpdFolder.file(name), QuorvexTest::readFile(before + "/" + name));
+        QuorvexTest::writeFile(_vpdFolder.file(name), QuorvexTest::readFile(beforePrefix + name));
     }
 }
 
@@ -140,8 +141,9 @@ void EndToEndScenario::_expectVPDFolder() const {
     std::vector<std::string> const names = SurveyTest_Utility::u_list_Folder(_vpdFolder.path());
     EXPECT_EQ(names, SurveyTest_Utility::u_list_Folder(expectedFolder))
         << "files in the VPD folder";
+    std::string const expectedPrefix = expectedFolder + "/";
     for (std::string const& name : names) {
-        std::string const expected = u_read_Optional(expectedFolder + "/" + name);
+        std::string const expected = u_read_Optional(expectedPrefix + name);
         EXPECT_EQ(SurveyTest_Utility::u_normalise_TimeStamps(
                       QuorvexTest::readFile(_vpdFolder.file(name)), _first, _last),
                   expected)

@@ -14,7 +14,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <filesystem>
+#include <iterator>
 #include <map>
 #include <sstream>
 #include <string>
@@ -68,9 +70,9 @@ std::map<std::string, std::string> u_package_Contents(std::string const& package
 
 std::vector<std::string> u_paths(std::map<std::string, std::string> const& entries) {
     std::vector<std::string> paths;
-    for (auto const& entry : entries) {
-        paths.push_back(entry.first);
-    }
+    paths.reserve(entries.size());
+    std::transform(entries.begin(), entries.end(), std::back_inserter(paths),
+                   [](auto const& entry) { return entry.first; });
     return paths;
 }
 

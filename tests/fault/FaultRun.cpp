@@ -98,14 +98,14 @@ QuorvexTest::CommandResult FaultRun::run(std::string const& identity) {
          {_toolPlacement(), _resultFolders(), _sandboxOptions}) {
         argv.insert(argv.end(), part.begin(), part.end());
     }
-    argv.push_back("--");
+    argv.emplace_back("--");
     std::vector<std::string> const command = _command(identity);
     argv.insert(argv.end(), command.begin(), command.end());
     // Another run made since may have pointed the simulator elsewhere.
     ::setenv("PYLON_SIM_SCENARIO", _console.scenarioPath().c_str(), 1);
     ::setenv("PYLON_SIM_LOG", _console.logPath().c_str(), 1);
     _first = static_cast<long>(std::time(nullptr));
-    QuorvexTest::CommandResult const result = QuorvexTest::runCommand(argv);
+    QuorvexTest::CommandResult result = QuorvexTest::runCommand(argv);
     _last = static_cast<long>(std::time(nullptr));
     return result;
 }
