@@ -48,7 +48,7 @@ TEST(SandboxHost, OutputOfTheCommandPassesThrough) {
 }
 
 TEST(SandboxHost, NothingAppearsOnTheHost) {
-    std::vector<std::string> const paths = _consolePaths();
+    std::vector<std::string> const& paths = _consolePaths();
     std::vector<std::string> absentBefore;
     std::copy_if(paths.begin(), paths.end(), std::back_inserter(absentBefore),
                  [](std::string const& path) { return !fileExists(path); });
