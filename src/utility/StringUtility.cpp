@@ -8,18 +8,19 @@ int splitString(std::string const& text, std::string const& delimiter,
     if (text.empty() || delimiter.empty()) {
         return 0;
     }
-    std::string rest = text;
-    std::string::size_type const delimiterLength = delimiter.size();
     pieces.clear();
-    std::string::size_type position = rest.find(delimiter);
+    // The search moves along the text instead of cutting its front off, so a
+    // line of many fields is split in linear time.
+    std::string::size_type start = 0;
+    std::string::size_type position = text.find(delimiter, start);
     while (position != std::string::npos) {
-        pieces.push_back(rest.substr(0, position));
-        rest.erase(0, position + delimiterLength);
-        position = rest.find(delimiter);
+        pieces.push_back(text.substr(start, position - start));
+        start = position + delimiter.size();
+        position = text.find(delimiter, start);
     }
     // A trailing delimiter leaves nothing behind and adds no empty piece.
-    if (!rest.empty()) {
-        pieces.push_back(rest);
+    if (start < text.size()) {
+        pieces.push_back(text.substr(start));
     }
     return static_cast<int>(pieces.size());
 }
