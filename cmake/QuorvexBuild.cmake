@@ -18,6 +18,13 @@ if(QUORVEX_FUZZ)
   target_compile_options(quorvex_options INTERFACE -fsanitize=fuzzer-no-link)
 endif()
 
+# Line and branch counting with gcov (gcc); tools/coverage reports it.
+option(QUORVEX_COVERAGE "Instrument everything for gcov line and branch coverage (gcc only)" OFF)
+if(QUORVEX_COVERAGE)
+  target_compile_options(quorvex_options INTERFACE --coverage)
+  target_link_options(quorvex_options INTERFACE --coverage)
+endif()
+
 # Root of the source tree, for tests and tools that need the sandbox runner
 # or the simulated console's scenarios.
 set(QUORVEX_SOURCE_ROOT "${PROJECT_SOURCE_DIR}")
