@@ -141,7 +141,7 @@ std::vector<std::string> FaultRun::leftInTmp() const {
     std::string const runFolder = inTmp.empty() ? "" : inTmp.begin()->string();
     std::vector<std::string> left = _readListing(gc_TmpListing);
     left.erase(std::remove(left.begin(), left.end(), runFolder), left.end());
-    return left;
+    return QuorvexTest::withoutNamesKeptInTmp(left);
 }
 
 std::vector<std::string> FaultRun::quorvexFolders() const {

@@ -70,6 +70,10 @@ TEST_F(FaultInTemporaryFiles, ReadOnlyTmpRunsNoCommandAndFindsNoPartition) {
 }
 
 TEST_F(FaultInTemporaryFiles, TmpWithoutFreeInodeRunsNoCommandAndFindsNoPartition) {
+    if (!QuorvexTest::namesKeptInTmp().empty()) {
+        GTEST_SKIP() << "this checkout lies under /tmp, and a /tmp without a free inode would "
+                        "hide the tool itself";
+    }
     run.setPrelude(gc_TmpWithoutInode);
     expectNoCommandRunAndNoPartitionFound();
 }

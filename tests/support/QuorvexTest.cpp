@@ -120,6 +120,27 @@ std::string sourceRoot() {
     return QUORVEX_SOURCE_ROOT;
 }
 
+std::vector<std::string> namesKeptInTmp() {
+    std::vector<std::string> names;
+    for (std::string const& folder : {sourceRoot(), std::filesystem::current_path().string()}) {
+        std::filesystem::path const inTmp =
+            std::filesystem::weakly_canonical(folder).lexically_relative("/tmp");
+        std::string const first = inTmp.empty() ? "" : inTmp.begin()->string();
+        if (!first.empty() && first != "." && first != ".." &&
+            std::find(names.begin(), names.end(), first) == names.end()) {
+            names.push_back(first);
+        }
+    }
+    return names;
+}
+
+std::vector<std::string> withoutNamesKeptInTmp(std::vector<std::string> names) {
+    for (std::string const& kept : namesKeptInTmp()) {
+        names.erase(std::remove(names.begin(), names.end(), kept), names.end());
+    }
+    return names;
+}
+
 std::string sandboxPath() {
     return sourceRoot() + "/tools/sandbox";
 }

@@ -22,6 +22,13 @@ std::string shippedScenario(std::string const& fileName);
 // True inside the namespace made by tools/sandbox for the test main.
 bool isInsideSandbox();
 
+// The sandbox binds the folders a command needs that lie under /tmp (this
+// checkout, the working folder) into its private /tmp. These are the names
+// such folders have directly in /tmp, empty when the checkout is elsewhere.
+std::vector<std::string> namesKeptInTmp();
+// names without those kept in /tmp by the sandbox.
+std::vector<std::string> withoutNamesKeptInTmp(std::vector<std::string> names);
+
 // A fresh folder under $TMPDIR (or /tmp), removed with all its content when
 // the object goes away.
 class TemporaryDirectory {
