@@ -47,6 +47,18 @@ QuorvexTest::CommandResult runProbeWithHostNameTool(std::string const& scriptBod
     return runProbe({"--bind", script + ":/bin/hostname"});
 }
 
+// Mounts a fresh tmpfs over /tmp with room for exactly one file (the folder
+// itself takes the other inode), then runs "$0" "$1".
+constexpr char gc_OneFileTmpThenRun[] =
+    "mount -t tmpfs -o size=64k,nr_inodes=2,mode=1777 quorvex-one-file-tmp /tmp || exit 125\n"
+    "exec \"$0\" \"$1\"";
+
+// Runs the probe in a sandbox of its own whose /tmp has room for one file.
+QuorvexTest::CommandResult runProbeWithRoomForOneTemporaryFile() {
+    return QuorvexTest::runInSandbox({}, {"/bin/sh", "-c", gc_OneFileTmpThenRun,
+                                          QUORVEX_UTILITY_PROBE, std::string(gc_MarkerFolder)});
+}
+
 // The probe's report of a run in a writable /tmp, with the host name it got.
 std::string reportWithHost(std::string const& host) {
     return "execute 0\n"
@@ -59,6 +71,20 @@ std::string reportWithHost(std::string const& host) {
            host +
            "\n"
            "left 0\n";
+}
+
+// The probe's report when no temporary files could be made for its command,
+// with the number of temporary files left in /tmp.
+std::string refusedRunReport(int leftFiles) {
+    return "execute -1\n"
+           "wasExecuted 0\n"
+           "returnCode 0\n"
+           "stdout 0\n"
+           "stderr 0\n"
+           "marker absent\n"
+           "host ***Unknown***.hostname.\n"
+           "left " +
+           std::to_string(leftFiles) + "\n";
 }
 
 std::string hostName() {
@@ -121,14 +147,16 @@ TEST_F(ShellCommandPrivateTmp, HostNameQueryLeavesNoTemporaryFile) {
 TEST(ShellCommandTmpNotWritable, ExecuteGivesMinusOneAndRunsNothing) {
     QuorvexTest::CommandResult const result = runProbe({"--readonly-tmp"});
     EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
-    EXPECT_EQ(result.stdoutText, "execute -1\n"
-                                 "wasExecuted 0\n"
-                                 "returnCode 0\n"
-                                 "stdout 0\n"
-                                 "stderr 0\n"
-                                 "marker absent\n"
-                                 "host ***Unknown***.hostname.\n"
-                                 "left 0\n");
+    EXPECT_EQ(result.stdoutText, refusedRunReport(0));
+}
+
+// The standard-output file is made but the standard-error file is not: the
+// command is not run, and the file already made stays in /tmp. The host-name
+// query after it finds /tmp full and falls back too.
+TEST(ShellCommandTmpWithRoomForOneFile, ExecuteGivesMinusOneAndLeavesTheFirstFileBehind) {
+    QuorvexTest::CommandResult const result = runProbeWithRoomForOneTemporaryFile();
+    EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
+    EXPECT_EQ(result.stdoutText, refusedRunReport(1));
 }
 
 // The same probe with a writable /tmp runs its command: the marker check in
@@ -167,6 +195,15 @@ TEST(HostNameQuery, ToolPrintingNothingGivesEmptyName) {
 // A non-zero code gives the fallback even when the tool printed a name.
 TEST(HostNameQuery, ToolFailingGivesFallbackName) {
     QuorvexTest::CommandResult const result = runProbeWithHostNameTool("echo console-1\nexit 1\n");
+    EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
+    EXPECT_EQ(result.stdoutText, reportWithHost("***Unknown***.hostname."));
+}
+
+// A tool that ran with code 0 but whose output file is gone by the time it is
+// read has no first line: the fallback is used, never a line that is not there.
+TEST(HostNameQuery, OutputFileRemovedByTheToolGivesFallbackName) {
+    QuorvexTest::CommandResult const result =
+        runProbeWithHostNameTool("echo console-1\nrm -f \"$(readlink /proc/$$/fd/1)\"\n");
     EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
     EXPECT_EQ(result.stdoutText, reportWithHost("***Unknown***.hostname."));
 }
