@@ -27,6 +27,13 @@ TEST(VPD_PropertyGroup, KeyIsTheName) {
     EXPECT_EQ(static_cast<std::string>(group), "Cards");
 }
 
+TEST(VPD_PropertyGroup, DefaultGroupHasAnEmptyNameAndKeyAndNoProperties) {
+    PropertyGroup const group;
+    EXPECT_EQ(group.get_DisplayName(), "");
+    EXPECT_EQ(static_cast<std::string>(group), "");
+    EXPECT_TRUE(group.empty());
+}
+
 TEST(VPD_PropertyGroup, NameAloneMakesAnEmptyGroup) {
     PropertyGroup const group = std::string("Memory");
     EXPECT_EQ(group.get_DisplayName(), "Memory");

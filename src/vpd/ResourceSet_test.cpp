@@ -130,6 +130,19 @@ TEST(VPD_ResourceSet, MergeJoinsSetListsOfTheSameName) {
     EXPECT_EQ(u_lists(set), "[Cards:(a|a|){}(b|b|){}]");
 }
 
+TEST(VPD_ResourceSet, MergeWithASetWithoutListsKeepsTheListsAndStillJoinsTheResource) {
+    ResourceSet set = u_hardwareSet("1");
+    set.set_Resource(Resource("m", "m"));
+    set.insert_ResourceList(u_list("Cards", Resource("a", "a")));
+    ResourceSet other = u_hardwareSet("2");
+    Resource machine("m2", "m");
+    machine.insert_Property(Property("SE", "serial"));
+    other.set_Resource(machine);
+    set += other;
+    EXPECT_EQ(u_resource(set.get_Resource()), "(m|m|){SE=serial;}");
+    EXPECT_EQ(u_lists(set), "[Cards:(a|a|){}]");
+}
+
 TEST(VPD_ResourceSet, CopyIsDeepAndIndependent) {
     ResourceSet set = u_hardwareSet("1");
     Resource machine("m", "m");
