@@ -115,6 +115,22 @@ TEST(InputParameter, NullArgumentVectorGivesNoOption) {
     EXPECT_FALSE(parameters.contains("-c"));
 }
 
+// A count that takes in the closing null pointer of the argument vector: the
+// null entry is neither an option nor a value.
+TEST(InputParameter, ClosingNullEntryAfterAnOptionGivesItAnEmptyValue) {
+    CommandLine line({gc_Program, "-c"});
+    Utility::InputParameter parameters(line.argc() + 1, line.argv());
+    ASSERT_TRUE(parameters.contains("-c"));
+    EXPECT_EQ(parameters["-c"], "");
+}
+
+TEST(InputParameter, ClosingNullEntryAfterAValueIsSkipped) {
+    CommandLine line({gc_Program, "-c", "1234-ABC_10ABCDE"});
+    Utility::InputParameter parameters(line.argc() + 1, line.argv());
+    ASSERT_TRUE(parameters.contains("-c"));
+    EXPECT_EQ(parameters["-c"], "1234-ABC_10ABCDE");
+}
+
 TEST(InputParameter, CopyConstructorYieldsAnEmptyMap) {
     CommandLine line({gc_Program, "-c", "1234-ABC_10ABCDE"});
     Utility::InputParameter const original(line.argc(), line.argv());
