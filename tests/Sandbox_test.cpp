@@ -69,7 +69,8 @@ TEST(Sandbox, TheResultFoldersExistEmptyAndWritable) {
 TEST(Sandbox, TmpIsPrivateAndWritable) {
     EXPECT_TRUE(_isWritableFolder("/tmp"));
     std::vector<std::string> left;
-    std::istringstream listing(runShell("ls -A /tmp | grep -v '^quorvex-test\\.' || true").stdoutText);
+    std::istringstream listing(
+        runShell("ls -A /tmp | grep -v '^quorvex-test\\.' || true").stdoutText);
     for (std::string name; std::getline(listing, name);) {
         left.push_back(name);
     }
