@@ -154,6 +154,10 @@ TEST(ShellCommandTmpNotWritable, ExecuteGivesMinusOneAndRunsNothing) {
 // command is not run, and the file already made stays in /tmp. The host-name
 // query after it finds /tmp full and falls back too.
 TEST(ShellCommandTmpWithRoomForOneFile, ExecuteGivesMinusOneAndLeavesTheFirstFileBehind) {
+    if (!QuorvexTest::namesKeptInTmp().empty()) {
+        GTEST_SKIP() << "this checkout lies under /tmp, and a /tmp with room for one file "
+                        "would hide the probe itself";
+    }
     QuorvexTest::CommandResult const result = runProbeWithRoomForOneTemporaryFile();
     EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
     EXPECT_EQ(result.stdoutText, refusedRunReport(1));
