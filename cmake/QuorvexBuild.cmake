@@ -67,3 +67,5 @@ function(quorvex_add_gtest name)
   endif()
   gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60 PROPERTIES ${properties})
 endfunction()
+
+include(${CMAKE_CURRENT_LIST_DIR}/ValgrindTest.cmake)

@@ -95,8 +95,12 @@ void ScenarioParser::_parseLine(std::string const& line) {
     std::size_t const separator = line.find_first_of(" \t");
     std::string const key = line.substr(0, separator);
     std::string const value = separator == std::string::npos ? "" : line.substr(separator + 1);
-    if (key == "exit" || key == "delay") {
-        _parseSetting(key, value);
+    if (key == "exit") {
+        _parseExitCode(value);
+        return;
+    }
+    if (key == "delay") {
+        _parseDelay(value);
         return;
     }
     _parseText(key, value);
@@ -138,24 +142,27 @@ void ScenarioParser::_closeSection() {
     _keysSeen.clear();
 }
 
-void ScenarioParser::_parseSetting(std::string const& key, std::string const& value) {
-    _requireOnce(key);
+void ScenarioParser::_parseExitCode(std::string const& value) {
+    _requireOnce("exit");
+    if (_tool.empty()) {
+        _fail("\"exit\" must follow a section header");
+    }
     std::string const text = _trimmed(value);
-    char const* begin = text.c_str();
     char* end = nullptr;
     errno = 0;
-    if (key == "exit") {
-        if (_tool.empty()) {
-            _fail("\"exit\" must follow a section header");
-        }
-        long const code = std::strtol(begin, &end, 10);
-        if (text.empty() || *end != '\0' || errno != 0 || code < 0 || code > gc_MaximumExitCode) {
-            _fail("exit code must be a whole number from 0 to 255, not \"" + text + "\"");
-        }
-        _response.exitCode = static_cast<int>(code);
-        return;
+    long const code = std::strtol(text.c_str(), &end, 10);
+    if (text.empty() || *end != '\0' || errno != 0 || code < 0 || code > gc_MaximumExitCode) {
+        _fail("exit code must be a whole number from 0 to 255, not \"" + text + "\"");
     }
-    double const seconds = std::strtod(begin, &end);
+    _response.exitCode = static_cast<int>(code);
+}
+
+// Before the first section header the delay applies to every section.
+void ScenarioParser::_parseDelay(std::string const& value) {
+    _requireOnce("delay");
+    std::string const text = _trimmed(value);
+    char* end = nullptr;
+    double const seconds = std::strtod(text.c_str(), &end);
     if (text.empty() || *end != '\0' || !std::isfinite(seconds) || seconds < 0.0 ||
         seconds > gc_MaximumDelay || text.find_first_of("xXnN") != std::string::npos) {
         _fail("delay must be a number of seconds from 0 to 3600, not \"" + text + "\"");

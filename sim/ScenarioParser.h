@@ -24,7 +24,8 @@ private:
     void _parseLine(std::string const& line);
     void _openSection(std::string const& line);
     void _closeSection();
-    void _parseSetting(std::string const& key, std::string const& value);
+    void _parseExitCode(std::string const& value);
+    void _parseDelay(std::string const& value);
     void _parseText(std::string const& key, std::string const& value);
     void _requireOnce(std::string const& key);
     std::string _readBlock(std::string const& terminator);

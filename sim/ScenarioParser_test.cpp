@@ -167,9 +167,9 @@ TEST_F(ScenarioFile, UnknownTextFormIsRejected) {
 }
 
 TEST_F(ScenarioFile, UnknownSectionIsRejected) {
-    ScenarioError const error = errorOf("\n[lshmc]\n");
+    ScenarioError const error = errorOf("\n[lsfoo]\n");
     EXPECT_EQ(2u, error.line);
-    EXPECT_EQ("unknown section \"lshmc\" (expected lsvtc, lspartition, runCmdOnPartition, "
+    EXPECT_EQ("unknown section \"lsfoo\" (expected lsvtc, lspartition, runCmdOnPartition, "
               "getFileFromPartition "
               "or putFileToPartition)",
               error.problem);

@@ -2,8 +2,6 @@
 
 #include "pylon/ListOf_Machines.h"
 
-#include "pylon/PylonTest_Utility.h"
-
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
@@ -12,8 +10,8 @@
 #include <string>
 #include <vector>
 
-using PylonTest_Utility::u_describe;
 using Quorvex::PYLON::ListOf_Machines;
+using QuorvexTest::describe;
 using QuorvexTest::SimulatedConsole;
 using Strings = std::vector<std::string>;
 
@@ -22,7 +20,7 @@ namespace {
 // The machines as the console of the scenario lists them.
 Strings machinesWith(std::string const& scenario) {
     SimulatedConsole const console(scenario);
-    return u_describe(ListOf_Machines());
+    return describe(ListOf_Machines());
 }
 
 // The machines parsed from one listing line printed by the console.
@@ -40,8 +38,8 @@ TEST(ListOf_Machines, RunsTheListingToolOnceWithOptionT0) {
 
 TEST(ListOf_Machines, CommandLineIsExactlyTheListingToolWithT0) {
     SimulatedConsole const console("[lsvtc]\nstdout 0:1234-ABC_10ABCDE;\n");
-    Strings const commandLines = PylonTest_Utility::u_tracedCommandLines(
-        "machines.Trace", [] { ListOf_Machines const machines; });
+    Strings const commandLines =
+        QuorvexTest::tracedCommandLines("machines.Trace", [] { ListOf_Machines const machines; });
     EXPECT_EQ(commandLines, Strings{"/opt/lsvtc/bin/lsvtc -t0 > /tmp/ShellCommand.XXXXXX"
                                     " 2> /tmp/ShellCommand.XXXXXX"});
 }
@@ -83,9 +81,9 @@ TEST(ListOf_Machines, MachineNameSplitsAtLastUnderscore) {
 TEST(ListOf_Machines, SortingOrdersByObjectTypeThenIdentity) {
     SimulatedConsole const console("[lsvtc]\nstdout 1:B_1;0:Z_9;0:A_2\n");
     ListOf_Machines machines;
-    EXPECT_EQ(u_describe(machines), (Strings{"1|B|1", "0|Z|9", "0|A|2"}));
+    EXPECT_EQ(describe(machines), (Strings{"1|B|1", "0|Z|9", "0|A|2"}));
     std::sort(machines.begin(), machines.end());
-    EXPECT_EQ(u_describe(machines), (Strings{"0|A|2", "0|Z|9", "1|B|1"}));
+    EXPECT_EQ(describe(machines), (Strings{"0|A|2", "0|Z|9", "1|B|1"}));
 }
 
 TEST(ListOf_Machines, ConsolePrefixIsCleanedFromBothParts) {
@@ -127,10 +125,10 @@ TEST(ListOf_Machines, FailingToolWithoutOutputGivesEmptyList) {
 
 TEST(ListOf_Machines, CommandThatCannotRunGivesEmptyList) {
     SimulatedConsole const console("[lsvtc]\nstdout 0:1234-ABC_10ABCDE;\n");
-    EXPECT_EXIT(PylonTest_Utility::u_exitWithReadOnlyTmp([] { return ListOf_Machines().empty(); }),
-                ::testing::ExitedWithCode(0), "");
+    EXPECT_EQ(QuorvexTest::checkWithReadOnlyTmp([] { return ListOf_Machines().empty(); }),
+              QuorvexTest::gc_CheckHeld);
     // The same console answers once /tmp is writable.
-    EXPECT_EQ(u_describe(ListOf_Machines()), Strings{"0|1234-ABC|10ABCDE"});
+    EXPECT_EQ(describe(ListOf_Machines()), Strings{"0|1234-ABC|10ABCDE"});
 }
 
 TEST(ListOf_Machines, LastLineWithoutLineEndIsRead) {
@@ -191,6 +189,6 @@ TEST(ListOf_Machines, CopyKeepsTheMachines) {
     ListOf_Machines const original;
     // NOLINTNEXTLINE(performance-unnecessary-copy-initialization): the copy is under test
     ListOf_Machines const copy(original);
-    EXPECT_EQ(u_describe(copy), (Strings{"0|A-1|S", "2|B-2|T"}));
+    EXPECT_EQ(describe(copy), (Strings{"0|A-1|S", "2|B-2|T"}));
     EXPECT_EQ(console.invocations().size(), 1U);
 }

@@ -2,8 +2,6 @@
 
 #include "pylon/ListOf_Partitions.h"
 
-#include "pylon/PylonTest_Utility.h"
-
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
@@ -11,10 +9,10 @@
 #include <string>
 #include <vector>
 
-using PylonTest_Utility::u_describe;
 using Quorvex::PYLON::ListOf_Partitions;
 using Quorvex::PYLON::Machine;
 using Quorvex::System::MTMS;
+using QuorvexTest::describe;
 using QuorvexTest::SimulatedConsole;
 using Strings = std::vector<std::string>;
 
@@ -29,7 +27,7 @@ Strings partitionsWith(std::string const& scenario) {
     SimulatedConsole const console(scenario);
     ListOf_Partitions partitions;
     partitions.getPartitions_FromMachine(machine());
-    return u_describe(partitions);
+    return describe(partitions);
 }
 
 // The partitions parsed from one listing line printed for machine().
@@ -65,7 +63,7 @@ TEST(ListOf_Partitions, RunsThePartitionToolForTheMachineIdentity) {
 
 TEST(ListOf_Partitions, CommandLineIsExactlyThePartitionToolWithTheMachineIdentity) {
     SimulatedConsole const console("[lspartition *]\n");
-    Strings const commandLines = PylonTest_Utility::u_tracedCommandLines("partitions.Trace", [] {
+    Strings const commandLines = QuorvexTest::tracedCommandLines("partitions.Trace", [] {
         ListOf_Partitions partitions;
         partitions.getPartitions_FromMachine(machine());
     });
@@ -123,7 +121,7 @@ TEST(ListOf_Partitions, PartitionsOfAMachineAreAppendedToTheList) {
     ListOf_Partitions partitions;
     partitions.getPartitions_FromMachine(machine());
     partitions.getPartitions_FromMachine(Machine(0U, MTMS("5678-DEF", "65XYZ12")));
-    EXPECT_EQ(u_describe(partitions),
+    EXPECT_EQ(describe(partitions),
               (Strings{"1234-ABC_10ABCDE|1|a||||", "5678-DEF_65XYZ12|2|b||||"}));
 }
 
@@ -151,16 +149,16 @@ TEST(ListOf_Partitions, FailingToolWithoutOutputAppendsNothing) {
 
 TEST(ListOf_Partitions, CommandThatCannotRunAppendsNothing) {
     SimulatedConsole const console("[lspartition *]\nstdout 1,a;\n");
-    EXPECT_EXIT(PylonTest_Utility::u_exitWithReadOnlyTmp([] {
-                    ListOf_Partitions partitions;
-                    partitions.getPartitions_FromMachine(machine());
-                    return partitions.empty();
-                }),
-                ::testing::ExitedWithCode(0), "");
+    EXPECT_EQ(QuorvexTest::checkWithReadOnlyTmp([] {
+                  ListOf_Partitions partitions;
+                  partitions.getPartitions_FromMachine(machine());
+                  return partitions.empty();
+              }),
+              QuorvexTest::gc_CheckHeld);
     // The same console answers once /tmp is writable.
     ListOf_Partitions partitions;
     partitions.getPartitions_FromMachine(machine());
-    EXPECT_EQ(u_describe(partitions), Strings{"1234-ABC_10ABCDE|1|a||||"});
+    EXPECT_EQ(describe(partitions), Strings{"1234-ABC_10ABCDE|1|a||||"});
 }
 
 TEST(ListOf_Partitions, OddRecordsAreTakenAsFarAsTheyGo) {
@@ -194,5 +192,5 @@ TEST(ListOf_Partitions, CopyKeepsTheRecords) {
     ListOf_Partitions original;
     original.push_back(::Quorvex::System::Partition(MTMS("1234-ABC", "10ABCDE"), "3", "h3"));
     ListOf_Partitions const copy(original);
-    EXPECT_EQ(u_describe(copy), Strings{"1234-ABC_10ABCDE|3|||h3||"});
+    EXPECT_EQ(describe(copy), Strings{"1234-ABC_10ABCDE|3|||h3||"});
 }

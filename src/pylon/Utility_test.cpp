@@ -2,8 +2,6 @@
 
 #include "pylon/Utility.h"
 
-#include "pylon/PylonTest_Utility.h"
-
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
@@ -12,11 +10,11 @@
 #include <string>
 #include <vector>
 
-using PylonTest_Utility::u_describe;
 using Quorvex::PYLON::ListOf_Partitions;
 using Quorvex::PYLON::Utility::get_AllManagedPartitions;
 using Quorvex::System::MTMS;
 using Quorvex::System::Partition;
+using QuorvexTest::describe;
 using QuorvexTest::Invocation;
 using QuorvexTest::SimulatedConsole;
 using Strings = std::vector<std::string>;
@@ -50,10 +48,10 @@ TEST(PYLON_Utility, AllManagedPartitionsAreListedSortedAndCounted) {
     SimulatedConsole const console(gc_Console);
     ListOf_Partitions partitions;
     EXPECT_EQ(get_AllManagedPartitions(partitions), 4);
-    EXPECT_EQ(u_describe(partitions), (Strings{"1234-ABC_10ABCDE|10|10.1.1.20|0|host10|Linux|2.6",
-                                               "1234-ABC_10ABCDE|9|10.1.1.19|1|host9|Zeph|5.3",
-                                               "5678-DEF_65XYZ12|1|10.2.2.1|1|a|Zeph|7.1",
-                                               "5678-DEF_65XYZ12|2|10.2.2.2|1|b|Zeph|7.1"}));
+    EXPECT_EQ(describe(partitions), (Strings{"1234-ABC_10ABCDE|10|10.1.1.20|0|host10|Linux|2.6",
+                                             "1234-ABC_10ABCDE|9|10.1.1.19|1|host9|Zeph|5.3",
+                                             "5678-DEF_65XYZ12|1|10.2.2.1|1|a|Zeph|7.1",
+                                             "5678-DEF_65XYZ12|2|10.2.2.2|1|b|Zeph|7.1"}));
 }
 
 TEST(PYLON_Utility, MachinesAreListedFirstThenPartitionedMachinesInSortedOrder) {
@@ -68,7 +66,7 @@ TEST(PYLON_Utility, MachinesAreListedFirstThenPartitionedMachinesInSortedOrder) 
 
 TEST(PYLON_Utility, CommandLinesAreExact) {
     SimulatedConsole const console(gc_Console);
-    Strings const commandLines = PylonTest_Utility::u_tracedCommandLines("all.Trace", [] {
+    Strings const commandLines = QuorvexTest::tracedCommandLines("all.Trace", [] {
         ListOf_Partitions partitions;
         get_AllManagedPartitions(partitions);
     });
@@ -117,7 +115,7 @@ TEST(PYLON_Utility, MachineWhosePartitionToolFailsContributesNothing) {
                                    "[lspartition 5678-DEF_65XYZ12]\nstdout 4,10.2.2.4;\n");
     ListOf_Partitions partitions;
     EXPECT_EQ(get_AllManagedPartitions(partitions), 1);
-    EXPECT_EQ(u_describe(partitions), Strings{"5678-DEF_65XYZ12|4|10.2.2.4||||"});
+    EXPECT_EQ(describe(partitions), Strings{"5678-DEF_65XYZ12|4|10.2.2.4||||"});
 }
 
 TEST(PYLON_Utility, ObjectTypeThatWrapsToZeroIsListedAndMinusOneIsNot) {

@@ -4,7 +4,8 @@
 #include "relay/Base.h"
 
 #include "relay/PutFileToPartition.h"
-#include "relay/RELAY_RunTest_Utility.h"
+
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -15,12 +16,12 @@ using Quorvex::RELAY::Base;
 using Quorvex::RELAY::cBlankReturnCode;
 using Quorvex::RELAY::ReturnCode;
 using Quorvex::RELAY::TargetPartition;
-using Quorvex::RELAY::u_expected_TraceBlock;
-using Quorvex::RELAY::u_make_TestPartition;
+using QuorvexTest::examplePartition;
+using QuorvexTest::expectedTraceBlock;
 using QuorvexTest::Invocation;
 using QuorvexTest::SimulatedConsole;
 
-using Base_Run = Quorvex::RELAY::RemoteActionRun;
+using Base_Run = QuorvexTest::TracedTest;
 
 namespace {
 
@@ -33,7 +34,7 @@ std::string const gc_RunCommandPrefix =
 
 // A Base that runs "runCmdOnPartition" on partition 3.
 Base runBase() {
-    Base base{TargetPartition(u_make_TestPartition())};
+    Base base{TargetPartition(examplePartition())};
     base.set_Action("runCmdOnPartition");
     return base;
 }
@@ -42,7 +43,7 @@ Base runBase() {
 
 TEST_F(Base_Run, CompletePutCommandLineIsExecutedByteForByte) {
     SimulatedConsole const console("[putFileToPartition 3]\nstdout " + gc_DoneLine + "\n");
-    Base base{TargetPartition(u_make_TestPartition())};
+    Base base{TargetPartition(examplePartition())};
     base.set_Action("putFileToPartition");
     base.get_TargetPartition().use_PartitionArray();
 
@@ -50,8 +51,8 @@ TEST_F(Base_Run, CompletePutCommandLineIsExecutedByteForByte) {
         Quorvex::RELAY::PutFileToPartition::createString_PutFileParameters("/tmp/quorvex.tar"));
 
     EXPECT_EQ(exitCode, 0);
-    EXPECT_EQ(_trace.get_Text(),
-              u_expected_TraceBlock(
+    EXPECT_EQ(_trace.text(),
+              expectedTraceBlock(
                   "/usr/bin/runact-api -c ZOR.ServiceEvent::::putFileToPartition::CallerID::0::"
                   "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionArray::{\"3\"}::"
                   "LocalFN::\"/tmp/quorvex.tar\"::RemoteFN::\"/tmp/quorvex.tar\"::"
@@ -70,8 +71,8 @@ TEST_F(Base_Run, EmptyParametersAppendNothingToTheCommandLine) {
     SimulatedConsole const console("[runCmdOnPartition 3]\nstdout " + gc_DoneLine + "\n");
     Base base = runBase();
     EXPECT_EQ(base.execute(""), 0);
-    EXPECT_EQ(_trace.get_Text(),
-              u_expected_TraceBlock(gc_RunCommandPrefix, 0, gc_DoneLine + "\n\n", "\n"));
+    EXPECT_EQ(_trace.text(),
+              expectedTraceBlock(gc_RunCommandPrefix, 0, gc_DoneLine + "\n\n", "\n"));
     EXPECT_EQ(console.invocations(),
               (std::vector<Invocation>{{"runact-api", "-c",
                                         "ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::"
@@ -80,7 +81,7 @@ TEST_F(Base_Run, EmptyParametersAppendNothingToTheCommandLine) {
 
 TEST_F(Base_Run, UnsetActionIsSentAsErrorNoAction) {
     SimulatedConsole const console("");
-    Base base{TargetPartition(u_make_TestPartition())};
+    Base base{TargetPartition(examplePartition())};
     EXPECT_EQ(base.execute("x::\"1\""), 3);
     ASSERT_EQ(console.invocations().size(), 1u);
     EXPECT_EQ(console.invocations()[0][2],
@@ -110,10 +111,9 @@ TEST_F(Base_Run, NonZeroExitLeavesOutputEmptyButParsesTheLines) {
                                    "exit 1\n");
     Base base = runBase();
     EXPECT_EQ(base.execute("CmdID::0"), 1);
-    EXPECT_EQ(_trace.get_Text(),
-              u_expected_TraceBlock(gc_RunCommandPrefix + "::CmdID::0", 1,
-                                    "Rc::1::RcCmd::0::RetStr1::timeout::RetStr2::\n\n",
-                                    "partition not reachable\n\n"));
+    EXPECT_EQ(_trace.text(), expectedTraceBlock(gc_RunCommandPrefix + "::CmdID::0", 1,
+                                                "Rc::1::RcCmd::0::RetStr1::timeout::RetStr2::\n\n",
+                                                "partition not reachable\n\n"));
     EXPECT_TRUE(base.get_Output().empty());
     ASSERT_EQ(base.get_ListOf_ReturnCodes().size(), 1u);
     EXPECT_EQ(base.get_ReturnCode().get_Rc(), 1);
@@ -139,7 +139,7 @@ TEST_F(Base_Run, NoOutputAtAllGivesTheBlankReturnCode) {
     SimulatedConsole const console("[runCmdOnPartition 3]\nexit 1\n");
     Base base = runBase();
     EXPECT_EQ(base.execute(""), 1);
-    EXPECT_EQ(_trace.get_Text(), u_expected_TraceBlock(gc_RunCommandPrefix, 1, "\n", "\n"));
+    EXPECT_EQ(_trace.text(), expectedTraceBlock(gc_RunCommandPrefix, 1, "\n", "\n"));
     EXPECT_TRUE(base.get_ListOf_ReturnCodes().empty());
     EXPECT_EQ(&base.get_ReturnCode(), &cBlankReturnCode);
     EXPECT_EQ(base.get_ReturnCode().get_Rc(), -1);

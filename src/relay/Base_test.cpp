@@ -1,24 +1,25 @@
 #include "relay/Base.h"
 
 #include "relay/PutFileToPartition.h"
-#include "relay/RELAY_Test_Utility.h"
+
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
 using Quorvex::RELAY::Base;
 using Quorvex::RELAY::cBlankReturnCode;
 using Quorvex::RELAY::TargetPartition;
-using Quorvex::RELAY::u_make_TestPartition;
+using QuorvexTest::examplePartition;
 
 TEST(Base, UnsetActionGivesErrorNoActionInTheCommandLine) {
-    Base const base{TargetPartition(u_make_TestPartition())};
+    Base const base{TargetPartition(examplePartition())};
     EXPECT_EQ(base.createString_Command(),
               "/usr/bin/runact-api -c ZOR.ServiceEvent::::ERROR_NO_ACTION::CallerID::0::"
               "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionId::\"3\"");
 }
 
 TEST(Base, ClassNameIsFollowedByFourColonsThenTheAction) {
-    Base base{TargetPartition(u_make_TestPartition())};
+    Base base{TargetPartition(examplePartition())};
     base.set_Action("runCmdOnPartition");
     std::string const command = base.createString_Command();
     EXPECT_EQ(command.rfind(
@@ -34,7 +35,7 @@ TEST(Base, DefaultConstructedAddressesAnEmptyPartition) {
 }
 
 TEST(Base, TargetIsReachableForChangingTheAddressingMode) {
-    Base base{TargetPartition(u_make_TestPartition())};
+    Base base{TargetPartition(examplePartition())};
     base.get_TargetPartition().use_PartitionArray();
     EXPECT_EQ(base.createString_Command(),
               "/usr/bin/runact-api -c ZOR.ServiceEvent::::ERROR_NO_ACTION::CallerID::0::"
@@ -42,7 +43,7 @@ TEST(Base, TargetIsReachableForChangingTheAddressingMode) {
 }
 
 TEST(Base, CompletePutCommandLineIsBuiltByteForByte) {
-    Base base{TargetPartition(u_make_TestPartition())};
+    Base base{TargetPartition(examplePartition())};
     base.set_Action("putFileToPartition");
     base.get_TargetPartition().use_PartitionArray();
     std::string const line =

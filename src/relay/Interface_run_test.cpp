@@ -4,8 +4,9 @@
 
 #include "relay/Interface.h"
 
-#include "relay/RELAY_RunTest_Utility.h"
 #include "relay/RELAY_Utility.h"
+
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -19,12 +20,12 @@ using Quorvex::RELAY::PutFileToPartition;
 using Quorvex::RELAY::ReturnCode;
 using Quorvex::RELAY::RunCommandOnPartition;
 using Quorvex::RELAY::TargetPartition;
-using Quorvex::RELAY::u_expected_TraceBlock;
-using Quorvex::RELAY::u_make_TestPartition;
+using QuorvexTest::examplePartition;
+using QuorvexTest::expectedTraceBlock;
 using QuorvexTest::Invocation;
 using QuorvexTest::SimulatedConsole;
 
-using Interface_Run = Quorvex::RELAY::RemoteActionRun;
+using Interface_Run = QuorvexTest::TracedTest;
 
 namespace {
 
@@ -39,7 +40,7 @@ std::string const gc_Machine = R"(CecMT::"1234-ABC"::CecMS::"10ABCDE"::)";
 std::string const gc_ClientAttributes = "FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=system";
 
 TargetPartition testTarget() {
-    return TargetPartition(u_make_TestPartition());
+    return TargetPartition(examplePartition());
 }
 
 // The argument runact-api received for its action text ("-c" is the first).
@@ -74,15 +75,15 @@ TEST_F(Interface_Run, PutSendsItsParameterTextByteForByte) {
     Interface iface{testTarget()};
     EXPECT_EQ(iface.putFileToPartition("/tmp/quorvex.tar"), 0);
     EXPECT_EQ(
-        _trace.get_Text(),
-        u_expected_TraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::putFileToPartition::"
-                              "CallerID::0::" +
-                                  gc_Machine +
-                                  "PartitionArray::{\"3\"}::"
-                                  "LocalFN::\"/tmp/quorvex.tar\"::RemoteFN::\"/tmp/quorvex.tar\"::"
-                                  "RemoteFileInfo::\"" +
-                                  gc_ClientAttributes + "\"",
-                              0, gc_DoneLine + "\n\n", "\n"));
+        _trace.text(),
+        expectedTraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::putFileToPartition::"
+                           "CallerID::0::" +
+                               gc_Machine +
+                               "PartitionArray::{\"3\"}::"
+                               "LocalFN::\"/tmp/quorvex.tar\"::RemoteFN::\"/tmp/quorvex.tar\"::"
+                               "RemoteFileInfo::\"" +
+                               gc_ClientAttributes + "\"",
+                           0, gc_DoneLine + "\n\n", "\n"));
     EXPECT_EQ(
         actionArgument(console, 0),
         "ZOR.ServiceEvent::::putFileToPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
@@ -95,17 +96,16 @@ TEST_F(Interface_Run, ClientSurveySendsItsParameterTextByteForByte) {
     SimulatedConsole const console(gc_AllDone);
     Interface iface{testTarget()};
     EXPECT_EQ(iface.execute_PartitionQuorvex("", "/tmp/quorvex.out"), 0);
-    EXPECT_EQ(
-        _trace.get_Text(),
-        u_expected_TraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::runCmdOnPartition::"
-                              "CallerID::0::" +
-                                  gc_Machine +
-                                  "PartitionId::\"3\"::"
-                                  "CmdID::0::CmdOpts::\" -c 1234-ABC_10ABCDE -pylonv 4.0.11\"::"
-                                  "RemoteFN::\"/tmp/quorvex.out\"::"
-                                  "RemoteFileInfo::\"" +
-                                  gc_ClientAttributes + "\"",
-                              0, gc_DoneLine + "\n\n", "\n"));
+    EXPECT_EQ(_trace.text(),
+              expectedTraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::runCmdOnPartition::"
+                                 "CallerID::0::" +
+                                     gc_Machine +
+                                     "PartitionId::\"3\"::"
+                                     "CmdID::0::CmdOpts::\" -c 1234-ABC_10ABCDE -pylonv 4.0.11\"::"
+                                     "RemoteFN::\"/tmp/quorvex.out\"::"
+                                     "RemoteFileInfo::\"" +
+                                     gc_ClientAttributes + "\"",
+                                 0, gc_DoneLine + "\n\n", "\n"));
     EXPECT_EQ(
         console.invocations(),
         (std::vector<Invocation>{
@@ -120,8 +120,8 @@ TEST_F(Interface_Run, GetSendsItsParameterTextByteForByte) {
     SimulatedConsole const console(gc_AllDone);
     Interface iface{testTarget()};
     EXPECT_EQ(iface.getFileFromPartition("/tmp/quorvex.out", "/var/tmp/p3.out"), 0);
-    EXPECT_EQ(_trace.get_Text(),
-              u_expected_TraceBlock(
+    EXPECT_EQ(_trace.text(),
+              expectedTraceBlock(
                   "/usr/bin/runact-api -c ZOR.ServiceEvent::::getFileFromPartition::"
                   "CallerID::0::" +
                       gc_Machine +
@@ -158,12 +158,12 @@ TEST_F(Interface_Run, FetchedDocumentLandsWhereTheConsolePutsIt) {
 
 TEST_F(Interface_Run, ClientOptionsNamingTheMachineGetOnlyTheVersion) {
     EXPECT_EQ(clientOptionsSentFor("-c X"), "-c X -pylonv 4.0.11");
-    EXPECT_NE(_trace.get_Text().find("::CmdOpts::\"-c X -pylonv 4.0.11\"::"), std::string::npos);
+    EXPECT_NE(_trace.text().find("::CmdOpts::\"-c X -pylonv 4.0.11\"::"), std::string::npos);
 }
 
 TEST_F(Interface_Run, ClientOptionsNamingTheVersionGetOnlyTheMachine) {
     EXPECT_EQ(clientOptionsSentFor("-pylonv 5"), "-pylonv 5 -c 1234-ABC_10ABCDE");
-    EXPECT_NE(_trace.get_Text().find("::CmdOpts::\"-pylonv 5 -c 1234-ABC_10ABCDE\"::"),
+    EXPECT_NE(_trace.text().find("::CmdOpts::\"-pylonv 5 -c 1234-ABC_10ABCDE\"::"),
               std::string::npos);
 }
 
@@ -181,15 +181,15 @@ TEST_F(Interface_Run, RunWithMinusOneAndEmptyOptionsWritesThemAsTheyAre) {
     FileInfo info("/tmp/r.out", "", "", "");
     Quorvex::RELAY::RELAY_Utility::set_Default_Client_FileInfo(info);
     EXPECT_EQ(iface.runCommandOnPartition(-1, "", info), 0);
-    EXPECT_EQ(_trace.get_Text(),
-              u_expected_TraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::runCmdOnPartition::"
-                                    "CallerID::0::" +
-                                        gc_Machine +
-                                        "PartitionId::\"3\"::"
-                                        "CmdID::-1::CmdOpts::\"\"::RemoteFN::\"/tmp/r.out\"::"
-                                        "RemoteFileInfo::\"" +
-                                        gc_ClientAttributes + "\"",
-                                    0, gc_DoneLine + "\n\n", "\n"));
+    EXPECT_EQ(_trace.text(),
+              expectedTraceBlock("/usr/bin/runact-api -c ZOR.ServiceEvent::::runCmdOnPartition::"
+                                 "CallerID::0::" +
+                                     gc_Machine +
+                                     "PartitionId::\"3\"::"
+                                     "CmdID::-1::CmdOpts::\"\"::RemoteFN::\"/tmp/r.out\"::"
+                                     "RemoteFileInfo::\"" +
+                                     gc_ClientAttributes + "\"",
+                                 0, gc_DoneLine + "\n\n", "\n"));
     EXPECT_EQ(
         actionArgument(console, 0),
         "ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::CecMT::1234-ABC::CecMS::10ABCDE::"
@@ -284,7 +284,7 @@ TEST_F(Interface_Run, ValueWithQuotesAndDoubleColonsIsPassedUnescaped) {
     SimulatedConsole const console(gc_AllDone);
     Interface iface{testTarget()};
     EXPECT_EQ(iface.getFileFromPartition("/tmp/a\"b::c\"d", "p3.out"), 0);
-    EXPECT_NE(_trace.get_Text().find("::RemoteFN::\"/tmp/a\"b::c\"d\"::LocalFN::\"p3.out\"::"),
+    EXPECT_NE(_trace.text().find("::RemoteFN::\"/tmp/a\"b::c\"d\"::LocalFN::\"p3.out\"::"),
               std::string::npos);
     // The shell took the quotes as its own: the console sees the text without them.
     EXPECT_NE(actionArgument(console, 0).find("::RemoteFN::/tmp/ab::cd::LocalFN::p3.out::"),
@@ -299,6 +299,6 @@ TEST_F(Interface_Run, LoneDoubleQuoteBreaksTheShellLineWithoutACrash) {
     EXPECT_TRUE(console.invocations().empty());
     EXPECT_TRUE(iface.get_Output().empty());
     EXPECT_EQ(iface.get_ReturnCode().get_Rc(), -1);
-    EXPECT_NE(_trace.get_Text().find("::RemoteFN::\"/tmp/a\"b\"::LocalFN::\"p3.out\"::"),
+    EXPECT_NE(_trace.text().find("::RemoteFN::\"/tmp/a\"b\"::LocalFN::\"p3.out\"::"),
               std::string::npos);
 }

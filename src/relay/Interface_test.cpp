@@ -1,6 +1,6 @@
 #include "relay/Interface.h"
 
-#include "relay/RELAY_Test_Utility.h"
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -12,7 +12,7 @@ using Quorvex::RELAY::Interface;
 using Quorvex::RELAY::PutFileToPartition;
 using Quorvex::RELAY::RunCommandOnPartition;
 using Quorvex::RELAY::TargetPartition;
-using Quorvex::RELAY::u_make_TestPartition;
+using QuorvexTest::examplePartition;
 
 namespace {
 
@@ -23,7 +23,7 @@ std::string const gc_TargetCommand =
 } // namespace
 
 TEST(Interface, AllThreeOperationsReachTheSameBaseSubobject) {
-    Interface iface{TargetPartition(u_make_TestPartition())};
+    Interface iface{TargetPartition(examplePartition())};
     // The conversion to Base compiles only when there is exactly one Base.
     Base* const direct = &iface;
     Base* const viaGet = static_cast<GetFileFromPartition*>(&iface);
@@ -48,19 +48,19 @@ TEST(Interface, DerivesFromTheThreeOperationsAndHasNoVirtualFunctions) {
 }
 
 TEST(Interface, SharedBaseIsBuiltWithTheGivenTarget) {
-    Interface const iface{TargetPartition(u_make_TestPartition())};
+    Interface const iface{TargetPartition(examplePartition())};
     EXPECT_EQ(iface.createString_Command(), gc_TargetCommand);
 }
 
 TEST(Interface, EachOperationStandingAloneIsBuiltWithTheGivenTarget) {
-    TargetPartition const target(u_make_TestPartition());
+    TargetPartition const target(examplePartition());
     EXPECT_EQ(GetFileFromPartition(target).createString_Command(), gc_TargetCommand);
     EXPECT_EQ(PutFileToPartition(target).createString_Command(), gc_TargetCommand);
     EXPECT_EQ(RunCommandOnPartition(target).createString_Command(), gc_TargetCommand);
 }
 
 TEST(Interface, ChangesThroughOneOperationAreSeenThroughTheOthers) {
-    Interface iface{TargetPartition(u_make_TestPartition())};
+    Interface iface{TargetPartition(examplePartition())};
     static_cast<PutFileToPartition&>(iface).set_Action("putFileToPartition");
     static_cast<PutFileToPartition&>(iface).get_TargetPartition().use_PartitionArray();
     std::string const expected =

@@ -1,7 +1,8 @@
 #include "relay/RunCommandOnPartition.h"
 
-#include "relay/RELAY_Test_Utility.h"
 #include "relay/RELAY_Utility.h"
+
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -47,8 +48,7 @@ namespace {
 
 // The client survey options as completed for partition 3 of 1234-ABC_10ABCDE.
 std::string completedOptions(std::string options) {
-    RunCommandOnPartition run{
-        Quorvex::RELAY::TargetPartition(Quorvex::RELAY::u_make_TestPartition())};
+    RunCommandOnPartition run{Quorvex::RELAY::TargetPartition(QuorvexTest::examplePartition())};
     run._initialize_ClientQuorvexParameters(options);
     return options;
 }

@@ -1,29 +1,29 @@
 #include "relay/TargetPartition.h"
 
-#include "relay/RELAY_Test_Utility.h"
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
 using Quorvex::RELAY::TargetPartition;
-using Quorvex::RELAY::u_make_TestPartition;
 using Quorvex::System::MTMS;
 using Quorvex::System::Partition;
+using QuorvexTest::examplePartition;
 
 TEST(TargetPartition, AddressesByIdentifierWhenConstructed) {
-    TargetPartition const target(u_make_TestPartition());
+    TargetPartition const target(examplePartition());
     EXPECT_EQ(target.createString_Target(),
               "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionId::\"3\"");
 }
 
 TEST(TargetPartition, ArrayModeWritesTheIdentifierInBraces) {
-    TargetPartition target(u_make_TestPartition());
+    TargetPartition target(examplePartition());
     target.use_PartitionArray();
     EXPECT_EQ(target.createString_Target(),
               "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionArray::{\"3\"}");
 }
 
 TEST(TargetPartition, IdentifierModeAfterArrayModeSwitchesBack) {
-    TargetPartition target(u_make_TestPartition());
+    TargetPartition target(examplePartition());
     target.use_PartitionArray();
     target.use_PartitionID();
     EXPECT_EQ(target.createString_Target(),
@@ -37,13 +37,13 @@ TEST(TargetPartition, DefaultConstructedAddressesAnEmptyPartitionByIdentifier) {
 }
 
 TEST(TargetPartition, KeepsThePartitionItWasGiven) {
-    TargetPartition const target(u_make_TestPartition("7"));
+    TargetPartition const target(examplePartition("7"));
     EXPECT_EQ(target.get_Partition().__StringValue(), "1234-ABC_10ABCDE-7");
     EXPECT_EQ(target.get_Partition().get_HostName(), "p7.example");
 }
 
 TEST(TargetPartition, CopyKeepsTheAddressingMode) {
-    TargetPartition original(u_make_TestPartition());
+    TargetPartition original(examplePartition());
     original.use_PartitionArray();
     TargetPartition const copy(original);
     TargetPartition assigned;

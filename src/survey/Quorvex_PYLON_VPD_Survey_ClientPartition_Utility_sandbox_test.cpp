@@ -2,7 +2,6 @@
 
 #include "survey/Quorvex_PYLON_VPD_Survey_ClientPartition_Utility.h"
 
-#include "survey/SurveyTest_Utility.h"
 #include "system/MTMS.h"
 #include "system/Partition.h"
 
@@ -34,7 +33,7 @@ class DefaultDocument : public ::testing::Test {
 protected:
     void SetUp() override {
         ASSERT_TRUE(QuorvexTest::isInsideSandbox());
-        SurveyTest_Utility::u_clear_Folder(gc_VPD_Folder);
+        QuorvexTest::clearFolder(gc_VPD_Folder);
     }
 };
 

@@ -1,7 +1,6 @@
 #include "survey/Survey_ClientPartition.h"
 
 #include "pylon/ListOf_Partitions.h"
-#include "survey/SurveyTest_Utility.h"
 #include "system/MTMS.h"
 #include "system/Partition.h"
 
@@ -57,8 +56,8 @@ LoopRun u_run_Loop(std::string const& scenario,
     QuorvexTest::SimulatedConsole const console(scenario);
     QuorvexTest::TemporaryDirectory const traceFolder;
     std::string const tracePath = traceFolder.file("survey.Trace");
-    SurveyTest_Utility::ChildOutput const child =
-        SurveyTest_Utility::u_run_InChild_Traced(tracePath, [&partitions]() {
+    QuorvexTest::CommandResult const child =
+        QuorvexTest::runTracedInChild(tracePath, [&partitions]() {
             std::vector<std::string> fileNames;
             std::vector<std::string> returnCodes;
             std::vector<std::string> statusTexts;
@@ -75,7 +74,8 @@ LoopRun u_run_Loop(std::string const& scenario,
     EXPECT_EQ(child.exitStatus, 0) << "the three outputs are not aligned with the listing";
     EXPECT_EQ(child.stderrText, "");
     return {child.stdoutText,
-            SurveyTest_Utility::u_normalise_TemporaryNames(QuorvexTest::readFile(tracePath)),
+            QuorvexTest::normaliseTemporaryNames(QuorvexTest::readFile(tracePath),
+                                                 QuorvexTest::TemporaryNames::Numbered),
             console.invocations()};
 }
 
@@ -83,7 +83,7 @@ class Survey_ClientPartition : public ::testing::Test {
 protected:
     void SetUp() override {
         ASSERT_TRUE(QuorvexTest::isInsideSandbox());
-        SurveyTest_Utility::u_clear_Folder(gc_VPD_Folder);
+        QuorvexTest::clearFolder(gc_VPD_Folder);
     }
 };
 
@@ -119,7 +119,7 @@ TEST_F(Survey_ClientPartition, PartitionWithActiveStatusTwoIsSkippedWithNoTraceT
     EXPECT_EQ(run.outcomes, "|8|Failed - Active Status < 3\n");
     EXPECT_EQ(run.trace, "");
     EXPECT_TRUE(run.calls.empty());
-    EXPECT_TRUE(SurveyTest_Utility::u_list_Folder(gc_VPD_Folder).empty());
+    EXPECT_TRUE(QuorvexTest::listFolder(gc_VPD_Folder).empty());
 }
 
 TEST_F(Survey_ClientPartition, UnreadableActiveStatusesAreSkipped) {
@@ -270,7 +270,7 @@ TEST_F(Survey_ClientPartition, SuccessIsRecordedWithoutTheToolWritingTheFile) {
                                               "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n",
                    partitions);
     EXPECT_EQ(run.outcomes, u_local_File("3") + "|0|Ok\n");
-    EXPECT_TRUE(SurveyTest_Utility::u_list_Folder(gc_VPD_Folder).empty());
+    EXPECT_TRUE(QuorvexTest::listFolder(gc_VPD_Folder).empty());
 }
 
 TEST_F(Survey_ClientPartition, OutputIndexBelongsToListingIndexIncludingSkippedPartitions) {
@@ -320,6 +320,8 @@ TEST_F(Survey_ClientPartition, ConsoleReceivesTheClientRunAndTheFetchOfEachParti
     EXPECT_EQ(run.calls, expected);
 }
 
+// The expected trace lies in tests/expected/; rewrite it from a run with
+// QUORVEX_UPDATE_EXPECTED=1 when the trace changes on purpose.
 TEST_F(Survey_ClientPartition, TraceOfAFailedAndASurveyedPartitionIsExact) {
     Quorvex::PYLON::ListOf_Partitions partitions;
     partitions.push_back(u_make_Partition("2", "3", "host2"));
@@ -329,83 +331,9 @@ TEST_F(Survey_ClientPartition, TraceOfAFailedAndASurveyedPartitionIsExact) {
                                        "stdout Rc::1::RcCmd::0::RetStr1::timeout::RetStr2::\n"
                                        "exit 1\n",
                                    partitions);
-    std::string const plusLine(80, '+');
-    std::string const dashLine = "    " + std::string(40, '-');
-    EXPECT_EQ(
-        run.trace,
-        "\n\n" + plusLine +
-            "\nPYLON_VPD_Survey_ClientPartition\n\n"
-            "    Partition    : 1234-ABC_10ABCDE-2\n"
-            "    MTMS         : 1234-ABC_10ABCDE\n"
-            "    Partition ID : 2\n"
-            "    HostName     : host2\n"
-            "    IP           : 10.1.1.12\n"
-            "    ActiveStatus : 3\n"
-            "    OS Name      : Zeph\n"
-            "    OS Version   : 7.2\n" +
-            dashLine +
-            "\n\n\t 1.  > > > VPD Survey Client < < < \n"
-            "\n****** ShellCommand::execute ******\n"
-            "/usr/bin/runact-api -c "
-            "ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::CecMT::\"1234-ABC\"::CecMS::"
-            "\"10ABCDE\"::PartitionId::\"2\"::CmdID::0::CmdOpts::\" -v  -of "
-            "1234-ABC_10ABCDE-2.VPD.xml -c 1234-ABC_10ABCDE -pylonv "
-            "4.0.11\"::RemoteFN::\"1234-ABC_10ABCDE-2.QuorvexOutput\"::RemoteFileInfo::\"FILE_"
-            "PERM=660;FILE_OWNER=quorvex;FILE_GROUP=system\" > /tmp/ShellCommand.aaaaaa 2> "
-            "/tmp/ShellCommand.bbbbbb\n"
-            "RC = 1\n"
-            "STDOUT\n"
-            "Rc::1::RcCmd::0::RetStr1::timeout::RetStr2::\n"
-            "\n"
-            "STDERR\n"
-            "\n"
-            "\n"
-            "\n"
-            "\n\n" +
-            plusLine +
-            "\nPYLON_VPD_Survey_ClientPartition\n\n"
-            "    Partition    : 1234-ABC_10ABCDE-3\n"
-            "    MTMS         : 1234-ABC_10ABCDE\n"
-            "    Partition ID : 3\n"
-            "    HostName     : host3\n"
-            "    IP           : 10.1.1.13\n"
-            "    ActiveStatus : 3\n"
-            "    OS Name      : Zeph\n"
-            "    OS Version   : 7.3\n" +
-            dashLine +
-            "\n\n\t 1.  > > > VPD Survey Client < < < \n"
-            "\n****** ShellCommand::execute ******\n"
-            "/usr/bin/runact-api -c "
-            "ZOR.ServiceEvent::::runCmdOnPartition::CallerID::0::CecMT::\"1234-ABC\"::CecMS::"
-            "\"10ABCDE\"::PartitionId::\"3\"::CmdID::0::CmdOpts::\" -v  -of "
-            "1234-ABC_10ABCDE-3.VPD.xml -c 1234-ABC_10ABCDE -pylonv "
-            "4.0.11\"::RemoteFN::\"1234-ABC_10ABCDE-3.QuorvexOutput\"::RemoteFileInfo::\"FILE_"
-            "PERM=660;FILE_OWNER=quorvex;FILE_GROUP=system\" > /tmp/ShellCommand.cccccc 2> "
-            "/tmp/ShellCommand.dddddd\n"
-            "RC = 0\n"
-            "STDOUT\n"
-            "Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
-            "\n"
-            "STDERR\n"
-            "\n"
-            "\n"
-            "\n"
-            "\n\n\t 2.  > > > Get VPD Survey Result < < < \n"
-            "\n****** ShellCommand::execute ******\n"
-            "/usr/bin/runact-api -c "
-            "ZOR.ServiceEvent::::getFileFromPartition::CallerID::0::CecMT::\"1234-ABC\"::CecMS::"
-            "\"10ABCDE\"::PartitionId::\"3\"::RemoteFN::\"1234-ABC_10ABCDE-3.VPD.xml\"::LocalFN::"
-            "\"VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-3.VPD.xml\"::"
-            "LocalFileInfo::\"FILE_PERM=660;FILE_OWNER=quorvex;FILE_GROUP=pylon\" > "
-            "/tmp/ShellCommand.eeeeee 2> /tmp/ShellCommand.ffffff\n"
-            "RC = 0\n"
-            "STDOUT\n"
-            "Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
-            "\n"
-            "STDERR\n"
-            "\n"
-            "\n"
-            "\n");
+    EXPECT_TRUE(QuorvexTest::matchesExpectedFile(
+        run.trace, QuorvexTest::expectedOutputFile(
+                       "Survey_ClientPartition/TraceOfAFailedAndASurveyedPartition.trace")));
 }
 
 TEST_F(Survey_ClientPartition, DefaultDocumentReplacesAnEarlierResult) {
@@ -437,7 +365,7 @@ TEST_F(Survey_ClientPartition, MachineWithoutDashListsTheFailedPartitionButWrite
     EXPECT_EQ(run.outcomes,
               "VPD/quorvexPYLON_VPD_Survey_ClientPartition_"
               "1234MMAERROR_10ABCDEERROR-2.VPD.xml|8|RELAY Failed, rc = 4294967295\n");
-    EXPECT_TRUE(SurveyTest_Utility::u_list_Folder(gc_VPD_Folder).empty());
+    EXPECT_TRUE(QuorvexTest::listFolder(gc_VPD_Folder).empty());
 }
 
 TEST_F(Survey_ClientPartition, TwoPartitionsOfOneIdentityShareTheirLocalFile) {

@@ -1,7 +1,5 @@
 #include "survey/VPD_Survey_ClientPartition.h"
 
-#include "survey/SurveyTest_Utility.h"
-
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
@@ -41,11 +39,10 @@ struct SurveyRun {
 // as scenario says.
 SurveyRun u_run_Survey(std::string const& scenario, std::string const& machineIdentity) {
     QuorvexTest::SimulatedConsole const console(scenario);
-    SurveyTest_Utility::ChildOutput const child =
-        SurveyTest_Utility::u_run_InChild([&machineIdentity]() {
-            VPD_Survey_ClientPartition(machineIdentity);
-            return 0;
-        });
+    QuorvexTest::CommandResult const child = QuorvexTest::runInChild([&machineIdentity]() {
+        VPD_Survey_ClientPartition(machineIdentity);
+        return 0;
+    });
     EXPECT_EQ(child.exitStatus, 0);
     std::string const statusFile = std::string(gc_VPD_Folder) +
                                    "/quorvexPYLON_VPD_Survey_ClientPartition_" + machineIdentity +
@@ -59,7 +56,7 @@ class VPD_Survey_ClientPartition_Run : public ::testing::Test {
 protected:
     void SetUp() override {
         ASSERT_TRUE(QuorvexTest::isInsideSandbox());
-        SurveyTest_Utility::u_clear_Folder(gc_VPD_Folder);
+        QuorvexTest::clearFolder(gc_VPD_Folder);
     }
 };
 
@@ -177,7 +174,7 @@ TEST_F(VPD_Survey_ClientPartition_Run, IdentityWithoutDashIsListedAsMarkedButNam
                               "1234MMAERROR_10ABCDEERROR-2.VPD.xml\n");
     EXPECT_EQ(run.stderrText, std::string("8\n") + gc_Heading + "8");
     EXPECT_EQ(run.status, "host2 [10.1.1.12] - VPD Survey - RELAY Failed, rc = 4294967295\n");
-    EXPECT_EQ(SurveyTest_Utility::u_list_Folder(gc_VPD_Folder),
+    EXPECT_EQ(QuorvexTest::listFolder(gc_VPD_Folder),
               (std::vector<std::string>{
                   "quorvexPYLON_VPD_Survey_ClientPartition_1234MMA_10ABCDE.status"}));
 }

@@ -1,6 +1,6 @@
 #include "survey/calculate_ReturnCode.h"
 
-#include "survey/SurveyTest_Utility.h"
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -9,20 +9,20 @@
 
 namespace {
 
-using SurveyTest_Utility::ChildOutput;
+using QuorvexTest::CommandResult;
 
 constexpr char gc_Heading[] = "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n";
 
 // Standard output and standard error of calculate_ReturnCode in a child process.
-ChildOutput u_calculate(std::vector<std::string> const& returnCodes) {
-    return SurveyTest_Utility::u_run_InChild([&returnCodes]() {
+CommandResult u_calculate(std::vector<std::string> const& returnCodes) {
+    return QuorvexTest::runInChild([&returnCodes]() {
         calculate_ReturnCode(returnCodes);
         return 0;
     });
 }
 
 TEST(calculate_ReturnCode, AllPartitionsSurveyedPrintsZero) {
-    ChildOutput const output = u_calculate({"0", "0", "0"});
+    CommandResult const output = u_calculate({"0", "0", "0"});
     EXPECT_EQ(output.stderrText, std::string(gc_Heading) + "0");
     EXPECT_EQ(output.stdoutText, "");
 }

@@ -1,7 +1,5 @@
 // Runs the built tool as a whole, inside the sandbox of this test program.
 
-#include "survey/SurveyTest_Utility.h"
-
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
@@ -31,7 +29,7 @@ class SurveyTool : public ::testing::Test {
 protected:
     void SetUp() override {
         ASSERT_TRUE(QuorvexTest::isInsideSandbox());
-        SurveyTest_Utility::u_clear_Folder(gc_VPD_Folder);
+        QuorvexTest::clearFolder(gc_VPD_Folder);
     }
 
     // A bad command line: exit 255, nothing printed, no file but the trace's first line.
@@ -42,7 +40,7 @@ protected:
         EXPECT_EQ(result.stdoutText, "");
         EXPECT_EQ(result.stderrText, "");
         EXPECT_EQ(QuorvexTest::readFile(gc_TraceFile), gc_FirstTraceLine);
-        EXPECT_TRUE(SurveyTest_Utility::u_list_Folder(gc_VPD_Folder).empty());
+        EXPECT_TRUE(QuorvexTest::listFolder(gc_VPD_Folder).empty());
         EXPECT_TRUE(console.invocations().empty());
     }
 };
@@ -70,7 +68,7 @@ TEST_F(SurveyTool, FirstOfTwoMachineOptionsIsTheMachineSurveyed) {
     EXPECT_EQ(result.exitStatus, 2);
     EXPECT_EQ(console.invocations(), (std::vector<QuorvexTest::Invocation>{
                                          {"lspartition", "-ix", "-c", "1111-AAA_FIRST"}}));
-    EXPECT_EQ(SurveyTest_Utility::u_list_Folder(gc_VPD_Folder),
+    EXPECT_EQ(QuorvexTest::listFolder(gc_VPD_Folder),
               (std::vector<std::string>{
                   "quorvexPYLON_VPD_Survey_ClientPartition_1111-AAA_FIRST.status"}));
 }

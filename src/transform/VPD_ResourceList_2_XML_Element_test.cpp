@@ -1,19 +1,19 @@
 #include "transform/VPD_ResourceList_2_XML_Element.h"
 
-#include "transform/ElementText_test.h"
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
 namespace {
 
-using ElementText_test::u_text;
 using Quorvex::VPD::Resource;
 using Quorvex::VPD::ResourceList;
+using QuorvexTest::elementText;
 
 TEST(Transform_VPD_ResourceList_2_XML_Element, EmptyListIsABeginTagFollowedByItsEndTag) {
     XML::Element element;
     Transform::VPD_ResourceList_2_XML_Element{element}(ResourceList("Partitions"));
-    EXPECT_EQ(u_text(element), "<ResourceList displayName=\"Partitions\"></ResourceList>");
+    EXPECT_EQ(elementText(element), "<ResourceList displayName=\"Partitions\"></ResourceList>");
 }
 
 TEST(Transform_VPD_ResourceList_2_XML_Element, ResourcesComeInUniqueIDOrder) {
@@ -22,7 +22,7 @@ TEST(Transform_VPD_ResourceList_2_XML_Element, ResourcesComeInUniqueIDOrder) {
     list.insert(Resource("first", "a"));
     XML::Element element;
     Transform::VPD_ResourceList_2_XML_Element{element}(list);
-    EXPECT_EQ(u_text(element),
+    EXPECT_EQ(elementText(element),
               "<ResourceList displayName=\"Partitions\">\n"
               "   <Resource displayName=\"first\" uniqueId=\"a\">first</Resource>\n"
               "   <Resource displayName=\"second\" uniqueId=\"b\">second</Resource>\n"

@@ -1,22 +1,23 @@
 #include "transform/VPD_ResourceSet_2_XML_Element.h"
 
-#include "transform/ElementText_test.h"
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
 namespace {
 
-using ElementText_test::u_text;
 using Quorvex::VPD::Resource;
 using Quorvex::VPD::ResourceList;
 using Quorvex::VPD::ResourceSet;
+using QuorvexTest::elementText;
 
 TEST(Transform_VPD_ResourceSet_2_XML_Element, EmptySetHasAllFourAttributesAndAnUnnamedResource) {
     XML::Element element;
     Transform::VPD_ResourceSet_2_XML_Element{element}(ResourceSet());
-    EXPECT_EQ(u_text(element), "<ResourceSet class=\"\" timestamp=\"\" type=\"\" version=\"\">\n"
-                               "   <Resource displayName=\"\"></Resource>\n"
-                               "</ResourceSet>");
+    EXPECT_EQ(elementText(element),
+              "<ResourceSet class=\"\" timestamp=\"\" type=\"\" version=\"\">\n"
+              "   <Resource displayName=\"\"></Resource>\n"
+              "</ResourceSet>");
 }
 
 TEST(Transform_VPD_ResourceSet_2_XML_Element, AllSetListsAreWrittenInNameOrderEmptyOnesIncluded) {
@@ -30,7 +31,7 @@ TEST(Transform_VPD_ResourceSet_2_XML_Element, AllSetListsAreWrittenInNameOrderEm
     set.insert_ResourceList(ResourceList("Adapters"));
     XML::Element element;
     Transform::VPD_ResourceSet_2_XML_Element{element}(set);
-    EXPECT_EQ(u_text(element),
+    EXPECT_EQ(elementText(element),
               "<ResourceSet class=\"C\" timestamp=\"S\" type=\"T\" version=\"V\">\n"
               "   <Resource displayName=\"m\" uniqueId=\"m\">m</Resource>\n"
               "   <ResourceList displayName=\"Adapters\"></ResourceList>\n"

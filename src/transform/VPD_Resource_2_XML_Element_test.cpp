@@ -1,22 +1,23 @@
 #include "transform/VPD_Resource_2_XML_Element.h"
 
-#include "transform/ElementText_test.h"
 #include "vpd/ResourceList.h"
+
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
 namespace {
 
-using ElementText_test::u_text;
 using Quorvex::VPD::Property;
 using Quorvex::VPD::PropertyGroup;
 using Quorvex::VPD::Resource;
 using Quorvex::VPD::ResourceList;
+using QuorvexTest::elementText;
 
 std::string u_resourceText(Resource const& resource) {
     XML::Element element;
     Transform::VPD_Resource_2_XML_Element{element}(resource);
-    return u_text(element);
+    return elementText(element);
 }
 
 TEST(Transform_VPD_Resource_2_XML_Element, EmptyUniqueIDAndReferencesLeaveOnlyDisplayName) {

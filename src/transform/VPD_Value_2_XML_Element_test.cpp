@@ -1,18 +1,18 @@
 #include "transform/VPD_Value_2_XML_Element.h"
 
-#include "transform/ElementText_test.h"
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
 namespace {
 
-using ElementText_test::u_text;
 using Quorvex::VPD::Value;
+using QuorvexTest::elementText;
 
 TEST(Transform_VPD_Value_2_XML_Element, ValueIsOneLineWithItsTypeName) {
     XML::Element element;
     Transform::VPD_Value_2_XML_Element{element}(Value("4096", 2));
-    EXPECT_EQ(u_text(element), "<Value type=\"integer\">4096</Value>");
+    EXPECT_EQ(elementText(element), "<Value type=\"integer\">4096</Value>");
 }
 
 TEST(Transform_VPD_Value_2_XML_Element, HasExactlyOneTextChild) {
@@ -28,13 +28,13 @@ TEST(Transform_VPD_Value_2_XML_Element, HasExactlyOneTextChild) {
 TEST(Transform_VPD_Value_2_XML_Element, EmptyValueHasEmptyText) {
     XML::Element element;
     Transform::VPD_Value_2_XML_Element{element}(Value());
-    EXPECT_EQ(u_text(element), "<Value type=\"string\"></Value>");
+    EXPECT_EQ(elementText(element), "<Value type=\"string\"></Value>");
 }
 
 TEST(Transform_VPD_Value_2_XML_Element, LineFeedsInTheTextAreKept) {
     XML::Element element;
     Transform::VPD_Value_2_XML_Element{element}(Value("a\nb\n", 0));
-    EXPECT_EQ(u_text(element), "<Value type=\"string\">a\nb\n</Value>");
+    EXPECT_EQ(elementText(element), "<Value type=\"string\">a\nb\n</Value>");
 }
 
 } // namespace

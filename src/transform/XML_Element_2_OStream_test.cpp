@@ -1,6 +1,6 @@
 #include "transform/XML_Element_2_OStream.h"
 
-#include "transform/ElementText_test.h"
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -10,7 +10,7 @@
 
 namespace {
 
-using ElementText_test::u_text;
+using QuorvexTest::elementText;
 using Transform::XML_Element_2_OStream;
 using XML::Element;
 using XML::Tag;
@@ -41,7 +41,7 @@ protected:
 };
 
 TEST(Transform_XML_Element_2_OStream, LoneChildlessElementAtDepthZeroHasNoLineFeedAround) {
-    EXPECT_EQ(u_text(u_element("A")), "<A></A>");
+    EXPECT_EQ(elementText(u_element("A")), "<A></A>");
 }
 
 TEST(Transform_XML_Element_2_OStream, NewLineAtDepthZeroWritesNothingBefore) {
@@ -62,40 +62,40 @@ TEST(Transform_XML_Element_2_OStream, TwoTopLevelCallsPutBothElementsOnOneLine) 
 TEST(Transform_XML_Element_2_OStream, OneTextChildStandsBetweenTheTagsOnOneLine) {
     Element const element =
         u_withChildren("A", Tag::Type_BeginTag, {u_element("text", Tag::Type_String)});
-    EXPECT_EQ(u_text(element), "<A>text</A>");
+    EXPECT_EQ(elementText(element), "<A>text</A>");
 }
 
 TEST(Transform_XML_Element_2_OStream, TextAndElementChildrenEachStandOnTheirOwnIndentedLine) {
     Element const element = u_withChildren("A", Tag::Type_BeginTag,
                                            {u_element("text", Tag::Type_String), u_element("B")});
-    EXPECT_EQ(u_text(element), "<A>\n   text\n   <B></B>\n</A>");
+    EXPECT_EQ(elementText(element), "<A>\n   text\n   <B></B>\n</A>");
 }
 
 TEST(Transform_XML_Element_2_OStream, NestedChildrenIndentThreeSpacesPerLevel) {
     Element const inner =
         u_withChildren("C", Tag::Type_BeginTag, {u_element("x", Tag::Type_String), u_element("D")});
     Element const element = u_withChildren("A", Tag::Type_BeginTag, {inner, u_element("E")});
-    EXPECT_EQ(u_text(element), "<A>\n"
-                               "   <C>\n"
-                               "      x\n"
-                               "      <D></D>\n"
-                               "   </C>\n"
-                               "   <E></E>\n"
-                               "</A>");
+    EXPECT_EQ(elementText(element), "<A>\n"
+                                    "   <C>\n"
+                                    "      x\n"
+                                    "      <D></D>\n"
+                                    "   </C>\n"
+                                    "   <E></E>\n"
+                                    "</A>");
 }
 
 TEST(Transform_XML_Element_2_OStream, AttributesInsertedVersionThenClassAreWrittenClassFirst) {
     Element element = u_element("A");
     element.insert_Attribute("version", "1.0");
     element.insert_Attribute("class", "c");
-    EXPECT_EQ(u_text(element), "<A class=\"c\" version=\"1.0\"></A>");
+    EXPECT_EQ(elementText(element), "<A class=\"c\" version=\"1.0\"></A>");
 }
 
 TEST(Transform_XML_Element_2_OStream, DeclarationWritesVersionFirstThenEncoding) {
     Element declaration = u_element("xml", Tag::Type_Declaration);
     declaration.insert_Attribute("encoding", "UTF-8");
     declaration.insert_Attribute("version", "1.0");
-    EXPECT_EQ(u_text(declaration), "<?xml version=\"1.0\" encoding=\"UTF-8\"?>");
+    EXPECT_EQ(elementText(declaration), "<?xml version=\"1.0\" encoding=\"UTF-8\"?>");
 }
 
 TEST(Transform_XML_Element_2_OStream, DeclarationWritesOtherAttributesSortedAfterVersion) {
@@ -103,35 +103,36 @@ TEST(Transform_XML_Element_2_OStream, DeclarationWritesOtherAttributesSortedAfte
     declaration.insert_Attribute("standalone", "yes");
     declaration.insert_Attribute("encoding", "UTF-8");
     declaration.insert_Attribute("version", "1.0");
-    EXPECT_EQ(u_text(declaration), "<?xml version=\"1.0\" encoding=\"UTF-8\" standalone=\"yes\"?>");
+    EXPECT_EQ(elementText(declaration),
+              "<?xml version=\"1.0\" encoding=\"UTF-8\" standalone=\"yes\"?>");
 }
 
 TEST(Transform_XML_Element_2_OStream, DeclarationWithoutVersionWritesSortedAttributes) {
     Element declaration = u_element("xml", Tag::Type_Declaration);
     declaration.insert_Attribute("standalone", "yes");
     declaration.insert_Attribute("encoding", "UTF-8");
-    EXPECT_EQ(u_text(declaration), "<?xml encoding=\"UTF-8\" standalone=\"yes\"?>");
+    EXPECT_EQ(elementText(declaration), "<?xml encoding=\"UTF-8\" standalone=\"yes\"?>");
 }
 
 TEST(Transform_XML_Element_2_OStream, OtherInstructionsWriteSortedAttributes) {
     Element instruction = u_element("style", Tag::Type_Declaration);
     instruction.insert_Attribute("version", "2");
     instruction.insert_Attribute("href", "a.css");
-    EXPECT_EQ(u_text(instruction), "<?style href=\"a.css\" version=\"2\"?>");
+    EXPECT_EQ(elementText(instruction), "<?style href=\"a.css\" version=\"2\"?>");
 }
 
 TEST(Transform_XML_Element_2_OStream, QuoteAndAmpersandInValuesAreWrittenUnchanged) {
     Element element =
         u_withChildren("A", Tag::Type_BeginTag, {u_element("x < y & \"z\"", Tag::Type_String)});
     element.insert_Attribute("v", "say \"hi\" & <bye>");
-    EXPECT_EQ(u_text(element), "<A v=\"say \"hi\" & <bye>\">x < y & \"z\"</A>");
+    EXPECT_EQ(elementText(element), "<A v=\"say \"hi\" & <bye>\">x < y & \"z\"</A>");
 }
 
 TEST(Transform_XML_Element_2_OStream, ControlCharactersAndBytesAbove127AreWrittenUnchanged) {
     std::string const odd = std::string("\t\x01\r\xC3\xA9\xFF", 6) + std::string(1, '\0') + "]]>";
     Element element = u_withChildren(odd, Tag::Type_BeginTag, {u_element(odd, Tag::Type_String)});
     element.insert_Attribute(odd, odd);
-    EXPECT_EQ(u_text(element),
+    EXPECT_EQ(elementText(element),
               "<" + odd + " " + odd + "=\"" + odd + "\">" + odd + "</" + odd + ">");
 }
 
@@ -152,7 +153,7 @@ TEST(Transform_XML_Element_2_OStream, NoNewLineBelowTopLevelWritesNoIndentation)
 TEST(Transform_XML_Element_2_OStream, EmptyElementTagWithChildrenWritesThemAndNoEndTag) {
     Element const element =
         u_withChildren("A", Tag::Type_EmptyElementTag, {u_element("B"), u_element("C")});
-    EXPECT_EQ(u_text(element), "<A/>\n   <B></B>\n   <C></C>\n");
+    EXPECT_EQ(elementText(element), "<A/>\n   <B></B>\n   <C></C>\n");
 }
 
 TEST(Transform_XML_Element_2_OStream,
@@ -167,14 +168,14 @@ TEST(Transform_XML_Element_2_OStream,
 TEST(Transform_XML_Element_2_OStream, EmptyElementTagWithoutChildrenIsOneShortTag) {
     Element element = u_element("A", Tag::Type_EmptyElementTag);
     element.insert_Attribute("x", "1");
-    EXPECT_EQ(u_text(element), "<A x=\"1\"/>");
+    EXPECT_EQ(elementText(element), "<A x=\"1\"/>");
 }
 
 TEST(Transform_XML_Element_2_OStream, DeclarationChildrenStayAtTheDeclarationsIndentation) {
     Element declaration =
         u_withChildren("xml", Tag::Type_Declaration, {u_element("B"), u_element("C")});
     declaration.insert_Attribute("version", "1.0");
-    EXPECT_EQ(u_text(declaration), "<?xml version=\"1.0\"?>\n<B></B>\n<C></C>\n");
+    EXPECT_EQ(elementText(declaration), "<?xml version=\"1.0\"?>\n<B></B>\n<C></C>\n");
     std::ostringstream out;
     XML_Element_2_OStream(out, 1)(declaration, true, 1);
     EXPECT_EQ(out.str(), "\n   <?xml version=\"1.0\"?>\n   <B></B>\n   <C></C>\n   ");
@@ -183,22 +184,22 @@ TEST(Transform_XML_Element_2_OStream, DeclarationChildrenStayAtTheDeclarationsIn
 TEST(Transform_XML_Element_2_OStream, NamespaceAndColonPrecedeTheNameInBothTags) {
     Element element = u_element("e");
     element.set_Namespace("n");
-    EXPECT_EQ(u_text(element), "<n:e></n:e>");
+    EXPECT_EQ(elementText(element), "<n:e></n:e>");
 }
 
 TEST(Transform_XML_Element_2_OStream, CommentIsWrittenWithItsDelimiters) {
-    EXPECT_EQ(u_text(u_element(" note ", Tag::Type_Comment)), "<!-- note -->");
+    EXPECT_EQ(elementText(u_element(" note ", Tag::Type_Comment)), "<!-- note -->");
 }
 
 TEST(Transform_XML_Element_2_OStream, UnnamedElementIsWrittenWithEmptyTags) {
-    EXPECT_EQ(u_text(Element()), "<></>");
+    EXPECT_EQ(elementText(Element()), "<></>");
 }
 
 TEST(Transform_XML_Element_2_OStream, TextAmongSeveralChildrenIsAloneOnItsLine) {
     Element const element = u_withChildren(
         "A", Tag::Type_BeginTag,
         {u_element("B"), u_element("one", Tag::Type_String), u_element("two", Tag::Type_String)});
-    EXPECT_EQ(u_text(element), "<A>\n   <B></B>\n   one\n   two\n</A>");
+    EXPECT_EQ(elementText(element), "<A>\n   <B></B>\n   one\n   two\n</A>");
 }
 
 TEST(Transform_XML_Element_2_OStream, EveryLineBreakFlushesTheStream) {
@@ -228,7 +229,7 @@ TEST(Transform_Utility__XML_Element_2_OStream, EmptyElementTagIsAlwaysShortForm)
 TEST(Transform_Utility__XML_Element_2_OStream, ChildlessBeginTagQualifiesButIsNotWrittenShort) {
     Element const element = u_element("A");
     EXPECT_TRUE(Transform::Utility__XML_Element_2_OStream::_u_usingEmptyElementTag(element));
-    EXPECT_EQ(u_text(element), "<A></A>");
+    EXPECT_EQ(elementText(element), "<A></A>");
 }
 
 TEST(Transform_Utility__XML_Element_2_OStream, OtherElementsDoNotQualify) {

@@ -1,6 +1,6 @@
 #include "utility/Print.h"
 
-#include "utility/Utility_Test_Utility.h"
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -93,13 +93,13 @@ TEST(DEBUG_STL_Print, EmptyMapPrintsNothing) {
 }
 
 TEST(DEBUG_STL_Print, EveryLineIsFlushed) {
-    Utility::Utility_Test_Utility::FlushCountingBuffer buffer;
+    QuorvexTest::FlushCountingBuffer buffer;
     std::ostream out(&buffer);
     DEBUG::STL::Print print(out);
     print.print_Vector_Of_String(makeStrings(3), true);
-    EXPECT_EQ(buffer.get_NumberOf_Flushes(), 3);
+    EXPECT_EQ(buffer.flushes(), 3);
     print.print_Map_Of_String_String({{"k", "v"}, {"l", "w"}});
-    EXPECT_EQ(buffer.get_NumberOf_Flushes(), 5);
+    EXPECT_EQ(buffer.flushes(), 5);
 }
 
 TEST(DEBUG_STL_Print, StreamSettingsAreLeftUnchanged) {

@@ -35,7 +35,7 @@ Lines temporaryFilesInTmp() {
 // Runs the probe in a sandbox of its own with the given options.
 QuorvexTest::CommandResult runProbe(std::vector<std::string> const& sandboxOptions) {
     return QuorvexTest::runInSandbox(sandboxOptions,
-                                     {QUORVEX_UTILITY_PROBE, std::string(gc_MarkerFolder)});
+                                     {QUORVEX_SHELL_COMMAND_PROBE, std::string(gc_MarkerFolder)});
 }
 
 // Runs the probe with a script of the given body standing in for /bin/hostname.
@@ -55,8 +55,9 @@ constexpr char gc_OneFileTmpThenRun[] =
 
 // Runs the probe in a sandbox of its own whose /tmp has room for one file.
 QuorvexTest::CommandResult runProbeWithRoomForOneTemporaryFile() {
-    return QuorvexTest::runInSandbox({}, {"/bin/sh", "-c", gc_OneFileTmpThenRun,
-                                          QUORVEX_UTILITY_PROBE, std::string(gc_MarkerFolder)});
+    return QuorvexTest::runInSandbox({},
+                                     {"/bin/sh", "-c", gc_OneFileTmpThenRun,
+                                      QUORVEX_SHELL_COMMAND_PROBE, std::string(gc_MarkerFolder)});
 }
 
 // The probe's report of a run in a writable /tmp, with the host name it got.

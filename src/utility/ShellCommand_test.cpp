@@ -1,7 +1,6 @@
 #include "utility/ShellCommand.h"
 
 #include "utility/Trace.h"
-#include "utility/Utility_Test_Utility.h"
 
 #include "QuorvexTest.h"
 
@@ -16,15 +15,14 @@
 
 namespace {
 
-namespace TestUtility = Utility::Utility_Test_Utility;
 using Lines = std::vector<std::string>;
 
 constexpr unsigned int gc_LineLimit = 65533;
 
 class ShellCommandTest : public ::testing::Test {
 protected:
-    void SetUp() override { _scratch = TestUtility::u_get_ScratchDirectory(); }
-    void TearDown() override { TestUtility::u_remove_ScratchDirectory(); }
+    void SetUp() override { _scratch = QuorvexTest::scratchDirectory(); }
+    void TearDown() override { QuorvexTest::removeScratchDirectory(); }
 
     std::string path(std::string const& name) const { return _scratch + "/" + name; }
 
@@ -211,7 +209,7 @@ TEST_F(ShellCommandTest, LineLongerThanLimitEndsReadingWithoutHanging) {
 // A shell whose children are reaped automatically cannot report a status:
 // system fails with -1, which the shift keeps.
 TEST_F(ShellCommandTest, SystemFailureKeepsMinusOne) {
-    TestUtility::u_run_InFreshProcess([] {
+    QuorvexTest::runInFreshProcess([] {
         std::signal(SIGCHLD, SIG_IGN);
         Utility::ShellCommand command("true");
         int const result = command.execute();

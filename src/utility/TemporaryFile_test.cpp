@@ -1,7 +1,5 @@
 #include "utility/TemporaryFile.h"
 
-#include "utility/Utility_Test_Utility.h"
-
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
@@ -12,12 +10,10 @@
 
 namespace {
 
-namespace TestUtility = Utility::Utility_Test_Utility;
-
 class TemporaryFileTest : public ::testing::Test {
 protected:
-    void SetUp() override { _base = TestUtility::u_get_ScratchDirectory() + "/Base"; }
-    void TearDown() override { TestUtility::u_remove_ScratchDirectory(); }
+    void SetUp() override { _base = QuorvexTest::scratchDirectory() + "/Base"; }
+    void TearDown() override { QuorvexTest::removeScratchDirectory(); }
 
     std::string _base;
 };
@@ -83,7 +79,7 @@ TEST_F(TemporaryFileTest, DestructorLeavesFileOnDisk) {
 }
 
 TEST_F(TemporaryFileTest, MissingDirectoryGivesInvalidObjectWithBaseNameKept) {
-    std::string const base = TestUtility::u_get_ScratchDirectory() + "/missing/Base";
+    std::string const base = QuorvexTest::scratchDirectory() + "/missing/Base";
     Utility::TemporaryFile file(base);
     EXPECT_FALSE(file.isValid());
     EXPECT_EQ(file.get_ActualFileName(), "");

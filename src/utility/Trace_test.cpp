@@ -1,7 +1,6 @@
 #include "utility/Trace.h"
 
 #include "utility/ShellCommand.h"
-#include "utility/Utility_Test_Utility.h"
 
 #include "QuorvexTest.h"
 
@@ -18,12 +17,10 @@
 
 namespace {
 
-namespace TestUtility = Utility::Utility_Test_Utility;
-
 class TraceTest : public ::testing::Test {
 protected:
-    void SetUp() override { _scratch = TestUtility::u_get_ScratchDirectory(); }
-    void TearDown() override { TestUtility::u_remove_ScratchDirectory(); }
+    void SetUp() override { _scratch = QuorvexTest::scratchDirectory(); }
+    void TearDown() override { QuorvexTest::removeScratchDirectory(); }
 
     std::string path(std::string const& name) const { return _scratch + "/" + name; }
 
@@ -58,7 +55,7 @@ void setLocalTimeNow(long secondOfDay) {
 
 // Writes the time stamp at the chosen local time into file through a trace.
 void writeTimeStampAt(std::string const& file, long secondOfDay) {
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         Utility::Trace trace(file);
         setLocalTimeNow(secondOfDay);
         Utility::timeStamp(trace);
@@ -73,7 +70,7 @@ TEST_F(TraceTest, TwoRunsLeaveOnlyTheSecondRunsText) {
     std::string const file = path("run.Trace");
     QuorvexTest::writeFile(file, "an older trace that is longer than the new ones\n");
     for (std::string const text : {"first run", "second run"}) {
-        TestUtility::u_run_InFreshProcess([&] {
+        QuorvexTest::runInFreshProcess([&] {
             Utility::Trace trace(file);
             trace << text << std::endl;
             return 0;
@@ -85,7 +82,7 @@ TEST_F(TraceTest, TwoRunsLeaveOnlyTheSecondRunsText) {
 TEST_F(TraceTest, SecondNameIsIgnoredAndWritesGoToFirstFile) {
     std::string const first = path("first.Trace");
     std::string const second = path("second.Trace");
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         Utility::Trace firstTrace(first);
         Utility::Trace secondTrace(second);
         firstTrace << "through the first" << std::endl;
@@ -99,7 +96,7 @@ TEST_F(TraceTest, SecondNameIsIgnoredAndWritesGoToFirstFile) {
 
 TEST_F(TraceTest, FailedOpenIsNeverRetried) {
     std::string const good = path("good.Trace");
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         Utility::Trace failed(path("missing/folder.Trace"));
         Utility::Trace later(good);
         later << "lost" << std::endl;
@@ -116,7 +113,7 @@ TEST_F(TraceTest, FailedOpenIsNeverRetried) {
 
 TEST_F(TraceTest, TextWrittenBeforeTheOpenIsLostForThatObject) {
     std::string const file = path("main.Trace");
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         Utility::Trace unit("");
         unit << "too early" << std::endl;
         Utility::Trace mainTrace(file);
@@ -134,7 +131,7 @@ TEST_F(TraceTest, TextWrittenBeforeTheOpenIsLostForThatObject) {
 
 TEST_F(TraceTest, DestroyingMainTraceWhileUnitTraceLivesKeepsFileOpen) {
     std::string const file = path("main.Trace");
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         Utility::Trace unit("");
         {
             Utility::Trace mainTrace(file);
@@ -151,7 +148,7 @@ TEST_F(TraceTest, DestroyingMainTraceWhileUnitTraceLivesKeepsFileOpen) {
 
 TEST_F(TraceTest, LastTraceObjectClosesTheFileAndWritesBufferedText) {
     std::string const file = path("main.Trace");
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         std::filebuf* shared = nullptr;
         {
             Utility::Trace mainTrace(file);
@@ -172,7 +169,7 @@ TEST_F(TraceTest, LastTraceObjectClosesTheFileAndWritesBufferedText) {
 
 TEST_F(TraceTest, ClassWideMembersFollowTheObjectsLifetimes) {
     std::string const file = path("main.Trace");
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         int const before = Utility::Trace::ms_ObjectCounter;
         Utility::Trace unit("");
         // cppcheck-suppress knownConditionTrueFalse ; trace objects change the class-wide members
@@ -216,7 +213,7 @@ TEST_F(TraceTest, AllObjectsShareOneBuffer) {
 
 TEST_F(TraceTest, TraceHasNoPrefixOrTimeStampOfItsOwn) {
     std::string const file = path("main.Trace");
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         Utility::Trace mainTrace(file);
         mainTrace << "PYLON_VPD_Survey_ClientPartition::main" << std::endl;
         mainTrace << 42 << ' ' << -1;
@@ -229,13 +226,13 @@ TEST_F(TraceTest, TraceHasNoPrefixOrTimeStampOfItsOwn) {
 TEST_F(TraceTest, ShellCommandRunWritesExactBlock) {
     std::string const file = path("main.Trace");
     std::string const command = R"(sh -c "printf 'out\n'; printf 'err1\nerr2' >&2; exit 2")";
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         Utility::Trace mainTrace(file);
         Utility::ShellCommand shellCommand(command);
         return shellCommand.execute() == 2 ? 0 : failWith("unexpected code");
     });
     std::string const trace = QuorvexTest::readFile(file);
-    EXPECT_EQ(TestUtility::u_normalise_TemporaryNames(trace),
+    EXPECT_EQ(QuorvexTest::normaliseTemporaryNames(trace),
               "\n****** ShellCommand::execute ******\n" + command +
                   " > /tmp/ShellCommand.XXXXXX 2> /tmp/ShellCommand.XXXXXX\n"
                   "RC = 2\n"
@@ -254,7 +251,7 @@ TEST_F(TraceTest, ShellCommandRunWritesExactBlock) {
 
 TEST_F(TraceTest, RepeatedRunsTraceAllLinesSoFar) {
     std::string const file = path("main.Trace");
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         Utility::Trace mainTrace(file);
         Utility::ShellCommand shellCommand("echo line");
         shellCommand.set_ExecuteOnlyOnce(false);
@@ -265,21 +262,21 @@ TEST_F(TraceTest, RepeatedRunsTraceAllLinesSoFar) {
     std::string const block = "\n****** ShellCommand::execute ******\n"
                               "echo line > /tmp/ShellCommand.XXXXXX 2> /tmp/ShellCommand.XXXXXX\n"
                               "RC = 0\n";
-    EXPECT_EQ(TestUtility::u_normalise_TemporaryNames(QuorvexTest::readFile(file)),
+    EXPECT_EQ(QuorvexTest::normaliseTemporaryNames(QuorvexTest::readFile(file)),
               block + "STDOUT\nline\n\nSTDERR\n\n\n\n" + block +
                   "STDOUT\nline\n\nline\n\nSTDERR\n\n\n\n\n");
 }
 
 TEST_F(TraceTest, SystemFailureIsTracedAsMinusOne) {
     std::string const file = path("main.Trace");
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         std::signal(SIGCHLD, SIG_IGN);
         Utility::Trace mainTrace(file);
         Utility::ShellCommand shellCommand("true");
         shellCommand.execute();
         return 0;
     });
-    EXPECT_EQ(TestUtility::u_normalise_TemporaryNames(QuorvexTest::readFile(file)),
+    EXPECT_EQ(QuorvexTest::normaliseTemporaryNames(QuorvexTest::readFile(file)),
               "\n****** ShellCommand::execute ******\n"
               "true > /tmp/ShellCommand.XXXXXX 2> /tmp/ShellCommand.XXXXXX\n"
               "RC = -1\nSTDOUT\n\nSTDERR\n\n\n\n");
@@ -311,7 +308,7 @@ TEST_F(TraceTest, TimeStampAtMidnightHourIsBlankAndZero) {
 
 TEST_F(TraceTest, TimeStampHasClockFormatWithoutLineEnd) {
     std::string const file = path("time.Trace");
-    TestUtility::u_run_InFreshProcess([&] {
+    QuorvexTest::runInFreshProcess([&] {
         Utility::Trace trace(file);
         Utility::timeStamp(trace);
         trace << "|";

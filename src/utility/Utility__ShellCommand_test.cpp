@@ -1,6 +1,6 @@
 #include "utility/Utility__ShellCommand.h"
 
-#include "utility/Utility_Test_Utility.h"
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -27,10 +27,10 @@ TEST(Utility__ShellCommand_PrintText, NoLinesWriteNothing) {
 }
 
 TEST(Utility__ShellCommand_PrintText, FlushesOnceAtTheEnd) {
-    Utility::Utility_Test_Utility::FlushCountingBuffer buffer;
+    QuorvexTest::FlushCountingBuffer buffer;
     std::ostream out(&buffer);
     Utility::Utility__ShellCommand::_u_PrintText(out, {"a", "b", "c"}, "");
-    EXPECT_EQ(buffer.get_NumberOf_Flushes(), 1);
+    EXPECT_EQ(buffer.flushes(), 1);
     EXPECT_EQ(buffer.str(), "a\nb\nc\n");
 }
 

@@ -1,6 +1,6 @@
 #include "vpd/ResourceSet.h"
 
-#include "vpd/TreeText_test.h"
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -12,7 +12,7 @@ using Quorvex::VPD::Property;
 using Quorvex::VPD::Resource;
 using Quorvex::VPD::ResourceList;
 using Quorvex::VPD::ResourceSet;
-using TreeText_test::u_resource;
+using QuorvexTest::resourceText;
 
 using ResourcePart = Quorvex::VPD::ResourceSet_ContainerInterface_Element_Resource;
 using ListsPart = Quorvex::VPD::ResourceSet_ContainerInterface_Element_ListOf_ResourceLists;
@@ -22,7 +22,7 @@ std::string u_lists(ResourceSet const& set) {
     for (auto const& list : set.get_ListOf_ResourceLists()) {
         text += "[" + list.first + ":";
         for (auto const& member : list.second) {
-            text += u_resource(member.second);
+            text += resourceText(member.second);
         }
         text += "]";
     }
@@ -79,7 +79,7 @@ TEST(VPD_ResourceSet, SetsWithDifferentClassLeaveItUnchanged) {
     other.set_Resource(resource);
     other.insert_ResourceList(u_list("Partitions", Resource("p", "p")));
     set += other;
-    EXPECT_EQ(u_resource(set.get_Resource()), "(m|m|){}");
+    EXPECT_EQ(resourceText(set.get_Resource()), "(m|m|){}");
     EXPECT_EQ(set.get_NumberOf_ResourceLists(), 0u);
 }
 
@@ -98,7 +98,7 @@ TEST(VPD_ResourceSet, MergeJoinsResourcesAndListsButNotAttributesOrFlags) {
     other.insert_ResourceList(u_list("Enclosures", Resource("e", "e")));
 
     set += other;
-    EXPECT_EQ(u_resource(set.get_Resource()),
+    EXPECT_EQ(resourceText(set.get_Resource()),
               "(m|m|){SE=serial;TM=first;}[Partitions/Partitions:(p|p|){}]");
     EXPECT_EQ(u_lists(set), "[Enclosures:(e|e|){}]");
     EXPECT_EQ(set.get_Type(), "Hardware");
@@ -117,7 +117,7 @@ TEST(VPD_ResourceSet, MergeWithDifferentResourceIDKeepsTheResource) {
     other.set_Resource(stranger);
     other.insert_ResourceList(u_list("Cards", Resource("c", "c")));
     set += other;
-    EXPECT_EQ(u_resource(set.get_Resource()), "(m|m|){}");
+    EXPECT_EQ(resourceText(set.get_Resource()), "(m|m|){}");
     EXPECT_EQ(u_lists(set), "[Cards:(c|c|){}]");
 }
 
@@ -139,7 +139,7 @@ TEST(VPD_ResourceSet, MergeWithASetWithoutListsKeepsTheListsAndStillJoinsTheReso
     machine.insert_Property(Property("SE", "serial"));
     other.set_Resource(machine);
     set += other;
-    EXPECT_EQ(u_resource(set.get_Resource()), "(m|m|){SE=serial;}");
+    EXPECT_EQ(resourceText(set.get_Resource()), "(m|m|){SE=serial;}");
     EXPECT_EQ(u_lists(set), "[Cards:(a|a|){}]");
 }
 
@@ -154,7 +154,7 @@ TEST(VPD_ResourceSet, CopyIsDeepAndIndependent) {
     copy.get_Resource().insert_Resource("Partitions", Resource("q", "q"));
     copy.insert_ResourceList(u_list("Cards", Resource("d", "d")));
 
-    EXPECT_EQ(u_resource(set.get_Resource()), "(m|m|){}[Partitions/Partitions:(p|p|){}]");
+    EXPECT_EQ(resourceText(set.get_Resource()), "(m|m|){}[Partitions/Partitions:(p|p|){}]");
     EXPECT_EQ(u_lists(set), "[Cards:(c|c|){}]");
     EXPECT_TRUE(copy.ResourcePart::isActive());
     EXPECT_TRUE(copy.ListsPart::isActive());
@@ -167,7 +167,7 @@ TEST(VPD_ResourceSet, AssignmentCopiesFlagsAndContent) {
     target = active;
     EXPECT_TRUE(target.ResourcePart::isActive());
     EXPECT_FALSE(target.ListsPart::isActive());
-    EXPECT_EQ(u_resource(target.get_Resource()), "(m|m|){}");
+    EXPECT_EQ(resourceText(target.get_Resource()), "(m|m|){}");
     target = ResourceSet();
     EXPECT_FALSE(target.ResourcePart::isActive());
 }

@@ -2,7 +2,8 @@
 
 #include "vpd/ResourceList.h"
 #include "vpd/ResourceSet.h"
-#include "vpd/TreeText_test.h"
+
+#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -18,7 +19,7 @@ using Quorvex::VPD::Property;
 using Quorvex::VPD::PropertyGroup;
 using Quorvex::VPD::Resource;
 using Quorvex::VPD::ResourceList;
-using TreeText_test::u_resource;
+using QuorvexTest::resourceText;
 
 Resource u_resource(std::string const& id, std::vector<Property> const& properties) {
     Resource resource("name-" + id, id);
@@ -47,7 +48,7 @@ std::string const gc_ThreeLevelTree = "(name-machine|machine|){TM=1234-ABC;}[Par
 
 TEST(VPD_Resource, DefaultIsEmpty) {
     Resource const resource;
-    EXPECT_EQ(u_resource(resource), "(||){}");
+    EXPECT_EQ(resourceText(resource), "(||){}");
     EXPECT_EQ(resource.get_NumberOf_Properties(), 0u);
     EXPECT_EQ(resource.get_NumberOf_PropertyGroups(), 0u);
     EXPECT_EQ(resource.get_NumberOf_ResourceLists(), 0u);
@@ -79,7 +80,7 @@ TEST(VPD_Resource, InsertResourceNamesAnUnnamedListFoundUnderTheKey) {
     Resource machine("m", "m");
     machine.get_ListOf_ResourceLists().find_orCreate("Cards");
     machine.insert_Resource("Cards", Resource("c", "c"));
-    EXPECT_EQ(u_resource(machine), "(m|m|){}[Cards/Cards:(c|c|){}]");
+    EXPECT_EQ(resourceText(machine), "(m|m|){}[Cards/Cards:(c|c|){}]");
 }
 
 TEST(VPD_Resource, SameUniqueIDInOneListMergesPropertiesFirstValueKept) {
@@ -88,7 +89,7 @@ TEST(VPD_Resource, SameUniqueIDInOneListMergesPropertiesFirstValueKept) {
                             u_resource("p1", {Property("HN", "first"), Property("OS", "Zeph")}));
     machine.insert_Resource("Partitions",
                             u_resource("p1", {Property("HN", "second"), Property("PT", "1")}));
-    EXPECT_EQ(u_resource(machine),
+    EXPECT_EQ(resourceText(machine),
               "(m|m|){}[Partitions/Partitions:(name-p1|p1|){HN=first;OS=Zeph;PT=1;}]");
 }
 
@@ -99,8 +100,9 @@ TEST(VPD_Resource, ResourcesIterateByUniqueIDAndListsByName) {
     machine.insert_Resource("Partitions", Resource("x", "A-1"));
     machine.insert_Resource("Enclosures", Resource("e", "E"));
     machine.insert_Resource("Cards", Resource("c", "C"));
-    EXPECT_EQ(u_resource(machine), "(m|m|){}[Cards/Cards:(c|C|){}][Enclosures/Enclosures:(e|E|){}]"
-                                   "[Partitions/Partitions:(x|A-1|){}(y|A-10|){}(z|B-2|){}]");
+    EXPECT_EQ(resourceText(machine),
+              "(m|m|){}[Cards/Cards:(c|C|){}][Enclosures/Enclosures:(e|E|){}]"
+              "[Partitions/Partitions:(x|A-1|){}(y|A-10|){}(z|B-2|){}]");
 }
 
 TEST(VPD_Resource, MergeWithDifferentUniqueIDLeavesItUnchanged) {
@@ -108,7 +110,7 @@ TEST(VPD_Resource, MergeWithDifferentUniqueIDLeavesItUnchanged) {
     Resource other = u_resource("other", {Property("SE", "x")});
     other.insert_Resource("Partitions", Resource("p9", "p9"));
     machine += other;
-    EXPECT_EQ(u_resource(machine), gc_ThreeLevelTree);
+    EXPECT_EQ(resourceText(machine), gc_ThreeLevelTree);
 }
 
 TEST(VPD_Resource, MergeKeepsDisplayNameAndReferences) {
@@ -118,7 +120,7 @@ TEST(VPD_Resource, MergeKeepsDisplayNameAndReferences) {
     other.set_References("ref-2");
     other.insert_Property(Property("SE", "x"));
     resource += other;
-    EXPECT_EQ(u_resource(resource), "(first|id|ref-1){SE=x;}");
+    EXPECT_EQ(resourceText(resource), "(first|id|ref-1){SE=x;}");
 }
 
 TEST(VPD_Resource, MergeJoinsNestedTreesRecursively) {
@@ -136,7 +138,7 @@ TEST(VPD_Resource, MergeJoinsNestedTreesRecursively) {
     other.insert_Resource("Enclosures", u_resource("enc1", {}));
 
     machine += other;
-    EXPECT_EQ(u_resource(machine),
+    EXPECT_EQ(resourceText(machine),
               "(name-machine|machine|){SE=10ABCDE;TM=1234-ABC;}"
               "[Enclosures/Enclosures:(name-enc1|enc1|){}]"
               "[Partitions/Partitions:"
@@ -159,13 +161,13 @@ TEST(VPD_Resource, MergeJoinsPropertyGroupsOfTheSameName) {
     other.insert_PropertyGroup(second);
     other.insert_PropertyGroup(PropertyGroup("Cpu"));
     resource += other;
-    EXPECT_EQ(u_resource(resource), "(r|r|){}<Cpu{}><Memory{LO=slot;SZ=1;}>");
+    EXPECT_EQ(resourceText(resource), "(r|r|){}<Cpu{}><Memory{LO=slot;SZ=1;}>");
 }
 
 TEST(VPD_Resource, MergeWithItselfChangesNothing) {
     Resource machine = u_threeLevelTree();
     machine += machine;
-    EXPECT_EQ(u_resource(machine), gc_ThreeLevelTree);
+    EXPECT_EQ(resourceText(machine), gc_ThreeLevelTree);
 }
 
 TEST(VPD_Resource, CopiedResourceNestedListsAreIndependent) {
@@ -180,8 +182,8 @@ TEST(VPD_Resource, CopiedResourceNestedListsAreIndependent) {
     partition.insert_Resource("Disks", Resource("disk1", "disk1"));
     copy.insert_Resource("Enclosures", Resource("enc1", "enc1"));
 
-    EXPECT_EQ(u_resource(source), gc_ThreeLevelTree);
-    EXPECT_NE(u_resource(copy), gc_ThreeLevelTree);
+    EXPECT_EQ(resourceText(source), gc_ThreeLevelTree);
+    EXPECT_NE(resourceText(copy), gc_ThreeLevelTree);
 }
 
 TEST(VPD_Resource, ChangingTheSourceLeavesTheCopyUnchanged) {
@@ -191,7 +193,7 @@ TEST(VPD_Resource, ChangingTheSourceLeavesTheCopyUnchanged) {
         .find_orCreate("Partitions")
         .find_orCreate("lpar1")
         .insert_Resource("Adapters", Resource("card2", "card2"));
-    EXPECT_EQ(u_resource(copy), gc_ThreeLevelTree);
+    EXPECT_EQ(resourceText(copy), gc_ThreeLevelTree);
 }
 
 TEST(VPD_Resource, AssignedResourceIsADeepIndependentCopy) {
@@ -199,27 +201,27 @@ TEST(VPD_Resource, AssignedResourceIsADeepIndependentCopy) {
     Resource target = u_resource("old", {Property("OS", "x")});
     target.insert_Resource("Old", Resource("o", "o"));
     target = source;
-    EXPECT_EQ(u_resource(target), gc_ThreeLevelTree);
+    EXPECT_EQ(resourceText(target), gc_ThreeLevelTree);
     target.get_ListOf_ResourceLists()
         .find_orCreate("Partitions")
         .find_orCreate("lpar1")
         .insert_Property(Property("OS", "changed"));
-    EXPECT_EQ(u_resource(source), gc_ThreeLevelTree);
+    EXPECT_EQ(resourceText(source), gc_ThreeLevelTree);
 }
 
 TEST(VPD_Resource, SelfAssignmentKeepsTheTree) {
     Resource resource = u_threeLevelTree();
     Resource& same = resource;
     resource = same;
-    EXPECT_EQ(u_resource(resource), gc_ThreeLevelTree);
+    EXPECT_EQ(resourceText(resource), gc_ThreeLevelTree);
 }
 
 TEST(VPD_Resource, AssigningANestedResourceToItsOwnAncestorIsSafe) {
     Resource machine = u_threeLevelTree();
     machine = machine.get_ListOf_ResourceLists().find("Partitions").find("lpar1");
-    EXPECT_EQ(u_resource(machine), "(name-lpar1|lpar1|){HN=host1;}[Adapters/Adapters:"
-                                   "(name-card1|card1|){FN=00E1234;}[Ports/Ports:"
-                                   "(name-port1|port1|){LO=P1-C1-T1;}]]");
+    EXPECT_EQ(resourceText(machine), "(name-lpar1|lpar1|){HN=host1;}[Adapters/Adapters:"
+                                     "(name-card1|card1|){FN=00E1234;}[Ports/Ports:"
+                                     "(name-port1|port1|){LO=P1-C1-T1;}]]");
 }
 
 // A resource owns its resource lists through a pointer that only its copy
@@ -228,11 +230,11 @@ TEST(VPD_Resource, AssigningANestedResourceToItsOwnAncestorIsSafe) {
 TEST(VPD_Resource, MovingCopiesAndLeavesTheSourceWhole) {
     Resource source = u_threeLevelTree();
     Resource const moved(std::move(source)); // NOLINT(performance-move-const-arg)
-    EXPECT_EQ(u_resource(moved), gc_ThreeLevelTree);
-    EXPECT_EQ(u_resource(source), gc_ThreeLevelTree); // NOLINT(bugprone-use-after-move)
+    EXPECT_EQ(resourceText(moved), gc_ThreeLevelTree);
+    EXPECT_EQ(resourceText(source), gc_ThreeLevelTree); // NOLINT(bugprone-use-after-move)
     Resource target;
-    target = std::move(source);                       // NOLINT(performance-move-const-arg)
-    EXPECT_EQ(u_resource(source), gc_ThreeLevelTree); // NOLINT(bugprone-use-after-move)
+    target = std::move(source);                         // NOLINT(performance-move-const-arg)
+    EXPECT_EQ(resourceText(source), gc_ThreeLevelTree); // NOLINT(bugprone-use-after-move)
     EXPECT_TRUE(source.insert_Resource("Partitions", Resource("p", "p")));
 }
 
@@ -250,7 +252,7 @@ TEST(VPD_Resource, InsertResourceListMergesAListOfTheSameName) {
     second.insert(Resource("b", "b"));
     machine.insert_ResourceList(first);
     machine.insert_ResourceList(second);
-    EXPECT_EQ(u_resource(machine), "(m|m|){}[Partitions/Partitions:(a|a|){}(b|b|){}]");
+    EXPECT_EQ(resourceText(machine), "(m|m|){}[Partitions/Partitions:(a|a|){}(b|b|){}]");
 }
 
 TEST(VPD_Resource, PropertiesAndGroupsAreReachableByKey) {

@@ -1,7 +1,5 @@
 #include "EndToEndScenario.h"
 
-#include "survey/SurveyTest_Utility.h"
-
 #include <algorithm>
 #include <cstdlib>
 #include <ctime>
@@ -53,7 +51,7 @@ public:
 } // namespace
 
 std::vector<std::string> EndToEndScenario::list() {
-    return SurveyTest_Utility::u_list_Folder(gc_ScenarioFolder);
+    return QuorvexTest::listFolder(gc_ScenarioFolder);
 }
 
 std::string EndToEndScenario::testName(::testing::TestParamInfo<std::string> const& info) {
@@ -105,7 +103,7 @@ std::string EndToEndScenario::_consoleScenario() const {
 void EndToEndScenario::_placeEarlierFiles() const {
     std::string const before = _scenarioFile("before/VPD");
     std::string const beforePrefix = before + "/";
-    for (std::string const& name : SurveyTest_Utility::u_list_Folder(before)) {
+    for (std::string const& name : QuorvexTest::listFolder(before)) {
         QuorvexTest::writeFile(_vpdFolder.file(name), QuorvexTest::readFile(beforePrefix + name));
     }
 }
@@ -138,14 +136,13 @@ std::vector<std::string> EndToEndScenario::_command(std::vector<std::string> con
 
 void EndToEndScenario::_expectVPDFolder() const {
     std::string const expectedFolder = _scenarioFile("expected/VPD");
-    std::vector<std::string> const names = SurveyTest_Utility::u_list_Folder(_vpdFolder.path());
-    EXPECT_EQ(names, SurveyTest_Utility::u_list_Folder(expectedFolder))
-        << "files in the VPD folder";
+    std::vector<std::string> const names = QuorvexTest::listFolder(_vpdFolder.path());
+    EXPECT_EQ(names, QuorvexTest::listFolder(expectedFolder)) << "files in the VPD folder";
     std::string const expectedPrefix = expectedFolder + "/";
     for (std::string const& name : names) {
         std::string const expected = u_read_Optional(expectedPrefix + name);
-        EXPECT_EQ(SurveyTest_Utility::u_normalise_TimeStamps(
-                      QuorvexTest::readFile(_vpdFolder.file(name)), _first, _last),
+        EXPECT_EQ(QuorvexTest::normaliseTimeStamps(QuorvexTest::readFile(_vpdFolder.file(name)),
+                                                   _first, _last),
                   expected)
             << "VPD file " << name;
     }
@@ -156,11 +153,12 @@ void EndToEndScenario::_expectTrace() const {
     std::vector<std::string> const expectedNames = QuorvexTest::fileExists(expectedPath)
                                                        ? std::vector<std::string>{gc_TraceFileName}
                                                        : std::vector<std::string>{};
-    std::vector<std::string> const names = SurveyTest_Utility::u_list_Folder(_traceFolder.path());
+    std::vector<std::string> const names = QuorvexTest::listFolder(_traceFolder.path());
     ASSERT_EQ(names, expectedNames) << "files in the trace folder";
     if (!names.empty()) {
-        EXPECT_EQ(SurveyTest_Utility::u_normalise_TemporaryNames(
-                      QuorvexTest::readFile(_traceFolder.file(gc_TraceFileName))),
+        EXPECT_EQ(QuorvexTest::normaliseTemporaryNames(
+                      QuorvexTest::readFile(_traceFolder.file(gc_TraceFileName)),
+                      QuorvexTest::TemporaryNames::Numbered),
                   QuorvexTest::readFile(expectedPath));
     }
 }

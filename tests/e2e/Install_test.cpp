@@ -2,8 +2,6 @@
 // checks what a console gets: the tool, its manual page and the two result
 // folders; then runs the installed tool once inside the sandbox.
 
-#include "survey/SurveyTest_Utility.h"
-
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
@@ -40,8 +38,7 @@ bool u_is_ExecutableFile(std::string const& path) {
 void u_expect_ResultFolders(std::string const& destDir) {
     for (char const* folder : {"/var/adm/quorvex/VPD", "/var/adm/quorvex/Trace"}) {
         EXPECT_TRUE(fs::is_directory(destDir + folder)) << destDir + folder;
-        EXPECT_TRUE(SurveyTest_Utility::u_list_Folder(destDir + folder).empty())
-            << destDir + folder;
+        EXPECT_TRUE(QuorvexTest::listFolder(destDir + folder).empty()) << destDir + folder;
     }
 }
 
@@ -94,7 +91,7 @@ TEST(SurveyInstallation, InstalledToolSurveysAMachineInTheSandbox) {
     EXPECT_EQ(QuorvexTest::readFile(vpdFolder.file(
                   "quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-1.VPD.xml")),
               "<fetched/>");
-    EXPECT_EQ(SurveyTest_Utility::u_list_Folder(traceFolder.path()),
+    EXPECT_EQ(QuorvexTest::listFolder(traceFolder.path()),
               std::vector<std::string>{"quorvexPYLON_VPD_Survey_ClientPartition.Trace"});
 }
 

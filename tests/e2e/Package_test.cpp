@@ -8,8 +8,6 @@
 
 #include "EndToEndScenario.h"
 
-#include "survey/SurveyTest_Utility.h"
-
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
@@ -130,8 +128,7 @@ void u_expect_Unpacked(std::string const& root) {
     EXPECT_EQ(QuorvexTest::readFile(manualPage), QuorvexTest::readFile(QUORVEX_MANUAL_PAGE));
     for (char const* folder : {"/var/adm/quorvex/VPD", "/var/adm/quorvex/Trace"}) {
         EXPECT_TRUE(fs::is_directory(root + folder)) << folder;
-        EXPECT_EQ(SurveyTest_Utility::u_list_Folder(root + folder), std::vector<std::string>{})
-            << folder;
+        EXPECT_EQ(QuorvexTest::listFolder(root + folder), std::vector<std::string>{}) << folder;
     }
 }
 

@@ -1,7 +1,5 @@
 #include "FaultRun.h"
 
-#include "survey/SurveyTest_Utility.h"
-
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -115,12 +113,12 @@ std::string const& FaultRun::vpdFolder() const {
 }
 
 std::vector<std::string> FaultRun::vpdFiles() const {
-    return SurveyTest_Utility::u_list_Folder(_vpdFolder.path());
+    return QuorvexTest::listFolder(_vpdFolder.path());
 }
 
 std::string FaultRun::vpdFile(std::string const& name) const {
-    return SurveyTest_Utility::u_normalise_TimeStamps(QuorvexTest::readFile(_vpdFolder.file(name)),
-                                                      _first, _last);
+    return QuorvexTest::normaliseTimeStamps(QuorvexTest::readFile(_vpdFolder.file(name)), _first,
+                                            _last);
 }
 
 bool FaultRun::hasTrace() const {
@@ -128,8 +126,9 @@ bool FaultRun::hasTrace() const {
 }
 
 std::string FaultRun::trace() const {
-    return SurveyTest_Utility::u_normalise_TemporaryNames(
-        QuorvexTest::readFile(_traceFolder.file(gc_TraceFileName)));
+    return QuorvexTest::normaliseTemporaryNames(
+        QuorvexTest::readFile(_traceFolder.file(gc_TraceFileName)),
+        QuorvexTest::TemporaryNames::Numbered);
 }
 
 std::string FaultRun::calls() const {

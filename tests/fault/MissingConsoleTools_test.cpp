@@ -7,8 +7,6 @@
 
 #include "FaultRun.h"
 
-#include "survey/SurveyTest_Utility.h"
-
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
@@ -83,7 +81,7 @@ TEST_F(MissingConsoleTool, MissingRemoteActionToolFailsEveryTriedPartitionAtTheC
                                      gc_Prefix + "-3.VPD.xml\n");
     EXPECT_EQ(result.stderrText, "8\n8\n\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n8");
     std::vector<std::string> const files = run.vpdFiles();
-    ASSERT_EQ(files, SurveyTest_Utility::u_list_Folder(gc_Expected + std::string("/VPD")));
+    ASSERT_EQ(files, QuorvexTest::listFolder(gc_Expected + std::string("/VPD")));
     for (std::string const& name : files) {
         EXPECT_EQ(run.vpdFile(name), QuorvexTest::readFile(gc_Expected + ("/VPD/" + name))) << name;
     }

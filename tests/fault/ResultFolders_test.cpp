@@ -5,8 +5,6 @@
 
 #include "FaultRun.h"
 
-#include "survey/SurveyTest_Utility.h"
-
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
@@ -81,7 +79,7 @@ TEST_F(FaultInResultFolders, MissingTraceFolderLosesOnlyTheTraceAndIsNotCreated)
     u_expect_DemoOutputs(run, result);
     EXPECT_EQ(run.quorvexFolders(), std::vector<std::string>{"VPD"});
     std::vector<std::string> const files = run.vpdFiles();
-    ASSERT_EQ(files, SurveyTest_Utility::u_list_Folder(std::string(gc_Demo) + "/VPD"));
+    ASSERT_EQ(files, QuorvexTest::listFolder(std::string(gc_Demo) + "/VPD"));
     for (std::string const& name : files) {
         EXPECT_EQ(run.vpdFile(name), u_expected("VPD/" + name)) << name;
     }
