@@ -64,7 +64,7 @@ void u_create_DefaultXML_forFailedPartition(Quorvex::System::Partition const& pa
     if (!_u_build_DefaultDocument(partition, reason, set)) {
         return;
     }
-    std::ofstream document(std::string(Quorvex::PYLON::VPD::gc_QuorvexDirectory) + localFileName);
+    std::ofstream document(Quorvex::PYLON::VPD::get_LocalResultPath(localFileName));
     Transform::VPD_2_OStream{document}(set);
     document.flush();
     document.close();

@@ -13,16 +13,9 @@
 
 namespace {
 
-constexpr char gc_StatusSuffix[] = ".status";
 constexpr char gc_NoPartitions[] = "No ACTIVE Partition Found.";
 // Only machines of this object type have their partitions listed.
 constexpr unsigned int gc_ManagedMachineType = 0;
-
-std::string u_get_StatusFileName(std::string const& machineIdentity) {
-    return std::string(Quorvex::PYLON::VPD::gc_QuorvexDirectory) +
-           Quorvex::PYLON::VPD::gc_VPD_Folder + Quorvex::PYLON::VPD::gc_ProgramName + "_" +
-           machineIdentity + gc_StatusSuffix;
-}
 
 // Per partition: the file name on standard output and the code on standard
 // error when a file name was recorded, and in every case the status line.
@@ -46,7 +39,7 @@ void u_report_Partitions(Quorvex::PYLON::ListOf_Partitions const& partitions,
 
 void VPD_Survey_ClientPartition(std::string const& machineIdentity) {
     // A status file that cannot be opened loses its lines silently.
-    std::ofstream status(u_get_StatusFileName(machineIdentity));
+    std::ofstream status(Quorvex::PYLON::VPD::get_StatusFileName(machineIdentity));
     Quorvex::System::MTMS const mtms(machineIdentity);
     Quorvex::PYLON::Machine const machine(gc_ManagedMachineType, mtms);
     Quorvex::PYLON::ListOf_Partitions partitions;
