@@ -29,6 +29,7 @@ TargetPartition& Base::get_TargetPartition() {
 }
 
 std::string Base::createString_Command() const {
+    // Kept for the remote action tool: see docs/compatibility.md#four-colons
     // The tool expects an empty field between the class name and the action,
     // hence four colons in a row.
     std::ostringstream command;

@@ -25,11 +25,13 @@ InputParameter::InputParameter(unsigned int argc, char** argv) : _Parameters() {
         if (i + 1 < argc && argv[i + 1] != nullptr && !_u_is_Option(argv[i + 1])) {
             value = argv[++i];
         }
+        // Kept for the console's scripts: see docs/compatibility.md#command-line
         // insert() keeps the value already there: the first occurrence wins.
         _Parameters.insert({option, value});
     }
 }
 
+// The copy is empty. Kept for the class's callers: see docs/compatibility.md#input-parameter-copy
 InputParameter::InputParameter(InputParameter const&) : _Parameters() {}
 
 InputParameter& InputParameter::operator=(InputParameter const& other) {

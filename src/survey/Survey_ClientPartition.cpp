@@ -23,6 +23,7 @@ namespace Survey_Utility = ::Quorvex_PYLON_VPD_Survey_ClientPartition_Utility;
 constexpr char gc_Surveyed[] = "0";
 constexpr char gc_NotSurveyed[] = "8";
 constexpr char gc_Ok[] = "Ok";
+// Kept for status-file scripts: see docs/compatibility.md#inactive-partition
 constexpr char gc_Inactive[] = "Failed - Active Status < 3";
 // Statuses 0, 1 and 2 mean the partition is not running.
 constexpr unsigned int gc_HighestInactiveStatus = 2;
@@ -31,6 +32,7 @@ constexpr unsigned int gc_HighestInactiveStatus = 2;
 // the partition's client: see docs/compatibility.md#client-options
 constexpr char gc_ClientOptions[] = " -v  -of ";
 
+// Kept for status-file scripts: see docs/compatibility.md#status-overwrite
 // The status text is written over its seed from the seed's first character.
 constexpr char gc_ClientFailedSeed[] = "survey Failed : ";
 constexpr char gc_FetchFailedSeed[] = "get result Failed, rc = ";
@@ -67,6 +69,7 @@ ResultNames u_form_ResultNames(::Quorvex::System::Partition const& partition) {
 // an unsigned 32-bit number, so -1 reads 4294967295) are written from the
 // seed's first character on: what is written replaces that many characters
 // of the seed, and the rest of the seed stays.
+// Kept for status-file scripts: see docs/compatibility.md#unsigned-codes
 ::std::string u_write_OverSeed(char const* seed, char const* message, int const& code) {
     ::std::stringstream status(seed);
     status << message << static_cast<unsigned int>(code);
@@ -88,6 +91,8 @@ bool u_has_ClientFailed(int const& result, ::Quorvex::RELAY::ReturnCode const& r
     return result != 0 || returnCode.get_Rc() != 0 || returnCode.get_RcCmd() != 0;
 }
 
+// The status shows Rc even when only the exit code failed. Kept for status-file scripts: see
+// docs/compatibility.md#status-shows-rc
 bool u_has_ChannelFailed(int const& result, ::Quorvex::RELAY::ReturnCode const& returnCode) {
     return result != 0 || returnCode.get_Rc() != 0;
 }

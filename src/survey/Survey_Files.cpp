@@ -6,6 +6,8 @@ namespace {
 
 // The console folder under which the VPD and Trace folders lie. The only
 // place in the tool that names it; the installation creates the two folders.
+// Never created by the tool. Kept for the console's scripts: see
+// docs/compatibility.md#result-folders
 constexpr char gc_QuorvexDirectory[] = "/var/adm/quorvex/";
 // The folder of the status and result files, relative to gc_QuorvexDirectory.
 constexpr char gc_VPD_Folder[] = "VPD/";
@@ -29,6 +31,8 @@ std::string get_StatusFileName(std::string const& machineIdentity) {
            machineIdentity + gc_StatusSuffix;
 }
 
+// Two listed partitions of one identity share it. Kept for the inventory importers: see
+// docs/compatibility.md#shared-result-file
 std::string get_LocalResultName(std::string const& partitionText) {
     return std::string(gc_VPD_Folder) + gc_ProgramName + gc_NameSeparator + partitionText +
            gc_ResultSuffix;

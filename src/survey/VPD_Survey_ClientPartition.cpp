@@ -13,6 +13,8 @@
 
 namespace {
 
+// Also when the listing failed. Kept for status-file scripts: see
+// docs/compatibility.md#no-partition-found
 constexpr char gc_NoPartitions[] = "No ACTIVE Partition Found.";
 // Only machines of this object type have their partitions listed.
 constexpr unsigned int gc_ManagedMachineType = 0;
@@ -25,11 +27,14 @@ void u_report_Partitions(Quorvex::PYLON::ListOf_Partitions const& partitions,
                          std::vector<std::string> const& statusTexts, std::ostream& status) {
     for (std::size_t i = 0; i < fileNames.size(); ++i) {
         if (!fileNames[i].empty()) {
+            // Kept for the console's scripts: see docs/compatibility.md#streams-per-partition
             // Flushed per line, so that names and codes interleave in order
             // when both streams go to one file.
             std::cout << fileNames[i] << std::endl;
             std::cerr << returnCodes[i] << std::endl;
         }
+        // Host and IP as listed, the status text as recorded. Kept for status-file scripts: see
+        // docs/compatibility.md#status-line
         status << partitions[i].get_HostName() << " [" << partitions[i].get_IP()
                << "] - VPD Survey - " << statusTexts[i] << std::endl;
     }

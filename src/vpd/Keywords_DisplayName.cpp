@@ -9,6 +9,7 @@ struct KeywordRow {
     const char* displayName;
 };
 
+// Kept for the inventory importers: see docs/compatibility.md#keyword-display-names
 // Inserted in this order. The texts go unchanged into every VPD document
 // that other programs read.
 constexpr KeywordRow gc_KeywordRows[] = {

@@ -6,6 +6,7 @@ ListOf_Elements::ListOf_Elements() = default;
 
 ListOf_Elements::ListOf_Elements(ListOf_Elements const& other) = default;
 
+// Kept for the class's callers: see docs/compatibility.md#element-list-assignment
 // Assignment copies nothing and refers to the source, as the element list's
 // assignment is declared to do.
 // cppcheck-suppress operatorEqRetRefThis
