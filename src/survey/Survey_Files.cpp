@@ -4,10 +4,11 @@ namespace Quorvex::PYLON::VPD {
 
 namespace {
 
-// The console folder under which the VPD and Trace folders lie. The only
-// place in the tool that names it; the installation creates the two folders.
-// Never created by the tool. Kept for the console's scripts: see
-// docs/compatibility.md#result-folders
+// The console folder under which the VPD and Trace folders lie: the only
+// place in the tool that names it. The tool never creates the two folders;
+// the installation does.
+// Kept for the console's readers: see docs/compatibility.md#file-names
+// and docs/compatibility.md#result-folders
 constexpr char gc_QuorvexDirectory[] = "/var/adm/quorvex/";
 // The folder of the status and result files, relative to gc_QuorvexDirectory.
 constexpr char gc_VPD_Folder[] = "VPD/";

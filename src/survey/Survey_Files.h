@@ -7,6 +7,7 @@ namespace Quorvex::PYLON::VPD {
 // Every name of a file a survey run writes, reads back or asks the console
 // for is built here, and nowhere else. The names are fixed: the console's
 // scripts and importers find the files by them.
+// Kept for the console's readers: see docs/compatibility.md#file-names
 
 // The tool's name: the stem of its trace, status and result file names.
 inline constexpr char gc_ProgramName[] = "quorvexPYLON_VPD_Survey_ClientPartition";
