@@ -39,9 +39,9 @@ void ListOf_Machines::_insert_Machine(std::string const& entry) {
     if (::StringUtility::splitString(entry, gc_Field_Delimiter, fields) < gc_Minimum_Fields) {
         return;
     }
-    // Kept for the console's readers: see docs/compatibility.md#machine-listing
     // Read as 64 bits and narrowed, so "-1" gives 4294967295 and 4294967296 gives 0;
     // leading blanks are skipped and text after the digits is ignored.
+    // Kept for the console's readers: see docs/compatibility.md#machine-listing
     unsigned long long objectType = 0;
     std::istringstream objectTypeText(fields[0]);
     if (!(objectTypeText >> objectType)) {

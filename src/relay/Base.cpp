@@ -29,9 +29,9 @@ TargetPartition& Base::get_TargetPartition() {
 }
 
 std::string Base::createString_Command() const {
-    // Kept for the remote action tool: see docs/compatibility.md#four-colons
     // The tool expects an empty field between the class name and the action,
     // hence four colons in a row.
+    // Kept for the remote action tool: see docs/compatibility.md#four-colons
     std::ostringstream command;
     command << gc_RemoteActionTool << gc_ServiceEventClass << "::" << _Action
             << "::" << RELAY_Utility::create_Parameter("CallerID", _CallerID)

@@ -37,8 +37,8 @@ void FileInfo::set_FilePermission(std::string const& permission) {
 }
 
 std::string FileInfo::get_FileInfoString() const {
-    // Kept for the remote action tool: see docs/compatibility.md#file-attributes
     // The remote action tool reads the permission first.
+    // Kept for the remote action tool: see docs/compatibility.md#file-attributes
     std::ostringstream text;
     text << "FILE_PERM"
          << "=" << _FilePermission << ";"

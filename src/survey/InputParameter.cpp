@@ -25,8 +25,8 @@ InputParameter::InputParameter(unsigned int argc, char** argv) : _Parameters() {
         if (i + 1 < argc && argv[i + 1] != nullptr && !_u_is_Option(argv[i + 1])) {
             value = argv[++i];
         }
-        // Kept for the console's scripts: see docs/compatibility.md#command-line
         // insert() keeps the value already there: the first occurrence wins.
+        // Kept for the console's scripts: see docs/compatibility.md#command-line
         _Parameters.insert({option, value});
     }
 }

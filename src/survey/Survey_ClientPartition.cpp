@@ -32,8 +32,8 @@ constexpr unsigned int gc_HighestInactiveStatus = 2;
 // the partition's client: see docs/compatibility.md#client-options
 constexpr char gc_ClientOptions[] = " -v  -of ";
 
-// Kept for status-file scripts: see docs/compatibility.md#status-overwrite
 // The status text is written over its seed from the seed's first character.
+// Kept for status-file scripts: see docs/compatibility.md#status-overwrite
 constexpr char gc_ClientFailedSeed[] = "survey Failed : ";
 constexpr char gc_FetchFailedSeed[] = "get result Failed, rc = ";
 constexpr char gc_ChannelFailed[] = "RELAY Failed, rc = ";

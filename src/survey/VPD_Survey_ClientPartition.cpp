@@ -27,9 +27,9 @@ void u_report_Partitions(Quorvex::PYLON::ListOf_Partitions const& partitions,
                          std::vector<std::string> const& statusTexts, std::ostream& status) {
     for (std::size_t i = 0; i < fileNames.size(); ++i) {
         if (!fileNames[i].empty()) {
-            // Kept for the console's scripts: see docs/compatibility.md#streams-per-partition
             // Flushed per line, so that names and codes interleave in order
             // when both streams go to one file.
+            // Kept for the console's scripts: see docs/compatibility.md#streams-per-partition
             std::cout << fileNames[i] << std::endl;
             std::cerr << returnCodes[i] << std::endl;
         }

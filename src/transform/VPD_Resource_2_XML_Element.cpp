@@ -14,8 +14,8 @@ namespace Transform {
 
 namespace {
 
-// Kept for the inventory importers: see docs/compatibility.md#leading-resource-lists
 // Lists that a resource always shows first, in this order, even when empty.
+// Kept for the inventory importers: see docs/compatibility.md#leading-resource-lists
 constexpr const char* gc_LeadingResourceLists[] = {"Partitions", "Enclosures"};
 
 bool u_is_LeadingResourceList(std::string const& name) {

@@ -141,8 +141,8 @@ unsigned int ShellCommand::_readOutput(std::string const& fileName, Lines& lines
         return 0;
     }
     std::vector<char> buffer(gc_LineBufferSize);
-    // Kept for the trace's readers: see docs/compatibility.md#captured-lines
     // The read that meets the end of the file still appends an entry.
+    // Kept for the trace's readers: see docs/compatibility.md#captured-lines
     while (!file.eof()) {
         buffer[0] = '\0';
         file.getline(buffer.data(), gc_LineBufferSize);

@@ -48,8 +48,8 @@ std::filebuf& Trace::ms_FileHandle = Trace::_get_FileHandle();
 Trace::Trace(std::string const& fileName) : std::ofstream() {
     std::basic_ios<char>::rdbuf(&_get_FileHandle());
     if (!ms_IsInitialized && !fileName.empty()) {
-        // Kept for the trace's readers: see docs/compatibility.md#trace-file
         // Set before the open whatever its outcome: a failed open is never retried.
+        // Kept for the trace's readers: see docs/compatibility.md#trace-file
         ms_IsInitialized = true;
         _open(fileName);
     }

@@ -9,9 +9,9 @@ struct KeywordRow {
     const char* displayName;
 };
 
-// Kept for the inventory importers: see docs/compatibility.md#keyword-display-names
 // Inserted in this order. The texts go unchanged into every VPD document
 // that other programs read.
+// Kept for the inventory importers: see docs/compatibility.md#keyword-display-names
 constexpr KeywordRow gc_KeywordRows[] = {
     {"EC", "Engineering Change Level"},
     {"FN", "FRU Number"},
