@@ -10,7 +10,7 @@ set(CPACK_PACKAGE_CONTACT "Quorvex PYLON survey maintainers <pylon-survey@quorve
 set(CPACK_PACKAGE_DESCRIPTION_SUMMARY
   "VPD survey of the client partitions of a PYLON managed machine")
 set(CPACK_PACKAGE_DESCRIPTION
-  "quorvexPYLON_VPD_Survey_ClientPartition runs on a PYLON hardware management
+  "quorvexPYLON_VPD_Survey_ClientPartition runs on the PYLON management
 console. One run surveys one managed machine: it lists the machine's client
 partitions, runs the inventory client on every active partition through the
 console's remote action command, fetches each partition's vital product data

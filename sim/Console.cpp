@@ -19,6 +19,8 @@ namespace {
 constexpr char gc_ScenarioVariable[] = "PYLON_SIM_SCENARIO";
 constexpr char gc_LogVariable[] = "PYLON_SIM_LOG";
 // The console's get-file action places its file relative to this folder.
+// The simulator plays the console, not the survey tool, so it names the
+// folder itself rather than taking it from the tool's src/survey/Survey_Files.cpp.
 constexpr char gc_QuorvexFolder[] = "/var/adm/quorvex/";
 constexpr char gc_UnknownActionLine[] = "Rc::3::RcCmd::0::RetStr1::unknown action::RetStr2::\n";
 constexpr char const* gc_Actions[] = {"runCmdOnPartition", "getFileFromPartition",

@@ -5,6 +5,8 @@
 
 namespace Quorvex::PYLON::DEBUG {
 
+// IP before host name, unlike the trace's printer. Kept for the trace's readers: see
+// docs/compatibility.md#partition-printers
 void print_Partition(::Quorvex::System::Partition const& partition) {
     std::cout << "----------------------------------------\n";
     std::cout << " MTMS                    : " << std::string(partition.get_MTMS()) << std::endl;

@@ -41,6 +41,7 @@ void ListOf_Machines::_insert_Machine(std::string const& entry) {
     }
     // Read as 64 bits and narrowed, so "-1" gives 4294967295 and 4294967296 gives 0;
     // leading blanks are skipped and text after the digits is ignored.
+    // Kept for the console's readers: see docs/compatibility.md#machine-listing
     unsigned long long objectType = 0;
     std::istringstream objectTypeText(fields[0]);
     if (!(objectTypeText >> objectType)) {

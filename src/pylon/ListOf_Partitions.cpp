@@ -35,6 +35,8 @@ void ListOf_Partitions::getPartitions_FromMachine(::Quorvex::PYLON::Machine cons
         return;
     }
     ::Quorvex::System::MTMS const& mtms = machine.get_MTMS();
+    // The identity goes to the shell unquoted. Kept for the console's scripts: see
+    // docs/compatibility.md#no-escaping-command-line
     std::string const arguments = gc_ListPartitions_MachineOption + std::string(mtms);
     for (auto const& record :
          ::Quorvex::PYLON::Listing_Utility::u_run_Listing(gc_ListPartitions_Tool, arguments)) {
@@ -51,6 +53,8 @@ void ListOf_Partitions::_insert_Partition(::Quorvex::System::MTMS const& mtms,
     ::StringUtility::splitString(record, gc_Field_Delimiter, fields);
     ::Quorvex::System::Partition partition;
     partition.set_MTMS(mtms);
+    // As far as the record goes, untrimmed. Kept for the console's readers: see
+    // docs/compatibility.md#listing-records
     for (std::size_t i = 0; i < fields.size() && i < gc_NumberOf_Fields; ++i) {
         (partition.*gc_Field_Setters[i])(fields[i]);
     }

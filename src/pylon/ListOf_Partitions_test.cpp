@@ -61,6 +61,15 @@ TEST(ListOf_Partitions, RunsThePartitionToolForTheMachineIdentity) {
                                          {"lspartition", "-ix", "-c", "1234-ABC_10ABCDE"}}));
 }
 
+// The identity is not quoted: the shell splits it at the blank.
+TEST(ListOf_Partitions, IdentityWithABlankReachesTheShellAsTwoWords) {
+    SimulatedConsole const console("[lspartition *]\n");
+    ListOf_Partitions partitions;
+    partitions.getPartitions_FromMachine(Machine(0U, MTMS("1234-ABC", "10 ABCDE")));
+    EXPECT_EQ(console.invocations(), (std::vector<QuorvexTest::Invocation>{
+                                         {"lspartition", "-ix", "-c", "1234-ABC_10", "ABCDE"}}));
+}
+
 TEST(ListOf_Partitions, CommandLineIsExactlyThePartitionToolWithTheMachineIdentity) {
     SimulatedConsole const console("[lspartition *]\n");
     Strings const commandLines = QuorvexTest::tracedCommandLines("partitions.Trace", [] {

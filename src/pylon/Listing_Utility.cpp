@@ -16,7 +16,9 @@ std::vector<std::string> u_run_Listing(std::string const& tool, std::string cons
     command.append_Command(arguments);
     command.execute();
     std::vector<std::string> entries;
+    // The exit code and standard error are not looked at; only the first line is read.
     // Empty only when the command could not be run at all.
+    // Kept for the console's listing tools: see docs/compatibility.md#listing-first-line
     if (command.get_stdout().empty()) {
         return entries;
     }

@@ -31,6 +31,7 @@ TargetPartition& Base::get_TargetPartition() {
 std::string Base::createString_Command() const {
     // The tool expects an empty field between the class name and the action,
     // hence four colons in a row.
+    // Kept for the remote action tool: see docs/compatibility.md#four-colons
     std::ostringstream command;
     command << gc_RemoteActionTool << gc_ServiceEventClass << "::" << _Action
             << "::" << RELAY_Utility::create_Parameter("CallerID", _CallerID)

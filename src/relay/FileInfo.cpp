@@ -38,6 +38,7 @@ void FileInfo::set_FilePermission(std::string const& permission) {
 
 std::string FileInfo::get_FileInfoString() const {
     // The remote action tool reads the permission first.
+    // Kept for the remote action tool: see docs/compatibility.md#file-attributes
     std::ostringstream text;
     text << "FILE_PERM"
          << "=" << _FilePermission << ";"

@@ -13,6 +13,7 @@ PutFileToPartition::~PutFileToPartition() = default;
 
 int PutFileToPartition::putFileToPartition(std::string const& fileName) {
     set_Action("putFileToPartition");
+    // Kept for the remote action tool: see docs/compatibility.md#put-by-array
     get_TargetPartition().use_PartitionArray();
     return execute(createString_PutFileParameters(fileName));
 }

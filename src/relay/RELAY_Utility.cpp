@@ -23,6 +23,8 @@ void _u_set_Default_FileInfo(FileInfo& info, std::string const& group) {
 
 } // namespace
 
+// Quoted but not escaped. Kept for the remote action tool: see
+// docs/compatibility.md#no-escaping-command-line
 std::string RELAY_Utility::create_Parameter(std::string const& name, std::string const& value) {
     std::ostringstream parameter;
     parameter << name << "::"

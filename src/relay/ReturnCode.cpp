@@ -19,6 +19,7 @@ ReturnCode::ReturnCode(std::string const& line) {
     StringUtility::splitString(line, "::", tokens);
     // The part that starts at "Rc" is added first, so its keys win over the
     // same keys in the leading part.
+    // Kept for the remote action tool's replies: see docs/compatibility.md#reply-pairs
     auto const rc = std::find(tokens.cbegin(), tokens.cend(), "Rc");
     _convert_Vector_2_Map(rc, tokens.cend());
     _convert_Vector_2_Map(tokens.cbegin(), rc);
@@ -64,6 +65,7 @@ void ReturnCode::_convert_Vector_2_Map(Token_Iterator first, Token_Iterator last
 int ReturnCode::_get_Number(std::string const& key) const {
     // Read as an unsigned number and narrowed to 32 bits, so "-1" stays -1,
     // text without digits gives 0 and nothing a tool prints can fail.
+    // Kept for status-file scripts: see docs/compatibility.md#reply-numbers
     std::string const text = contains(key) ? get_ValueOf(key) : std::string("-1");
     unsigned long long const value = std::strtoull(text.c_str(), nullptr, 10);
     return static_cast<int>(static_cast<std::uint32_t>(value));

@@ -1,5 +1,6 @@
 #include "relay/RunCommandOnPartition.h"
 
+#include "quorvex/Version.h"
 #include "relay/RELAY_Utility.h"
 
 #include <sstream>
@@ -10,8 +11,6 @@ namespace {
 
 // The client survey is command 0 on the partition.
 constexpr long gc_ClientQuorvex_CommandID = 0;
-// The client version the partition side is asked to speak.
-constexpr char gc_ClientQuorvex_Version[] = "4.0.11";
 
 } // namespace
 
@@ -50,12 +49,13 @@ std::string RunCommandOnPartition::createString_RunCommandParameters(long const&
 
 void RunCommandOnPartition::_initialize_ClientQuorvexParameters(std::string& options) {
     // Plain substring checks: options that mention "-c" anywhere, even inside
-    // another word, already name the machine.
+    // another word, already name the machine. Kept for the partition's
+    // client: see docs/compatibility.md#client-options
     if (options.find("-c") == std::string::npos) {
         options += " -c " + get_TargetPartition().get_Partition().get_MTMS().__StringValue();
     }
     if (options.find("-pylonv") == std::string::npos) {
-        options += " -pylonv " + std::string(gc_ClientQuorvex_Version);
+        options += " -pylonv " + std::string(::Quorvex::gc_ClientVersion);
     }
 }
 

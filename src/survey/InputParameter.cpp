@@ -26,10 +26,12 @@ InputParameter::InputParameter(unsigned int argc, char** argv) : _Parameters() {
             value = argv[++i];
         }
         // insert() keeps the value already there: the first occurrence wins.
+        // Kept for the console's scripts: see docs/compatibility.md#command-line
         _Parameters.insert({option, value});
     }
 }
 
+// The copy is empty. Kept for the class's callers: see docs/compatibility.md#input-parameter-copy
 InputParameter::InputParameter(InputParameter const&) : _Parameters() {}
 
 InputParameter& InputParameter::operator=(InputParameter const& other) {

@@ -13,9 +13,9 @@ class InputParameter {
 public:
     InputParameter();
     InputParameter(unsigned int argc, char** argv);
-    // Deliberately copies nothing: the copy is empty. No move operations are
-    // declared, so moving copies too. Build the object in place and pass it
-    // by reference.
+    // Copies nothing: the copy is empty. No move operations are declared, so
+    // moving copies too. Build the object in place and pass it by reference.
+    // Kept for the class's callers: see docs/compatibility.md#input-parameter-copy
     InputParameter(InputParameter const& other);
     InputParameter& operator=(InputParameter const& other);
     ~InputParameter() = default;

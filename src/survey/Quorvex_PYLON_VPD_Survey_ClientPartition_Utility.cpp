@@ -24,6 +24,7 @@ constexpr char gc_ReasonKeyword[] = "VD";
 
 // Builds the default document into set; false when the machine's identity
 // cannot be put into it (a type-model without "-").
+// Kept for the inventory importers: see docs/compatibility.md#no-document-without-dash
 bool _u_build_DefaultDocument(Quorvex::System::Partition const& partition,
                               std::string const& reason, Quorvex::VPD::ResourceSet& set) {
     try {
@@ -36,6 +37,8 @@ bool _u_build_DefaultDocument(Quorvex::System::Partition const& partition,
 
 } // namespace
 
+// Unreadable reads 0, not active. Kept for status-file scripts: see
+// docs/compatibility.md#inactive-partition
 unsigned int _u_get_ActiveStatus(Quorvex::System::Partition const& partition) {
     std::istringstream text(partition.get_ActiveStatus());
     unsigned int activeStatus = 0;
@@ -64,12 +67,13 @@ void u_create_DefaultXML_forFailedPartition(Quorvex::System::Partition const& pa
     if (!_u_build_DefaultDocument(partition, reason, set)) {
         return;
     }
-    std::ofstream document(std::string(Quorvex::PYLON::VPD::gc_QuorvexDirectory) + localFileName);
+    std::ofstream document(Quorvex::PYLON::VPD::get_LocalResultPath(localFileName));
     Transform::VPD_2_OStream{document}(set);
     document.flush();
     document.close();
 }
 
+// Kept for the inventory importers: see docs/compatibility.md#failure-reason
 std::string u_transform_RELAY_ReturnCode_2_String(Quorvex::RELAY::ReturnCode const& returnCode) {
     std::ostringstream text;
     text << "\n";

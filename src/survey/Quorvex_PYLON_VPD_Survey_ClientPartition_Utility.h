@@ -22,9 +22,10 @@ void u_create_VPD_ResourceSet_forFailedPartition(Quorvex::System::Partition cons
                                                  std::string const& reason,
                                                  Quorvex::VPD::ResourceSet& set);
 
-// Writes the default document of a failed partition to "/var/adm/quorvex/" +
-// localFileName, replacing an earlier file. Nothing is written when the file
-// cannot be opened or the machine's identity cannot be put into the document.
+// Writes the default document of a failed partition to the path of the
+// local result name localFileName (see Survey_Files.h), replacing an earlier
+// file. Nothing is written when the file cannot be opened or the machine's
+// identity cannot be put into the document.
 void u_create_DefaultXML_forFailedPartition(Quorvex::System::Partition const& partition,
                                             std::string const& reason,
                                             std::string const& localFileName);

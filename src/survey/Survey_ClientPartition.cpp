@@ -23,16 +23,17 @@ namespace Survey_Utility = ::Quorvex_PYLON_VPD_Survey_ClientPartition_Utility;
 constexpr char gc_Surveyed[] = "0";
 constexpr char gc_NotSurveyed[] = "8";
 constexpr char gc_Ok[] = "Ok";
+// Kept for status-file scripts: see docs/compatibility.md#inactive-partition
 constexpr char gc_Inactive[] = "Failed - Active Status < 3";
 // Statuses 0, 1 and 2 mean the partition is not running.
 constexpr unsigned int gc_HighestInactiveStatus = 2;
 
-// Fixed parts of the names formed per partition.
-constexpr char gc_RemoteResultSuffix[] = ".VPD.xml";
-constexpr char gc_ClientOutputSuffix[] = ".QuorvexOutput";
+// The client's options: verbose, and the result file to write. Kept for
+// the partition's client: see docs/compatibility.md#client-options
 constexpr char gc_ClientOptions[] = " -v  -of ";
 
 // The status text is written over its seed from the seed's first character.
+// Kept for status-file scripts: see docs/compatibility.md#status-overwrite
 constexpr char gc_ClientFailedSeed[] = "survey Failed : ";
 constexpr char gc_FetchFailedSeed[] = "get result Failed, rc = ";
 constexpr char gc_ChannelFailed[] = "RELAY Failed, rc = ";
@@ -45,25 +46,22 @@ constexpr char gc_FetchFailedReason[] = "Unable to get File From Partition : \n"
 
 // The names of one partition's files, P being its identity text.
 struct ResultNames {
-    // P + ".VPD.xml", written by the client on the partition.
+    // Written by the client on the partition.
     ::std::string remoteResult;
-    // "VPD/quorvexPYLON_VPD_Survey_ClientPartition_" + P + ".VPD.xml",
-    // relative to "/var/adm/quorvex/".
+    // The document's name on the console, as standard output shows it.
     ::std::string localResult;
-    // The client's options: verbose, and the result file to write.
     ::std::string clientArguments;
-    // P + ".QuorvexOutput", the client's own output on the partition.
+    // The client's own output on the partition.
     ::std::string clientOutput;
 };
 
 ResultNames u_form_ResultNames(::Quorvex::System::Partition const& partition) {
     ::std::string const identity = partition;
     ResultNames names;
-    names.remoteResult = identity + gc_RemoteResultSuffix;
-    names.localResult =
-        ::std::string(gc_VPD_Folder) + gc_ProgramName + "_" + identity + gc_RemoteResultSuffix;
+    names.remoteResult = get_RemoteResultName(identity);
+    names.localResult = get_LocalResultName(identity);
     names.clientArguments = gc_ClientOptions + names.remoteResult;
-    names.clientOutput = identity + gc_ClientOutputSuffix;
+    names.clientOutput = get_ClientOutputName(identity);
     return names;
 }
 
@@ -71,6 +69,7 @@ ResultNames u_form_ResultNames(::Quorvex::System::Partition const& partition) {
 // an unsigned 32-bit number, so -1 reads 4294967295) are written from the
 // seed's first character on: what is written replaces that many characters
 // of the seed, and the rest of the seed stays.
+// Kept for status-file scripts: see docs/compatibility.md#unsigned-codes
 ::std::string u_write_OverSeed(char const* seed, char const* message, int const& code) {
     ::std::stringstream status(seed);
     status << message << static_cast<unsigned int>(code);
@@ -92,6 +91,8 @@ bool u_has_ClientFailed(int const& result, ::Quorvex::RELAY::ReturnCode const& r
     return result != 0 || returnCode.get_Rc() != 0 || returnCode.get_RcCmd() != 0;
 }
 
+// The status shows Rc even when only the exit code failed. Kept for status-file scripts: see
+// docs/compatibility.md#status-shows-rc
 bool u_has_ChannelFailed(int const& result, ::Quorvex::RELAY::ReturnCode const& returnCode) {
     return result != 0 || returnCode.get_Rc() != 0;
 }

@@ -14,8 +14,8 @@ namespace Quorvex::PYLON::VPD {
 class Survey_ClientPartition {
 public:
     // Appends exactly one entry per listed partition, in listing order, to
-    // each output: the local VPD file name relative to "/var/adm/quorvex/"
-    // ("" for an inactive partition), the code ("0" surveyed, "8" not) and
+    // each output: the local VPD file name (see Survey_Files.h; "" for an
+    // inactive partition), the code ("0" surveyed, "8" not) and
     // the status text. The outputs are not cleared first.
     void operator()(::Quorvex::PYLON::ListOf_Partitions const& partitions,
                     ::std::vector<::std::string>& fileNames,

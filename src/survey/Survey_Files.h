@@ -1,16 +1,37 @@
 #pragma once
 
+#include <string>
+
 namespace Quorvex::PYLON::VPD {
 
-// Names of the files a survey run writes. Constant arrays, so they are ready
-// before any other unit's start-up code runs.
+// Every name of a file a survey run writes, reads back or asks the console
+// for is built here, and nowhere else. The names are fixed: the console's
+// scripts and importers find the files by them.
+// Kept for the console's readers: see docs/compatibility.md#file-names
 
 // The tool's name: the stem of its trace, status and result file names.
 inline constexpr char gc_ProgramName[] = "quorvexPYLON_VPD_Survey_ClientPartition";
-// The console folder under which the VPD and Trace folders lie; result file
-// names are relative to it.
-inline constexpr char gc_QuorvexDirectory[] = "/var/adm/quorvex/";
-// The folder of the status and result files, relative to gc_QuorvexDirectory.
-inline constexpr char gc_VPD_Folder[] = "VPD/";
+
+// The trace of the run: rewritten by every run.
+std::string get_TraceFileName();
+
+// The status file of the machine named on the command line, the identity
+// taken as given.
+std::string get_StatusFileName(std::string const& machineIdentity);
+
+// The name of a partition's VPD document on the console, relative to the
+// folder that get_LocalResultPath resolves it against; partitionText is the
+// partition's identity text (machine identity, "-", partition ID). It is
+// what standard output shows and what the console's get-file action gets.
+std::string get_LocalResultName(std::string const& partitionText);
+
+// The absolute path of a local result name.
+std::string get_LocalResultPath(std::string const& localResultName);
+
+// The document the client writes on the partition, and fetched from there.
+std::string get_RemoteResultName(std::string const& partitionText);
+
+// The client's own output file on the partition.
+std::string get_ClientOutputName(std::string const& partitionText);
 
 } // namespace Quorvex::PYLON::VPD

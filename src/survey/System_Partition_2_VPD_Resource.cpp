@@ -9,6 +9,7 @@ namespace Transform {
 Quorvex::VPD::Resource&
 System_Partition_2_VPD_Resource::operator()(Quorvex::System::Partition const& partition,
                                             Quorvex::VPD::Resource& resource) const {
+    // Kept for the inventory importers: see docs/compatibility.md#default-document
     std::string const identity = partition.to_String("-", "-", "-");
     std::string const& hostName = partition.get_HostName();
     resource.set_DisplayName(hostName.empty() ? identity : hostName);

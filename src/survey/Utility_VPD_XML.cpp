@@ -17,6 +17,7 @@ constexpr char gc_DocumentVersion[] = "1.0";
 
 void initialize_Default_VPD_ResourceSet(::Quorvex::VPD::ResourceSet& set,
                                         ::Quorvex::System::MTMS const& mtms) {
+    // Kept for the inventory importers: see docs/compatibility.md#default-document
     ::std::string const machine = mtms.to_String("-", "-");
     ::Quorvex::VPD::Resource const resource(machine, machine);
     set.set_TimeStamp(::Utility::get_TimeStamp());

@@ -13,16 +13,11 @@
 
 namespace {
 
-constexpr char gc_StatusSuffix[] = ".status";
+// Also when the listing failed. Kept for status-file scripts: see
+// docs/compatibility.md#no-partition-found
 constexpr char gc_NoPartitions[] = "No ACTIVE Partition Found.";
 // Only machines of this object type have their partitions listed.
 constexpr unsigned int gc_ManagedMachineType = 0;
-
-std::string u_get_StatusFileName(std::string const& machineIdentity) {
-    return std::string(Quorvex::PYLON::VPD::gc_QuorvexDirectory) +
-           Quorvex::PYLON::VPD::gc_VPD_Folder + Quorvex::PYLON::VPD::gc_ProgramName + "_" +
-           machineIdentity + gc_StatusSuffix;
-}
 
 // Per partition: the file name on standard output and the code on standard
 // error when a file name was recorded, and in every case the status line.
@@ -34,9 +29,12 @@ void u_report_Partitions(Quorvex::PYLON::ListOf_Partitions const& partitions,
         if (!fileNames[i].empty()) {
             // Flushed per line, so that names and codes interleave in order
             // when both streams go to one file.
+            // Kept for the console's scripts: see docs/compatibility.md#streams-per-partition
             std::cout << fileNames[i] << std::endl;
             std::cerr << returnCodes[i] << std::endl;
         }
+        // Host and IP as listed, the status text as recorded. Kept for status-file scripts: see
+        // docs/compatibility.md#status-line
         status << partitions[i].get_HostName() << " [" << partitions[i].get_IP()
                << "] - VPD Survey - " << statusTexts[i] << std::endl;
     }
@@ -46,7 +44,7 @@ void u_report_Partitions(Quorvex::PYLON::ListOf_Partitions const& partitions,
 
 void VPD_Survey_ClientPartition(std::string const& machineIdentity) {
     // A status file that cannot be opened loses its lines silently.
-    std::ofstream status(u_get_StatusFileName(machineIdentity));
+    std::ofstream status(Quorvex::PYLON::VPD::get_StatusFileName(machineIdentity));
     Quorvex::System::MTMS const mtms(machineIdentity);
     Quorvex::PYLON::Machine const machine(gc_ManagedMachineType, mtms);
     Quorvex::PYLON::ListOf_Partitions partitions;

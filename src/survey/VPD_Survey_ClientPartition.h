@@ -3,8 +3,7 @@
 #include <string>
 
 // Surveys every partition of the managed machine whose identity (type-model
-// "_" serial) is given: writes the status file
-// "/var/adm/quorvex/VPD/quorvexPYLON_VPD_Survey_ClientPartition_<identity>.status",
+// "_" serial) is given: writes the machine's status file (see Survey_Files.h),
 // one line per listed partition; prints each local VPD file name on standard
 // output and its code on standard error; and ends with the overall code on
 // standard error.

@@ -10,6 +10,7 @@ namespace {
 char const* u_get_OverallCode(std::vector<std::string> const& returnCodes) {
     auto const surveyed = std::count(returnCodes.begin(), returnCodes.end(), "0");
     // Tested first, so that an empty sequence gives "8" too.
+    // Kept for the console's scripts: see docs/compatibility.md#overall-code
     if (surveyed == 0) {
         return "8";
     }

@@ -1,4 +1,5 @@
 #include "survey/InputParameter.h"
+#include "survey/Survey_Files.h"
 #include "survey/VPD_Survey_ClientPartition.h"
 #include "utility/Trace.h"
 
@@ -7,10 +8,9 @@
 
 namespace {
 
-constexpr char gc_TraceFileName[] =
-    "/var/adm/quorvex/Trace/quorvexPYLON_VPD_Survey_ClientPartition.Trace";
 constexpr char gc_MachineOption[] = "-c";
 // The run's outcome travels only in text; the exit status says the tool ran.
+// Kept for the console's scripts: see docs/compatibility.md#exit-status
 constexpr int gc_ExitAfterRun = 2;
 constexpr int gc_ExitBadCommandLine = 255;
 
@@ -18,7 +18,7 @@ constexpr int gc_ExitBadCommandLine = 255;
 
 int main(int argc, char** argv) {
     // The first trace object with a name: opens (and truncates) the shared trace file.
-    Utility::Trace trace(gc_TraceFileName);
+    Utility::Trace trace(Quorvex::PYLON::VPD::get_TraceFileName());
     trace << "PYLON_VPD_Survey_ClientPartition::main" << std::endl;
 
     Utility::InputParameter parameters(static_cast<unsigned int>(argc), argv);

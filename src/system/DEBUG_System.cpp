@@ -4,6 +4,8 @@
 
 namespace DEBUG::Quorvex::System {
 
+// Host name before IP, unlike the other printer. Kept for the trace's readers: see
+// docs/compatibility.md#partition-printers
 void print_Partition(std::ostream& out, ::Quorvex::System::Partition const& partition,
                      unsigned int const& indent) {
     std::string const margin(indent, ' ');

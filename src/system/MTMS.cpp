@@ -24,6 +24,7 @@ MTMS::MTMS(std::string const& machineType_Model, std::string const& serial)
 
 MTMS::MTMS(std::string const& text) {
     MTMS_Utility::u_split_TM_SE(text, _MachineType_Model, _Serial);
+    // Kept for the console's tools: see docs/compatibility.md#identity-error-suffix
     if (_MachineType_Model.find(gc_TM_Dash) == std::string::npos) {
         _MachineType_Model += gc_InvalidMarker;
         _Serial += gc_InvalidMarker;
@@ -50,7 +51,9 @@ std::string MTMS::to_String(std::string const& separator) const {
 std::string MTMS::to_String(std::string const& dashReplacement,
                             std::string const& separator) const {
     std::string typeModel = _MachineType_Model;
-    // Deliberately unchecked: a type-model without "-" lets out_of_range escape.
+    // Unchecked: a type-model without "-" lets out_of_range escape, and no
+    // default document is written for such a machine.
+    // Kept for the inventory importers: see docs/compatibility.md#no-document-without-dash
     typeModel.replace(typeModel.find(gc_TM_Dash), 1, dashReplacement);
     return typeModel + separator + _Serial;
 }
@@ -64,6 +67,7 @@ MTMS::operator std::string() const {
 }
 
 std::string MTMS::_verify_TM(std::string machineType_Model) {
+    // Kept for the console's listing: see docs/compatibility.md#console-prefix
     if (machineType_Model.find(gc_ConsolePrefix) == 0) {
         machineType_Model.erase(0, gc_TM_PrefixLength);
     }

@@ -97,6 +97,8 @@ bool operator<(Partition const& a, Partition const& b) {
     if (a.get_MTMS() != b.get_MTMS()) {
         return a.get_MTMS() < b.get_MTMS();
     }
+    // As text: 10 sorts before 2. Kept for the console's readers: see
+    // docs/compatibility.md#partition-order
     if (a.get_PartitionID() != b.get_PartitionID()) {
         return a.get_PartitionID() < b.get_PartitionID();
     }

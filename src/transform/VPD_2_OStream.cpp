@@ -26,6 +26,8 @@ std::ostream& VPD_2_OStream::operator()(Quorvex::VPD::ResourceSet const& set) {
     inventory.insert_Content(resourceSet);
     inventory.insert_Attribute("version", gc_DocumentVersion);
 
+    // Both at depth 0: one first line, no line end after the last.
+    // Kept for the inventory importers: see docs/compatibility.md#document-layout
     _Writer(declaration, true, gc_TopLevel);
     return _Writer(inventory, true, gc_TopLevel);
 }

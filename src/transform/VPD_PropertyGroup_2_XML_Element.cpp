@@ -10,6 +10,8 @@ VPD_PropertyGroup_2_XML_Element::VPD_PropertyGroup_2_XML_Element(XML::Element& t
 
 XML::Element&
 VPD_PropertyGroup_2_XML_Element::operator()(Quorvex::VPD::PropertyGroup const& group) {
+    // Left untouched: the resource adds an unnamed element.
+    // Kept for the inventory importers: see docs/compatibility.md#unnamed-property-group
     if (group.empty()) {
         return _Target;
     }

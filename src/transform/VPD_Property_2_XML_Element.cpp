@@ -19,6 +19,8 @@ XML::Element& VPD_Property_2_XML_Element::operator()(Quorvex::VPD::Property cons
     _Target.insert_Attribute("name", property.get_Keyword());
     _Target.insert_Attribute("displayName", property.get_DisplayName());
     _Target.get_Content().reserve(_Target.get_NumberOfContent() + gc_NumberOf_PropertyChildren);
+    // The keyword, not the display name. Kept for the inventory importers: see
+    // docs/compatibility.md#property-text-is-keyword
     _Target.insert_Content(XML::Element(property.get_Keyword(), XML::Tag::Type_String));
     XML::Element value;
     _Target.insert_Content(VPD_Value_2_XML_Element{value}(property.get_Value()));

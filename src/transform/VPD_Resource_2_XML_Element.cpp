@@ -15,6 +15,7 @@ namespace Transform {
 namespace {
 
 // Lists that a resource always shows first, in this order, even when empty.
+// Kept for the inventory importers: see docs/compatibility.md#leading-resource-lists
 constexpr const char* gc_LeadingResourceLists[] = {"Partitions", "Enclosures"};
 
 bool u_is_LeadingResourceList(std::string const& name) {
@@ -32,6 +33,8 @@ XML::Element& VPD_Resource_2_XML_Element::operator()(Quorvex::VPD::Resource cons
     _Target.get_Content().reserve(
         _Target.get_NumberOfContent() + 1 + resource.get_NumberOf_Properties() +
         resource.get_NumberOf_PropertyGroups() + resource.get_NumberOf_ResourceLists());
+    // Even an empty name. Kept for the inventory importers: see
+    // docs/compatibility.md#resource-text-line
     _Target.insert_Content(XML::Element(resource.get_DisplayName(), XML::Tag::Type_String));
     _insert_Attributes(resource);
     _insert_Properties(resource);

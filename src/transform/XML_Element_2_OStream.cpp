@@ -38,6 +38,8 @@ void XML_Element_2_OStream::_print_BeginTag(XML::Element const& element) {
     _OStream << element.get_Tag().get_BeginTag_EndDelimiter();
 }
 
+// Names and text are written unescaped. Kept for the inventory importers: see
+// docs/compatibility.md#xml-no-escaping
 void XML_Element_2_OStream::_print_Name(XML::Element const& element) {
     if (!element.get_Namespace().empty()) {
         _OStream << element.get_Namespace() << ':';
@@ -90,6 +92,8 @@ void XML_Element_2_OStream::_print_Content(XML::Element const& element) {
     }
 }
 
+// Every begin tag gets its end tag, never the short empty form.
+// Kept for the inventory importers: see docs/compatibility.md#no-empty-element-tag
 void XML_Element_2_OStream::_print_EndTag(XML::Element const& element) {
     XML::Tag const& tag = element.get_Tag();
     if (tag.has_EndTag()) {
@@ -111,6 +115,8 @@ void XML_Element_2_OStream::_insert_Indent() {
     _OStream << std::string(_IndentationLevel * gc_IndentWidth, ' ');
 }
 
+// Values are written unescaped. Kept for the inventory importers: see
+// docs/compatibility.md#xml-no-escaping
 void XML_Element_2_OStream::_print_OneAttribute(std::string const& name, std::string const& value) {
     _OStream << ' ' << name << "=\"" << value << '"';
 }

@@ -17,6 +17,8 @@ Quorvex::VPD::Value& XML_Element_2_VPD_Value::operator()(XML::Element const& ele
         if (!_isValueElement(element)) {
             throw Error_ElementIsNotValue();
         }
+        // Always of the string type. Kept for the class's callers: see
+        // docs/compatibility.md#value-type
         _Target =
             Quorvex::VPD::Value(element.get_Content().front().get_Name(), gc_ValueType_String);
         return _Target;

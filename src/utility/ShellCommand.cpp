@@ -61,12 +61,16 @@ int ShellCommand::execute() {
         _returnCode = 0;
         return -1;
     }
+    // The command text goes to the shell as given, nothing quoted. Kept for the console's scripts:
+    // see docs/compatibility.md#no-escaping-command-line
     std::string const fullCommand = _command + " > " + stdoutFile.get_ActualFileName() + " 2> " +
                                     stderrFile.get_ActualFileName();
     u_trace_Start(fullCommand);
 
     // The exit status sits in the second byte; a failure of system itself
     // (-1) stays -1 because the shift keeps the sign.
+    // A command killed by a signal reads 0. Kept for the console's readers: see
+    // docs/compatibility.md#killed-command-exit-0
     int const rawResult = std::system(fullCommand.c_str());
     _returnCode = rawResult >> 8;
     _executed = true;
@@ -121,6 +125,8 @@ bool ShellCommand::set_ExecuteOnlyOnce(bool const& executeOnlyOnce) {
     return previous;
 }
 
+// The four setters have no effect. Kept for the console's readers: see
+// docs/compatibility.md#temporary-file-setters
 void ShellCommand::set_Temporary_Directory(std::string const&) {}
 
 void ShellCommand::set_Temporary_BaseFileName(std::string const&) {}
@@ -136,6 +142,7 @@ unsigned int ShellCommand::_readOutput(std::string const& fileName, Lines& lines
     }
     std::vector<char> buffer(gc_LineBufferSize);
     // The read that meets the end of the file still appends an entry.
+    // Kept for the trace's readers: see docs/compatibility.md#captured-lines
     while (!file.eof()) {
         buffer[0] = '\0';
         file.getline(buffer.data(), gc_LineBufferSize);

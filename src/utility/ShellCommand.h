@@ -46,8 +46,9 @@ public:
     // Sets the flag and returns its previous value.
     bool set_ExecuteOnlyOnce(bool const& executeOnlyOnce);
 
-    // Accepted and deliberately without effect: the temporary files always
-    // use the directory and base name copied at construction.
+    // Accepted and without effect: the temporary files always use the
+    // directory and base name copied at construction.
+    // Kept for the console's readers: see docs/compatibility.md#temporary-file-setters
     void set_Temporary_Directory(std::string const& directory);
     void set_Temporary_BaseFileName(std::string const& baseFileName);
     static void set_Default_Directory(std::string const& directory);

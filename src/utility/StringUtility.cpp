@@ -5,6 +5,7 @@ namespace StringUtility {
 int splitString(std::string const& text, std::string const& delimiter,
                 std::vector<std::string>& pieces) {
     // Checked before clearing: the caller's pieces stay as they were.
+    // Kept for the parsers of console output: see docs/compatibility.md#split-string
     if (text.empty() || delimiter.empty()) {
         return 0;
     }

@@ -49,6 +49,7 @@ Trace::Trace(std::string const& fileName) : std::ofstream() {
     std::basic_ios<char>::rdbuf(&_get_FileHandle());
     if (!ms_IsInitialized && !fileName.empty()) {
         // Set before the open whatever its outcome: a failed open is never retried.
+        // Kept for the trace's readers: see docs/compatibility.md#trace-file
         ms_IsInitialized = true;
         _open(fileName);
     }
@@ -102,6 +103,8 @@ std::string get_HostName() {
     return hostName.get_stdout().front();
 }
 
+// Whole seconds followed by "000". Kept for the inventory importers: see
+// docs/compatibility.md#default-document
 std::string get_TimeStamp() {
     char text[gc_TextBufferSize] = {0};
     std::snprintf(text, sizeof text, "%lu", static_cast<unsigned long>(std::time(nullptr)));

@@ -11,6 +11,7 @@ struct KeywordRow {
 
 // Inserted in this order. The texts go unchanged into every VPD document
 // that other programs read.
+// Kept for the inventory importers: see docs/compatibility.md#keyword-display-names
 constexpr KeywordRow gc_KeywordRows[] = {
     {"EC", "Engineering Change Level"},
     {"FN", "FRU Number"},

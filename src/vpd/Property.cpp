@@ -41,6 +41,7 @@ void Property::set_Keyword(std::string const& keyword) {
     _lookUp_DisplayName();
 }
 
+// Resets the type to string. Kept for the documents' readers: see docs/compatibility.md#value-type
 void Property::set_Value(std::string const& valueText) {
     _Value = Value(valueText, gc_ValueType_String);
 }
@@ -49,6 +50,8 @@ void Property::set_Value(Value const& value) {
     _Value = value;
 }
 
+// Changes nothing: the first property of a keyword wins.
+// Kept for the documents' readers: see docs/compatibility.md#first-property-wins
 Property& Property::operator+=(Property const&) {
     return *this;
 }

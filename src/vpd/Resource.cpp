@@ -24,6 +24,8 @@ Resource& Resource::operator=(Resource const& other) {
 
 Resource::~Resource() = default;
 
+// Another unique ID: nothing changes, silently. Kept for the class's callers: see
+// docs/compatibility.md#unrelated-merge
 Resource& Resource::operator+=(Resource const& other) {
     if (other.get_UniqueID() != get_UniqueID()) {
         return *this;

@@ -8,6 +8,8 @@ ResourceSet::ResourceSet(std::string const& classText, std::string const& type,
                          std::string const& version, std::string const& timeStamp)
     : ResourceSet_ContainerInterface_Attributes(classText, type, version, timeStamp) {}
 
+// Another class: nothing changes, silently. Kept for the class's callers: see
+// docs/compatibility.md#unrelated-merge
 ResourceSet& ResourceSet::operator+=(ResourceSet const& other) {
     if (other.get_Class() != get_Class()) {
         return *this;

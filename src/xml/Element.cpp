@@ -12,6 +12,8 @@ Element::Element(std::string const& name, unsigned long const& type) : _Tag(type
 
 Element::Element(Element const& other) = default;
 
+// The target keeps its namespace. Kept for the class's callers: see
+// docs/compatibility.md#element-assignment-namespace
 Element& Element::operator=(Element const& other) {
     if (this != &other) {
         _Tag = other._Tag;
@@ -81,6 +83,8 @@ bool Element::has_Attribute(std::string const& name) const {
     return _Attribute.count(name) != 0;
 }
 
+// Sorted by name, first value kept. Kept for the inventory importers: see
+// docs/compatibility.md#attributes-sorted
 unsigned long Element::insert_Attribute(std::string const& name, std::string const& value) {
     if (!_Attribute.emplace(name, value).second) {
         return 0;

@@ -53,6 +53,18 @@ TEST(SurveyInstallation, InstallsToolManualPageAndResultFoldersUnderThePrefix) {
     u_expect_ResultFolders(destDir);
 }
 
+// The page is configured from its template with the version of project(),
+// the one the tool sends to the partition's client.
+TEST(SurveyInstallation, ManualPageCarriesTheProjectVersionAndNoPlaceholder) {
+    std::string const page = QuorvexTest::readFile(QUORVEX_MANUAL_PAGE);
+    std::string const version = QUORVEX_PROJECT_VERSION;
+    EXPECT_EQ(page.substr(0, page.find('\n')),
+              ".TH QUORVEXPYLON_VPD_SURVEY_CLIENTPARTITION 8 2026 \"Quorvex PYLON " + version +
+                  "\"");
+    EXPECT_NE(page.find("\" -pylonv " + version + "\"\n"), std::string::npos);
+    EXPECT_EQ(page.find('@'), std::string::npos);
+}
+
 TEST(SurveyInstallation, ConfiguredPrefixIsUsedWithoutAPrefixArgument) {
     std::string const destDir = std::string(QUORVEX_INSTALL_SCRATCH) + "/configured";
     QuorvexTest::CommandResult const install = u_install(destDir, {});
