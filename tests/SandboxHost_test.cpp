@@ -122,6 +122,43 @@ TEST(SandboxHost, NothingAppearsOnTheHost) {
     }
 }
 
+// The host is looked at while the command runs: the sandbox must not make
+// its paths on the host even for a while.
+TEST(SandboxHost, NothingAppearsOnTheHostWhileTheCommandRuns) {
+    std::vector<std::string> const& paths = _consolePaths();
+    std::string absentPaths;
+    for (std::string const& path : paths) {
+        if (!fileExists(path)) {
+            absentPaths += " " + path;
+        }
+    }
+    if (absentPaths.empty()) {
+        GTEST_SKIP() << "the host already has every console path";
+    }
+    QuorvexTest::TemporaryDirectory shared;
+    std::string const started = shared.file("started");
+    std::string const checked = shared.file("checked");
+    CommandResult const run = QuorvexTest::runShell(
+        "'" + QuorvexTest::sandboxPath() + "' --sim '" + QuorvexTest::simulatorPath() +
+        "' --bind '" + shared.path() + ":" + shared.path() + "' -- sh -c 'touch " + started +
+        "; i=0; while [ ! -e " + checked +
+        " ] && [ $i -lt 600 ]; do sleep 0.1; i=$((i+1)); done' &\n"
+        "i=0; while [ ! -e " +
+        started +
+        " ] && [ $i -lt 600 ]; do sleep 0.1; i=$((i+1)); done\n"
+        "test -e " +
+        started +
+        " || echo 'the sandboxed command never started'\n"
+        "for path in" +
+        absentPaths +
+        "; do test ! -e $path || echo \"$path appeared\"; done\n"
+        "touch " +
+        checked +
+        "\n"
+        "wait $!; echo \"sandbox: $?\"\n");
+    EXPECT_EQ("sandbox: 0\n", run.stdoutText) << run.stderrText;
+}
+
 TEST(SandboxHost, TmpInsideIsNotTheHostTmp) {
     QuorvexTest::TemporaryDirectory hostFolder;
     std::string const insideName = hostFolder.path() + "-made-inside";
@@ -162,8 +199,9 @@ TEST(SandboxHost, NoNamespaceToolGivesSkipStatusWithReason) {
 }
 
 TEST(SandboxHost, NeitherNamespaceNorProotGivesSkipStatusNamingWhatToInstall) {
-    CommandResult const run = runCommand({"/usr/bin/env", "PATH=/nonexistent", "/bin/bash",
-                                          QuorvexTest::sandboxPath(), "--", "true"});
+    CommandResult const run =
+        runCommand({"/usr/bin/env", "PATH=/nonexistent", "QUORVEX_SANDBOX=", "/bin/bash",
+                    QuorvexTest::sandboxPath(), "--", "true"});
     EXPECT_EQ(gc_ExitSkip, run.exitStatus);
     EXPECT_EQ(std::string("sandbox: cannot make a private mount namespace: the unshare command is "
                           "not installed; cannot use proot either: proot is not installed; ") +
@@ -246,7 +284,7 @@ TEST(SandboxHost, WithoutNamespaceProotShowsTheConsoleAtTheFixedPaths) {
         "[lsvtc]\nstdout 0:1234-ABC_10ABCDE;\n"
         "[lspartition *]\nstdout 1,10.1.1.11,3,host1,Zeph,7.2;\n");
     CommandResult const run = _sandboxWith(
-        {noNamespace.path()},
+        {noNamespace.path(), "QUORVEX_SANDBOX="},
         {"--bind", console.directory() + ":" + console.directory(), "--", "sh", "-c",
          "echo $QUORVEX_SANDBOX_KIND; /opt/lsvtc/bin/lsvtc -t0;"
          "/opt/vtc/bin/lspartition -ix -c 1234-ABC_10ABCDE; test -x /usr/bin/runact-api &&"
