@@ -54,6 +54,13 @@ CommandResult _sandboxWith(std::vector<std::string> const& environment,
     return runCommand(argv);
 }
 
+// tools/sandbox run with a PATH where no program is found, so that neither
+// unshare nor proot can be used, and QUORVEX_SANDBOX set to kind.
+CommandResult _sandboxWithEmptyPath(std::string const& kind) {
+    return runCommand({"/usr/bin/env", "PATH=/nonexistent", "QUORVEX_SANDBOX=" + kind, "/bin/bash",
+                       QuorvexTest::sandboxPath(), "--", "true"});
+}
+
 void _makeExecutable(std::string const& path) {
     ::chmod(path.c_str(), 0755);
 }
@@ -189,9 +196,7 @@ TEST(SandboxHost, NoScratchFolderIsMadeOnTheHost) {
 }
 
 TEST(SandboxHost, NoNamespaceToolGivesSkipStatusWithReason) {
-    CommandResult const run =
-        runCommand({"/usr/bin/env", "PATH=/nonexistent", "QUORVEX_SANDBOX=namespace", "/bin/bash",
-                    QuorvexTest::sandboxPath(), "--", "true"});
+    CommandResult const run = _sandboxWithEmptyPath("namespace");
     EXPECT_EQ(gc_ExitSkip, run.exitStatus);
     EXPECT_EQ(
         "sandbox: cannot make a private mount namespace: the unshare command is not installed\n",
@@ -199,9 +204,7 @@ TEST(SandboxHost, NoNamespaceToolGivesSkipStatusWithReason) {
 }
 
 TEST(SandboxHost, NeitherNamespaceNorProotGivesSkipStatusNamingWhatToInstall) {
-    CommandResult const run =
-        runCommand({"/usr/bin/env", "PATH=/nonexistent", "QUORVEX_SANDBOX=", "/bin/bash",
-                    QuorvexTest::sandboxPath(), "--", "true"});
+    CommandResult const run = _sandboxWithEmptyPath("");
     EXPECT_EQ(gc_ExitSkip, run.exitStatus);
     EXPECT_EQ(std::string("sandbox: cannot make a private mount namespace: the unshare command is "
                           "not installed; cannot use proot either: proot is not installed; ") +
@@ -210,9 +213,7 @@ TEST(SandboxHost, NeitherNamespaceNorProotGivesSkipStatusNamingWhatToInstall) {
 }
 
 TEST(SandboxHost, ForcedProotWithoutProotGivesSkipStatusNamingWhatToInstall) {
-    CommandResult const run =
-        runCommand({"/usr/bin/env", "PATH=/nonexistent", "QUORVEX_SANDBOX=proot", "/bin/bash",
-                    QuorvexTest::sandboxPath(), "--", "true"});
+    CommandResult const run = _sandboxWithEmptyPath("proot");
     EXPECT_EQ(gc_ExitSkip, run.exitStatus);
     EXPECT_EQ(std::string("sandbox: cannot use proot: proot is not installed; ") + gc_Remedy + "\n",
               run.stderrText);
