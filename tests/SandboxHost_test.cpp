@@ -6,8 +6,11 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cstdlib>
+#include <filesystem>
 #include <iterator>
 #include <string>
+#include <sys/stat.h>
 #include <unistd.h>
 #include <vector>
 
@@ -19,7 +22,13 @@ using QuorvexTest::runInSandbox;
 namespace {
 
 constexpr int gc_ExitSkip = 77;
+constexpr int gc_ExitSetupFailed = 120;
 constexpr int gc_ExitUsage = 125;
+
+constexpr char gc_Remedy[] =
+    "install proot (apt-get install proot python3; tools/ensure-deps does it as root), or start "
+    "the container with mount namespaces allowed (the capability SYS_ADMIN, or user namespaces "
+    "enabled)";
 
 // The paths the sandbox provides; none may appear on the host.
 std::vector<std::string> const& _consolePaths() {
@@ -32,6 +41,58 @@ CommandResult _sandbox(std::vector<std::string> const& arguments) {
     std::vector<std::string> argv{QuorvexTest::sandboxPath()};
     argv.insert(argv.end(), arguments.begin(), arguments.end());
     return runCommand(argv);
+}
+
+// tools/sandbox with the simulator and the given arguments, under the
+// environment settings given as NAME=VALUE.
+CommandResult _sandboxWith(std::vector<std::string> const& environment,
+                           std::vector<std::string> const& arguments) {
+    std::vector<std::string> argv{"/usr/bin/env"};
+    argv.insert(argv.end(), environment.begin(), environment.end());
+    argv.insert(argv.end(), {QuorvexTest::sandboxPath(), "--sim", QuorvexTest::simulatorPath()});
+    argv.insert(argv.end(), arguments.begin(), arguments.end());
+    return runCommand(argv);
+}
+
+// tools/sandbox run with a PATH where no program is found, so that neither
+// unshare nor proot can be used, and QUORVEX_SANDBOX set to kind.
+CommandResult _sandboxWithEmptyPath(std::string const& kind) {
+    return runCommand({"/usr/bin/env", "PATH=/nonexistent", "QUORVEX_SANDBOX=" + kind, "/bin/bash",
+                       QuorvexTest::sandboxPath(), "--", "true"});
+}
+
+void _makeExecutable(std::string const& path) {
+    ::chmod(path.c_str(), 0755);
+}
+
+// A folder holding an unshare that fails as it does in an unprivileged
+// container, to be put first in PATH.
+class NoNamespaceHere {
+public:
+    NoNamespaceHere() {
+        QuorvexTest::writeFile(_folder.file("unshare"),
+                               "#!/bin/sh\n"
+                               "echo 'unshare: unshare failed: Operation not permitted' >&2\n"
+                               "exit 1\n");
+        _makeExecutable(_folder.file("unshare"));
+    }
+
+    std::string path() const {
+        char const* path = std::getenv("PATH");
+        return "PATH=" + _folder.path() + ":" + (path != nullptr ? path : "/usr/bin:/bin");
+    }
+
+private:
+    QuorvexTest::TemporaryDirectory _folder;
+};
+
+bool _startsWith(std::string const& text, std::string const& head) {
+    return text.rfind(head, 0) == 0;
+}
+
+bool _endsWith(std::string const& text, std::string const& tail) {
+    return text.size() >= tail.size() &&
+           text.compare(text.size() - tail.size(), tail.size(), tail) == 0;
 }
 
 } // namespace
@@ -68,6 +129,43 @@ TEST(SandboxHost, NothingAppearsOnTheHost) {
     }
 }
 
+// The host is looked at while the command runs: the sandbox must not make
+// its paths on the host even for a while.
+TEST(SandboxHost, NothingAppearsOnTheHostWhileTheCommandRuns) {
+    std::vector<std::string> const& paths = _consolePaths();
+    std::string absentPaths;
+    for (std::string const& path : paths) {
+        if (!fileExists(path)) {
+            absentPaths += " " + path;
+        }
+    }
+    if (absentPaths.empty()) {
+        GTEST_SKIP() << "the host already has every console path";
+    }
+    QuorvexTest::TemporaryDirectory shared;
+    std::string const started = shared.file("started");
+    std::string const checked = shared.file("checked");
+    CommandResult const run = QuorvexTest::runShell(
+        "'" + QuorvexTest::sandboxPath() + "' --sim '" + QuorvexTest::simulatorPath() +
+        "' --bind '" + shared.path() + ":" + shared.path() + "' -- sh -c 'touch " + started +
+        "; i=0; while [ ! -e " + checked +
+        " ] && [ $i -lt 600 ]; do sleep 0.1; i=$((i+1)); done' &\n"
+        "i=0; while [ ! -e " +
+        started +
+        " ] && [ $i -lt 600 ]; do sleep 0.1; i=$((i+1)); done\n"
+        "test -e " +
+        started +
+        " || echo 'the sandboxed command never started'\n"
+        "for path in" +
+        absentPaths +
+        "; do test ! -e $path || echo \"$path appeared\"; done\n"
+        "touch " +
+        checked +
+        "\n"
+        "wait $!; echo \"sandbox: $?\"\n");
+    EXPECT_EQ("sandbox: 0\n", run.stdoutText) << run.stderrText;
+}
+
 TEST(SandboxHost, TmpInsideIsNotTheHostTmp) {
     QuorvexTest::TemporaryDirectory hostFolder;
     std::string const insideName = hostFolder.path() + "-made-inside";
@@ -98,26 +196,144 @@ TEST(SandboxHost, NoScratchFolderIsMadeOnTheHost) {
 }
 
 TEST(SandboxHost, NoNamespaceToolGivesSkipStatusWithReason) {
-    CommandResult const run = runCommand({"/usr/bin/env", "PATH=/nonexistent", "/bin/bash",
-                                          QuorvexTest::sandboxPath(), "--", "true"});
+    CommandResult const run = _sandboxWithEmptyPath("namespace");
     EXPECT_EQ(gc_ExitSkip, run.exitStatus);
     EXPECT_EQ(
         "sandbox: cannot make a private mount namespace: the unshare command is not installed\n",
         run.stderrText);
 }
 
-TEST(SandboxHost, UnprivilegedCallerGetsASandboxOrASkip) {
+TEST(SandboxHost, NeitherNamespaceNorProotGivesSkipStatusNamingWhatToInstall) {
+    CommandResult const run = _sandboxWithEmptyPath("");
+    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ(std::string("sandbox: cannot make a private mount namespace: the unshare command is "
+                          "not installed; cannot use proot either: proot is not installed; ") +
+                  gc_Remedy + "\n",
+              run.stderrText);
+}
+
+TEST(SandboxHost, ForcedProotWithoutProotGivesSkipStatusNamingWhatToInstall) {
+    CommandResult const run = _sandboxWithEmptyPath("proot");
+    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ(std::string("sandbox: cannot use proot: proot is not installed; ") + gc_Remedy + "\n",
+              run.stderrText);
+}
+
+TEST(SandboxHost, UnknownSandboxKindIsAUsageError) {
+    CommandResult const run = _sandboxWith({"QUORVEX_SANDBOX=chroot"}, {"--", "true"});
+    EXPECT_EQ(gc_ExitUsage, run.exitStatus);
+    EXPECT_EQ("sandbox: QUORVEX_SANDBOX must be 'namespace' or 'proot', not 'chroot'\n"
+              "sandbox: try 'tools/sandbox --help'\n",
+              run.stderrText);
+}
+
+TEST(SandboxHost, InducedMountFailureInTheNamespaceFailsNamingTheMount) {
+    CommandResult const run =
+        _sandboxWith({"QUORVEX_SANDBOX=namespace", "QUORVEX_SANDBOX_FAIL_MOUNT=/var/adm/quorvex"},
+                     {"--", "true"});
+    if (run.exitStatus == gc_ExitSkip) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
+    EXPECT_EQ("sandbox: setting up the private mount namespace failed: mount -t tmpfs -o "
+              "mode=0755 sandbox-quorvex /var/adm/quorvex: failure induced by "
+              "QUORVEX_SANDBOX_FAIL_MOUNT\n",
+              run.stderrText);
+}
+
+TEST(SandboxHost, InducedBindFailureUnderProotFailsNamingTheBindAndLeavesNothing) {
+    QuorvexTest::TemporaryDirectory scratchBase;
+    CommandResult const run =
+        _sandboxWith({"QUORVEX_SANDBOX=proot", "QUORVEX_SANDBOX_FAIL_MOUNT=/var/adm/quorvex",
+                      "TMPDIR=" + scratchBase.path()},
+                     {"--", "true"});
+    if (run.exitStatus == gc_ExitSkip) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
+    EXPECT_TRUE(
+        _startsWith(run.stderrText, "sandbox: setting up the proot sandbox failed: proot -b " +
+                                        scratchBase.path() + "/quorvex-sandbox."))
+        << run.stderrText;
+    EXPECT_TRUE(_endsWith(run.stderrText, "/quorvex:/var/adm/quorvex: failure induced by "
+                                          "QUORVEX_SANDBOX_FAIL_MOUNT\n"))
+        << run.stderrText;
+    EXPECT_EQ("", QuorvexTest::runShell("ls -A '" + scratchBase.path() + "'").stdoutText);
+}
+
+// ctest counts exit status 77 as a skip: a sandboxed test whose sandbox broke
+// after it was begun must give another status, so that it counts as failed.
+TEST(SandboxHost, InducedMountFailureFailsASandboxedTestInsteadOfSkippingIt) {
+    for (char const* kind : {"namespace", "proot"}) {
+        CommandResult const run =
+            runCommand({"/usr/bin/env", std::string("QUORVEX_SANDBOX=") + kind,
+                        "QUORVEX_SANDBOX_FAIL_MOUNT=/var/adm/quorvex", QUORVEX_SANDBOXED_TEST,
+                        "--gtest_filter=Sandbox.TestMainRunsTestsInsideTheSandbox"});
+        if (run.exitStatus == gc_ExitSkip) {
+            GTEST_SKIP() << run.stderrText;
+        }
+        EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus) << kind;
+        EXPECT_NE(std::string::npos, run.stderrText.find("/var/adm/quorvex: failure induced by "
+                                                         "QUORVEX_SANDBOX_FAIL_MOUNT\n"))
+            << run.stderrText;
+    }
+}
+
+TEST(SandboxHost, WithoutNamespaceProotShowsTheConsoleAtTheFixedPaths) {
+    NoNamespaceHere noNamespace;
+    QuorvexTest::SimulatedConsole console(
+        "[lsvtc]\nstdout 0:1234-ABC_10ABCDE;\n"
+        "[lspartition *]\nstdout 1,10.1.1.11,3,host1,Zeph,7.2;\n");
+    CommandResult const run = _sandboxWith(
+        {noNamespace.path(), "QUORVEX_SANDBOX="},
+        {"--bind", console.directory() + ":" + console.directory(), "--", "sh", "-c",
+         "echo $QUORVEX_SANDBOX_KIND; /opt/lsvtc/bin/lsvtc -t0;"
+         "/opt/vtc/bin/lspartition -ix -c 1234-ABC_10ABCDE; test -x /usr/bin/runact-api &&"
+         "ls -A /var/adm/quorvex /var/adm/quorvex/VPD /var/adm/quorvex/Trace"});
+    if (run.exitStatus == gc_ExitSkip) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ("proot\n"
+              "0:1234-ABC_10ABCDE;\n"
+              "1,10.1.1.11,3,host1,Zeph,7.2;\n"
+              "/var/adm/quorvex:\nTrace\nVPD\n\n"
+              "/var/adm/quorvex/Trace:\n\n"
+              "/var/adm/quorvex/VPD:\n",
+              run.stdoutText);
+    EXPECT_EQ("lsvtc\t-t0\nlspartition\t-ix\t-c\t1234-ABC_10ABCDE\n", console.logText());
+}
+
+TEST(SandboxHost, ProotRefusesTmpSizeWithItsReason) {
+    CommandResult const run =
+        _sandboxWith({"QUORVEX_SANDBOX=proot"}, {"--tmp-size", "16k", "--", "true"});
+    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ("sandbox: --tmp-size needs a private mount namespace, which cannot be made here: "
+              "proot cannot limit the size of /tmp\n",
+              run.stderrText);
+}
+
+// A checkout in a folder only its owner may enter (a home folder) is out of
+// the unprivileged user's reach: the sandbox and the simulator are copied
+// into a folder that user may read.
+TEST(SandboxHost, UnprivilegedCallerGetsASandboxEvenFromAPrivateCheckout) {
     if (::geteuid() != 0 || !fileExists("/usr/bin/setpriv")) {
         GTEST_SKIP() << "needs root and setpriv to become an unprivileged user";
     }
+    QuorvexTest::TemporaryDirectory readable;
+    ::chmod(readable.path().c_str(), 0755);
+    std::string const sandbox = readable.file("sandbox");
+    std::string const simulator = readable.file("pylon-sim");
+    std::filesystem::copy_file(QuorvexTest::sandboxPath(), sandbox);
+    std::filesystem::copy_file(QuorvexTest::simulatorPath(), simulator);
+    _makeExecutable(sandbox);
+    _makeExecutable(simulator);
     CommandResult const run =
         runCommand({"/usr/bin/setpriv", "--reuid=65534", "--regid=65534", "--clear-groups",
-                    QuorvexTest::sandboxPath(), "--sim", QuorvexTest::simulatorPath(), "--", "sh",
-                    "-c", "test -d /var/adm/quorvex/VPD && test -x /usr/bin/runact-api"});
+                    "/usr/bin/env", "-C", "/", sandbox, "--sim", simulator, "--", "sh", "-c",
+                    "test -d /var/adm/quorvex/VPD && test -x /usr/bin/runact-api"});
     if (run.exitStatus == gc_ExitSkip) {
-        EXPECT_EQ(0u, run.stderrText.find("sandbox: cannot make a private mount namespace: "))
-            << run.stderrText;
-        return;
+        GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(0, run.exitStatus) << run.stderrText;
 }

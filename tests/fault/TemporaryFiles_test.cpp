@@ -22,7 +22,13 @@ constexpr char gc_TraceHead[] = "PYLON_VPD_Survey_ClientPartition::main\n";
 constexpr char gc_NoPartitionCode[] = "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n8";
 
 // A /tmp of its own with no inode left: not even an empty file can be made.
+// Only a mount namespace can mount it; proot, which runs the command without
+// privilege, gives the skip status with that reason.
 constexpr char gc_TmpWithoutInode[] =
+    "if [ \"$QUORVEX_SANDBOX_KIND\" = proot ]; then\n"
+    "  echo 'a /tmp without free inodes needs a private mount namespace: proot cannot mount' >&2\n"
+    "  exit 77\n"
+    "fi\n"
     "mount -t tmpfs -o size=64k,nr_inodes=1,mode=1777 quorvex-full-tmp /tmp || exit 125";
 // The size-limited /tmp of the sandbox filled up: files can be made, but
 // nothing can be written into them.
