@@ -15,7 +15,7 @@ namespace {
 
 namespace Survey_Utility = ::Quorvex_PYLON_VPD_Survey_ClientPartition_Utility;
 
-constexpr char gc_VPD_Folder[] = "/var/adm/quorvex/VPD";
+using QuorvexTest::gc_VPD_Folder;
 constexpr char gc_LocalFile[] =
     "VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-2.VPD.xml";
 

@@ -18,7 +18,7 @@ namespace {
 
 using QuorvexTest::Invocation;
 
-constexpr char gc_VPD_Folder[] = "/var/adm/quorvex/VPD";
+using QuorvexTest::gc_VPD_Folder;
 constexpr char gc_LocalPrefix[] = "VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-";
 
 Quorvex::System::Partition u_make_Partition(std::string const& id, std::string const& activeStatus,

@@ -11,10 +11,10 @@ namespace {
 
 using QuorvexTest::Invocation;
 
-constexpr char gc_VPD_Folder[] = "/var/adm/quorvex/VPD";
+using QuorvexTest::gc_VPD_Folder;
 constexpr char gc_StatusFile[] =
     "/var/adm/quorvex/VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE.status";
-constexpr char gc_Heading[] = "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n";
+using QuorvexTest::gc_ReturnCodeHeading;
 constexpr char gc_LocalPrefix[] = "VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-";
 
 constexpr char gc_ConsoleAnswersEverything[] = "[runCmdOnPartition *]\n"
@@ -67,7 +67,7 @@ TEST_F(VPD_Survey_ClientPartition_Run, AllPartitionsSurveyedEndsStandardErrorWit
                                            gc_ConsoleAnswersEverything,
                                        "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, u_local_File("1") + "\n" + u_local_File("2") + "\n");
-    EXPECT_EQ(run.stderrText, std::string("0\n0\n") + gc_Heading + "0");
+    EXPECT_EQ(run.stderrText, std::string("0\n0\n") + gc_ReturnCodeHeading + "0");
     EXPECT_EQ(run.status, "host1 [10.1.1.11] - VPD Survey - Ok\n"
                           "host2 [10.1.1.12] - VPD Survey - Ok\n");
 }
@@ -82,7 +82,7 @@ TEST_F(VPD_Survey_ClientPartition_Run, SomePartitionsFailedEndsStandardErrorWith
                          gc_ConsoleAnswersEverything,
                      "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, u_local_File("1") + "\n" + u_local_File("2") + "\n");
-    EXPECT_EQ(run.stderrText, std::string("8\n0\n") + gc_Heading + "4");
+    EXPECT_EQ(run.stderrText, std::string("8\n0\n") + gc_ReturnCodeHeading + "4");
     EXPECT_EQ(run.status, "host1 [10.1.1.11] - VPD Survey - Partition Failed, RcCmd = 5\n"
                           "host2 [10.1.1.12] - VPD Survey - Ok\n");
 }
@@ -94,7 +94,7 @@ TEST_F(VPD_Survey_ClientPartition_Run, AllPartitionsFailedEndsStandardErrorWithE
                      "[runCmdOnPartition *]\nexit 1\n",
                      "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, u_local_File("1") + "\n");
-    EXPECT_EQ(run.stderrText, std::string("8\n") + gc_Heading + "8");
+    EXPECT_EQ(run.stderrText, std::string("8\n") + gc_ReturnCodeHeading + "8");
     EXPECT_EQ(run.status, "host1 [10.1.1.11] - VPD Survey - RELAY Failed, rc = 4294967295\n"
                           "host2 [10.1.1.12] - VPD Survey - Failed - Active Status < 3\n");
 }
@@ -102,7 +102,7 @@ TEST_F(VPD_Survey_ClientPartition_Run, AllPartitionsFailedEndsStandardErrorWithE
 TEST_F(VPD_Survey_ClientPartition_Run, NoPartitionListedWritesNoActivePartitionFoundAndEight) {
     SurveyRun const run = u_run_Survey("", "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, "");
-    EXPECT_EQ(run.stderrText, std::string(gc_Heading) + "8");
+    EXPECT_EQ(run.stderrText, std::string(gc_ReturnCodeHeading) + "8");
     EXPECT_EQ(run.status, "No ACTIVE Partition Found.\n");
     EXPECT_EQ(run.calls,
               (std::vector<Invocation>{{"lspartition", "-ix", "-c", "1234-ABC_10ABCDE"}}));
@@ -118,7 +118,7 @@ TEST_F(VPD_Survey_ClientPartition_Run, FailingListingCountsAsNoPartition) {
                                        "exit 1\n",
                                        "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, "");
-    EXPECT_EQ(run.stderrText, std::string(gc_Heading) + "8");
+    EXPECT_EQ(run.stderrText, std::string(gc_ReturnCodeHeading) + "8");
     EXPECT_EQ(run.status, "No ACTIVE Partition Found.\n");
 }
 
@@ -127,7 +127,7 @@ TEST_F(VPD_Survey_ClientPartition_Run, InactivePartitionHasNoOutputLinesButAStat
                                        "stdout 1,10.1.1.11,2,host1,Zeph,7.1;\n",
                                        "1234-ABC_10ABCDE");
     EXPECT_EQ(run.stdoutText, "");
-    EXPECT_EQ(run.stderrText, std::string(gc_Heading) + "8");
+    EXPECT_EQ(run.stderrText, std::string(gc_ReturnCodeHeading) + "8");
     EXPECT_EQ(run.status, "host1 [10.1.1.11] - VPD Survey - Failed - Active Status < 3\n");
     EXPECT_EQ(run.calls.size(), 1u);
 }
@@ -172,7 +172,7 @@ TEST_F(VPD_Survey_ClientPartition_Run, IdentityWithoutDashIsListedAsMarkedButNam
               (Invocation{"lspartition", "-ix", "-c", "1234MMAERROR_10ABCDEERROR"}));
     EXPECT_EQ(run.stdoutText, "VPD/quorvexPYLON_VPD_Survey_ClientPartition_"
                               "1234MMAERROR_10ABCDEERROR-2.VPD.xml\n");
-    EXPECT_EQ(run.stderrText, std::string("8\n") + gc_Heading + "8");
+    EXPECT_EQ(run.stderrText, std::string("8\n") + gc_ReturnCodeHeading + "8");
     EXPECT_EQ(run.status, "host2 [10.1.1.12] - VPD Survey - RELAY Failed, rc = 4294967295\n");
     EXPECT_EQ(QuorvexTest::listFolder(gc_VPD_Folder),
               (std::vector<std::string>{

@@ -11,7 +11,7 @@ namespace {
 
 using QuorvexTest::CommandResult;
 
-constexpr char gc_Heading[] = "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n";
+using QuorvexTest::gc_ReturnCodeHeading;
 
 // Standard output and standard error of calculate_ReturnCode in a child process.
 CommandResult u_calculate(std::vector<std::string> const& returnCodes) {
@@ -23,29 +23,30 @@ CommandResult u_calculate(std::vector<std::string> const& returnCodes) {
 
 TEST(calculate_ReturnCode, AllPartitionsSurveyedPrintsZero) {
     CommandResult const output = u_calculate({"0", "0", "0"});
-    EXPECT_EQ(output.stderrText, std::string(gc_Heading) + "0");
+    EXPECT_EQ(output.stderrText, std::string(gc_ReturnCodeHeading) + "0");
     EXPECT_EQ(output.stdoutText, "");
 }
 
 TEST(calculate_ReturnCode, SomePartitionsFailedPrintsFour) {
-    EXPECT_EQ(u_calculate({"8", "8", "0"}).stderrText, std::string(gc_Heading) + "4");
+    EXPECT_EQ(u_calculate({"8", "8", "0"}).stderrText, std::string(gc_ReturnCodeHeading) + "4");
 }
 
 TEST(calculate_ReturnCode, AllPartitionsFailedPrintsEight) {
-    EXPECT_EQ(u_calculate({"8", "8"}).stderrText, std::string(gc_Heading) + "8");
+    EXPECT_EQ(u_calculate({"8", "8"}).stderrText, std::string(gc_ReturnCodeHeading) + "8");
 }
 
 TEST(calculate_ReturnCode, NoPartitionListedPrintsEight) {
-    EXPECT_EQ(u_calculate({}).stderrText, std::string(gc_Heading) + "8");
+    EXPECT_EQ(u_calculate({}).stderrText, std::string(gc_ReturnCodeHeading) + "8");
 }
 
 TEST(calculate_ReturnCode, OnlyCodesThatAreExactlyZeroCount) {
-    EXPECT_EQ(u_calculate({"0 ", " 0", "00", ""}).stderrText, std::string(gc_Heading) + "8");
-    EXPECT_EQ(u_calculate({"0", "00"}).stderrText, std::string(gc_Heading) + "4");
+    EXPECT_EQ(u_calculate({"0 ", " 0", "00", ""}).stderrText,
+              std::string(gc_ReturnCodeHeading) + "8");
+    EXPECT_EQ(u_calculate({"0", "00"}).stderrText, std::string(gc_ReturnCodeHeading) + "4");
 }
 
 TEST(calculate_ReturnCode, OneSurveyedPartitionPrintsZero) {
-    EXPECT_EQ(u_calculate({"0"}).stderrText, std::string(gc_Heading) + "0");
+    EXPECT_EQ(u_calculate({"0"}).stderrText, std::string(gc_ReturnCodeHeading) + "0");
 }
 
 } // namespace

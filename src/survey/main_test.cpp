@@ -11,10 +11,10 @@ namespace {
 
 using QuorvexTest::CommandResult;
 
-constexpr char gc_VPD_Folder[] = "/var/adm/quorvex/VPD";
+using QuorvexTest::gc_VPD_Folder;
 constexpr char gc_TraceFile[] =
     "/var/adm/quorvex/Trace/quorvexPYLON_VPD_Survey_ClientPartition.Trace";
-constexpr char gc_Heading[] = "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n";
+using QuorvexTest::gc_ReturnCodeHeading;
 constexpr char gc_FirstTraceLine[] = "PYLON_VPD_Survey_ClientPartition::main\n";
 constexpr char gc_Listing[] = "[lspartition *]\n"
                               "stdout 2,10.1.1.12,3,host2,Zeph,7.1;3,10.1.1.13,3,host3,Zeph,7.2;\n";
@@ -77,7 +77,7 @@ TEST_F(SurveyTool, PlainArgumentBeforeMachineOptionIsIgnored) {
     QuorvexTest::SimulatedConsole const console("");
     CommandResult const result = u_run_Tool({"extra", "-c", "1234-ABC_10ABCDE"});
     EXPECT_EQ(result.exitStatus, 2);
-    EXPECT_EQ(result.stderrText, std::string(gc_Heading) + "8");
+    EXPECT_EQ(result.stderrText, std::string(gc_ReturnCodeHeading) + "8");
     EXPECT_EQ(console.invocations(), (std::vector<QuorvexTest::Invocation>{
                                          {"lspartition", "-ix", "-c", "1234-ABC_10ABCDE"}}));
 }
@@ -87,7 +87,7 @@ TEST_F(SurveyTool, ExitsWithTwoEvenWhenEveryPartitionFailed) {
                                                 "[runCmdOnPartition *]\nexit 1\n");
     CommandResult const result = u_run_Tool({"-c", "1234-ABC_10ABCDE"});
     EXPECT_EQ(result.exitStatus, 2);
-    EXPECT_EQ(result.stderrText, std::string("8\n8\n") + gc_Heading + "8");
+    EXPECT_EQ(result.stderrText, std::string("8\n8\n") + gc_ReturnCodeHeading + "8");
 }
 
 TEST_F(SurveyTool, ExitsWithTwoWhenEveryPartitionWasSurveyed) {
@@ -97,7 +97,7 @@ TEST_F(SurveyTool, ExitsWithTwoWhenEveryPartitionWasSurveyed) {
         "[getFileFromPartition *]\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n");
     CommandResult const result = u_run_Tool({"-c", "1234-ABC_10ABCDE"});
     EXPECT_EQ(result.exitStatus, 2);
-    EXPECT_EQ(result.stderrText, std::string("0\n0\n") + gc_Heading + "0");
+    EXPECT_EQ(result.stderrText, std::string("0\n0\n") + gc_ReturnCodeHeading + "0");
 }
 
 TEST_F(SurveyTool, NamesAndCodesInterleavePerPartitionWhenBothStreamsShareAFile) {
@@ -113,7 +113,7 @@ TEST_F(SurveyTool, NamesAndCodesInterleavePerPartitionWhenBothStreamsShareAFile)
                           "8\n"
                           "VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-3.VPD.xml\n"
                           "0\n") +
-                  gc_Heading + "4");
+                  gc_ReturnCodeHeading + "4");
 }
 
 } // namespace

@@ -56,6 +56,7 @@ private:
     std::vector<std::string> _command(std::vector<std::string> const& tool) const;
     void _expectVPDFolder() const;
     void _expectTrace() const;
+    void _expectCalls() const;
     std::vector<std::string> _leftInTmp() const;
 
     std::string _name;

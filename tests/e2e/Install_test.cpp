@@ -36,7 +36,7 @@ bool u_is_ExecutableFile(std::string const& path) {
 }
 
 void u_expect_ResultFolders(std::string const& destDir) {
-    for (char const* folder : {"/var/adm/quorvex/VPD", "/var/adm/quorvex/Trace"}) {
+    for (char const* folder : {QuorvexTest::gc_VPD_Folder, QuorvexTest::gc_TraceFolder}) {
         EXPECT_TRUE(fs::is_directory(destDir + folder)) << destDir + folder;
         EXPECT_TRUE(QuorvexTest::listFolder(destDir + folder).empty()) << destDir + folder;
     }

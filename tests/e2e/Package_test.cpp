@@ -126,7 +126,7 @@ void u_expect_Unpacked(std::string const& root) {
     std::string const manualPage = root + "/usr/share/man/man8/" + gc_Tool + ".8";
     ASSERT_TRUE(QuorvexTest::fileExists(manualPage));
     EXPECT_EQ(QuorvexTest::readFile(manualPage), QuorvexTest::readFile(QUORVEX_MANUAL_PAGE));
-    for (char const* folder : {"/var/adm/quorvex/VPD", "/var/adm/quorvex/Trace"}) {
+    for (char const* folder : {QuorvexTest::gc_VPD_Folder, QuorvexTest::gc_TraceFolder}) {
         EXPECT_TRUE(fs::is_directory(root + folder)) << folder;
         EXPECT_EQ(QuorvexTest::listFolder(root + folder), std::vector<std::string>{}) << folder;
     }

@@ -28,7 +28,7 @@ constexpr char gc_Listing[] = "/opt/vtc/bin/lspartition";
 constexpr char gc_RemoteAction[] = "/usr/bin/runact-api";
 constexpr char gc_Prefix[] = "VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE";
 constexpr char gc_StatusFile[] = "quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE.status";
-constexpr char gc_ReturnCodeHead[] = "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n";
+using QuorvexTest::gc_ReturnCodeHeading;
 
 constexpr long gc_KiB = 1024;
 constexpr long gc_TenMiB = 10 * gc_KiB * gc_KiB;
@@ -228,7 +228,7 @@ TEST_F(HugeConsoleOutput, RemoteActionLinesOfTenMiBActAsTheirFirst65533Character
         return;
     }
     expectOutcome(std::string(gc_Prefix) + "-1.VPD.xml\n" + gc_Prefix + "-2.VPD.xml\n",
-                  std::string("8\n8\n") + gc_ReturnCodeHead + "8",
+                  std::string("8\n8\n") + gc_ReturnCodeHeading + "8",
                   "host1 [10.1.1.11] - VPD Survey - 4et result Failed, rc = \n"
                   "host2 [10.1.1.12] - VPD Survey - Partition Failed, RcCmd = 7\n");
     // The reason holds the client's RetStr1 as far as the line was kept.

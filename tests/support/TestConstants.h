@@ -13,6 +13,10 @@ namespace QuorvexTest {
 inline constexpr char gc_VPD_Folder[] = "/var/adm/quorvex/VPD";
 inline constexpr char gc_TraceFolder[] = "/var/adm/quorvex/Trace";
 
+// What the tool prints on standard error before the run's code.
+inline constexpr char gc_ReturnCodeHeading[] =
+    "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n";
+
 // The machine most examples survey: type-model 1234-ABC, serial 10ABCDE.
 inline constexpr char gc_ExampleTypeModel[] = "1234-ABC";
 inline constexpr char gc_ExampleSerial[] = "10ABCDE";
