@@ -374,7 +374,8 @@ TEST(SandboxHost, HelpDocumentsEveryOption) {
     for (char const* option :
          {"--sim PATH", "--vpd DIR", "--trace DIR", "--no-vpd-dir", "--no-trace-dir",
           "--readonly-vpd", "--readonly-trace", "--readonly-tmp", "--tmp-size SIZE",
-          "--bind SRC:DST", "77", "125"}) {
+          "--bind SRC:DST", "77", "120", "125", "QUORVEX_SANDBOX=namespace|proot",
+          "QUORVEX_SANDBOX_FAIL_MOUNT=PATH", "QUORVEX_SANDBOX_KIND"}) {
         EXPECT_NE(std::string::npos, run.stdoutText.find(option)) << option;
     }
 }
