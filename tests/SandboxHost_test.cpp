@@ -284,12 +284,13 @@ TEST(SandboxHost, WithoutNamespaceProotShowsTheConsoleAtTheFixedPaths) {
     QuorvexTest::SimulatedConsole console(
         "[lsvtc]\nstdout 0:1234-ABC_10ABCDE;\n"
         "[lspartition *]\nstdout 1,10.1.1.11,3,host1,Zeph,7.2;\n");
+    std::string const commandLine =
+        "echo $QUORVEX_SANDBOX_KIND; /opt/lsvtc/bin/lsvtc -t0;"
+        "/opt/vtc/bin/lspartition -ix -c 1234-ABC_10ABCDE; test -x /usr/bin/runact-api &&"
+        "ls -A /var/adm/quorvex /var/adm/quorvex/VPD /var/adm/quorvex/Trace";
     CommandResult const run = _sandboxWith(
         {noNamespace.path(), "QUORVEX_SANDBOX="},
-        {"--bind", console.directory() + ":" + console.directory(), "--", "sh", "-c",
-         "echo $QUORVEX_SANDBOX_KIND; /opt/lsvtc/bin/lsvtc -t0;"
-         "/opt/vtc/bin/lspartition -ix -c 1234-ABC_10ABCDE; test -x /usr/bin/runact-api &&"
-         "ls -A /var/adm/quorvex /var/adm/quorvex/VPD /var/adm/quorvex/Trace"});
+        {"--bind", console.directory() + ":" + console.directory(), "--", "sh", "-c", commandLine});
     if (run.exitStatus == gc_ExitSkip) {
         GTEST_SKIP() << run.stderrText;
     }
@@ -374,7 +375,8 @@ TEST(SandboxHost, HelpDocumentsEveryOption) {
     for (char const* option :
          {"--sim PATH", "--vpd DIR", "--trace DIR", "--no-vpd-dir", "--no-trace-dir",
           "--readonly-vpd", "--readonly-trace", "--readonly-tmp", "--tmp-size SIZE",
-          "--bind SRC:DST", "77", "125"}) {
+          "--bind SRC:DST", "77", "120", "125", "QUORVEX_SANDBOX=namespace|proot",
+          "QUORVEX_SANDBOX_FAIL_MOUNT=PATH", "QUORVEX_SANDBOX_KIND"}) {
         EXPECT_NE(std::string::npos, run.stdoutText.find(option)) << option;
     }
 }

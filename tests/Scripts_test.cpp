@@ -6,7 +6,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <string>
+#include <sys/stat.h>
 #include <vector>
 
 using QuorvexTest::CommandResult;
@@ -41,6 +43,42 @@ CommandResult _run(Script const& script, std::string const& argument) {
 bool _startsWith(std::string const& text, std::string const& head) {
     return text.rfind(head, 0) == 0;
 }
+
+// A folder, put first in PATH, whose cmake does nothing and whose ctest
+// prints the given summary and exits with the given status, so that
+// tools/test can be run without building anything.
+class StandInBuildTools {
+public:
+    StandInBuildTools(std::string const& ctestSummary, int ctestStatus) {
+        _write("cmake", "exit 0\n");
+        QuorvexTest::writeFile(_folder.file("summary"), ctestSummary);
+        _write("ctest",
+               "cat '" + _folder.file("summary") + "'\nexit " + std::to_string(ctestStatus) + "\n");
+    }
+
+    CommandResult runTest(std::string const& allowSkips) const {
+        char const* path = std::getenv("PATH");
+        return runCommand(
+            {"/usr/bin/env",
+             "PATH=" + _folder.path() + ":" + (path != nullptr ? path : "/usr/bin:/bin"),
+             "QUORVEX_ALLOW_SKIPS=" + allowSkips, QuorvexTest::sourceRoot() + "/tools/test"});
+    }
+
+private:
+    void _write(std::string const& name, std::string const& body) const {
+        QuorvexTest::writeFile(_folder.file(name), "#!/bin/sh\n" + body);
+        ::chmod(_folder.file(name).c_str(), 0755);
+    }
+
+    QuorvexTest::TemporaryDirectory _folder;
+};
+
+constexpr char gc_SummaryWithSkips[] = "90% tests passed, 0 tests failed out of 10\n"
+                                       "\n"
+                                       "The following tests did not run:\n"
+                                       "\t  3 - Sandbox.TmpSizeLimitsTmp (Skipped)\n"
+                                       "\t  7 - Sandbox.ReadonlyTmpRefusesNewFiles (Skipped)\n";
+constexpr char gc_SummaryWithoutSkips[] = "100% tests passed, 0 tests failed out of 10\n";
 
 } // namespace
 
@@ -95,4 +133,35 @@ TEST(Scripts, TestRefusesAnAllowSkipsValueOtherThanZeroOrOne) {
     EXPECT_EQ("test: QUORVEX_ALLOW_SKIPS must be 0 or 1, not 'yes'\n"
               "test: try 'tools/test --help'\n",
               run.stderrText);
+}
+
+TEST(Scripts, TestFailsWhenATestWasSkipped) {
+    CommandResult const run = StandInBuildTools(gc_SummaryWithSkips, 0).runTest("0");
+    EXPECT_EQ(1, run.exitStatus);
+    EXPECT_NE(std::string::npos, run.stdoutText.find(gc_SummaryWithSkips)) << run.stdoutText;
+    EXPECT_NE(std::string::npos,
+              run.stderrText.find("test: 2 tests skipped (listed above; their output, with the "
+                                  "reason, is in build/dev/Testing/Temporary/LastTest.log); a "
+                                  "skipped test did not run. Set QUORVEX_ALLOW_SKIPS=1 to accept "
+                                  "skips.\n"))
+        << run.stderrText;
+}
+
+TEST(Scripts, TestAcceptsSkipsWhenAllowed) {
+    CommandResult const run = StandInBuildTools(gc_SummaryWithSkips, 0).runTest("1");
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_NE(std::string::npos,
+              run.stdoutText.find("test: 2 tests skipped, allowed by QUORVEX_ALLOW_SKIPS=1\n"))
+        << run.stdoutText;
+}
+
+TEST(Scripts, TestPassesWithoutSkips) {
+    CommandResult const run = StandInBuildTools(gc_SummaryWithoutSkips, 0).runTest("0");
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ(std::string::npos, run.stdoutText.find("skipped")) << run.stdoutText;
+}
+
+TEST(Scripts, TestFailsWithTheStatusOfFailedTests) {
+    CommandResult const run = StandInBuildTools(gc_SummaryWithoutSkips, 8).runTest("1");
+    EXPECT_EQ(8, run.exitStatus) << run.stderrText;
 }
