@@ -39,16 +39,12 @@ void _replaceFile(std::string const& path, std::string const& text) {
     }
 }
 
-// Where two texts first differ, as "line N".
+// Where two texts first differ, as "line N" of the expected text.
 std::string _firstDifference(std::string const& expected, std::string const& actual) {
-    std::size_t offset = 0;
-    while (offset < expected.size() && offset < actual.size() &&
-           expected[offset] == actual[offset]) {
-        ++offset;
-    }
-    std::size_t const line =
-        1 + static_cast<std::size_t>(std::count(expected.begin(), expected.begin() + offset, '\n'));
-    return "line " + std::to_string(line);
+    auto const differ =
+        std::mismatch(expected.begin(), expected.end(), actual.begin(), actual.end());
+    auto const lineEnds = std::count(expected.begin(), differ.first, '\n');
+    return "line " + std::to_string(lineEnds + 1);
 }
 
 ::testing::AssertionResult _mismatch(std::string const& expected, std::string const& actual,

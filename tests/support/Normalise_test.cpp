@@ -48,7 +48,7 @@ TEST(NormaliseTimeStamps, StampsWithinTheRunBecomeTheSampleStamp) {
 }
 
 TEST(NormaliseTimeStamps, StampsOutsideTheRunStay) {
-    std::string const text = "<A timestamp=\"1800000011000\"/><B timestamp=\"1800000005123\"/>";
+    std::string const text = R"(<A timestamp="1800000011000"/><B timestamp="1800000005123"/>)";
     EXPECT_EQ(normaliseTimeStamps(text, 1800000000, 1800000010), text);
 }
 

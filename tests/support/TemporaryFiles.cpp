@@ -55,7 +55,7 @@ std::string scratchDirectory() {
     }
     // In /tmp, like the shell command runner's own temporary files, whatever
     // $TMPDIR says.
-    std::string const folder = _makeFolder("/tmp", "quorvex-scratch");
+    std::string folder = _makeFolder("/tmp", "quorvex-scratch");
     ::setenv(gc_ScratchVariable, folder.c_str(), 1);
     return folder;
 }
