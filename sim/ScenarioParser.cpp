@@ -95,7 +95,7 @@ void ScenarioParser::_parseLine(std::string const& line) {
     std::size_t const separator = line.find_first_of(" \t");
     std::string const key = line.substr(0, separator);
     std::string const value = separator == std::string::npos ? "" : line.substr(separator + 1);
-    if (key == "exit" || key == "delay") {
+    if (key == "exit" || key == "delay" || key == "child-delay") {
         _parseSetting(key, value);
         return;
     }
@@ -158,7 +158,14 @@ void ScenarioParser::_parseSetting(std::string const& key, std::string const& va
     double const seconds = std::strtod(begin, &end);
     if (text.empty() || *end != '\0' || !std::isfinite(seconds) || seconds < 0.0 ||
         seconds > gc_MaximumDelay || text.find_first_of("xXnN") != std::string::npos) {
-        _fail("delay must be a number of seconds from 0 to 3600, not \"" + text + "\"");
+        _fail(key + " must be a number of seconds from 0 to 3600, not \"" + text + "\"");
+    }
+    if (key == "child-delay") {
+        if (_tool.empty()) {
+            _fail("\"child-delay\" must follow a section header");
+        }
+        _response.childDelay = seconds;
+        return;
     }
     if (_tool.empty()) {
         _scenario._defaultDelay = seconds;
@@ -178,7 +185,8 @@ void ScenarioParser::_parseText(std::string const& key, std::string const& value
         stream = Stream::Document;
     } else if (streamName != "stdout") {
         _fail("unknown key \"" + key +
-              "\" (expected stdout, stderr, document, their -nolf and -file forms, exit or delay)");
+              "\" (expected stdout, stderr, document, their -nolf and -file forms, exit, delay or "
+              "child-delay)");
     }
     if (formName != "" && formName != "nolf" && formName != "file") {
         _fail("unknown key \"" + key + "\" (a text key ends in nothing, -nolf or -file)");
