@@ -1,0 +1,160 @@
+#include "fleet/ProcessTree.h"
+
+#include <dirent.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <csignal>
+#include <ctime>
+#include <fstream>
+#include <iterator>
+#include <sstream>
+
+namespace Fleet {
+
+namespace {
+
+// A tree of processes that keeps forking is still killed within this many rounds.
+constexpr int gc_KillRounds = 1000;
+constexpr useconds_t gc_PauseBetweenRounds = 1000;
+
+std::string readWholeFile(std::string const& path) {
+    std::ifstream file(path, std::ios::binary);
+    return std::string(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
+}
+
+std::string procPath(pid_t pid, char const* name) {
+    return "/proc/" + std::to_string(pid) + "/" + name;
+}
+
+std::vector<std::string> threadsOf(pid_t pid) {
+    std::vector<std::string> threads;
+    DIR* directory = opendir(procPath(pid, "task").c_str());
+    if (directory == nullptr) {
+        return threads;
+    }
+    while (dirent const* entry = readdir(directory)) {
+        if (entry->d_name[0] != '.') {
+            threads.emplace_back(entry->d_name);
+        }
+    }
+    closedir(directory);
+    return threads;
+}
+
+double secondsSinceBoot() {
+    timespec now{};
+    clock_gettime(CLOCK_BOOTTIME, &now);
+    return static_cast<double>(now.tv_sec) + static_cast<double>(now.tv_nsec) / 1e9;
+}
+
+} // namespace
+
+std::vector<pid_t> ProcessTree::childrenOf(pid_t pid) {
+    std::vector<pid_t> children;
+    for (auto const& thread : threadsOf(pid)) {
+        std::istringstream list(readWholeFile(procPath(pid, "task/") + thread + "/children"));
+        pid_t child = 0;
+        while (list >> child) {
+            children.push_back(child);
+        }
+    }
+    return children;
+}
+
+std::vector<pid_t> ProcessTree::descendantsOf(pid_t pid) {
+    std::vector<pid_t> found = childrenOf(pid);
+    for (std::size_t i = 0; i < found.size(); ++i) {
+        for (pid_t grandchild : childrenOf(found[i])) {
+            found.push_back(grandchild);
+        }
+    }
+    return found;
+}
+
+std::string ProcessTree::commandLineOf(pid_t pid) {
+    std::string text = readWholeFile(procPath(pid, "cmdline"));
+    for (char& c : text) {
+        if (c == '\0') {
+            c = ' ';
+        }
+    }
+    return text;
+}
+
+std::optional<std::string> ProcessTree::_statFields(pid_t pid) {
+    std::string const stat = readWholeFile(procPath(pid, "stat"));
+    // The command name in parentheses may hold blanks and parentheses itself.
+    std::size_t const end = stat.rfind(')');
+    if (end == std::string::npos || end + 2 > stat.size()) {
+        return std::nullopt;
+    }
+    return stat.substr(end + 2);
+}
+
+std::optional<double> ProcessTree::ageOf(pid_t pid) {
+    std::optional<std::string> const fields = _statFields(pid);
+    if (!fields) {
+        return std::nullopt;
+    }
+    // After the name: state is field 3, start time (clock ticks after boot) field 22.
+    std::istringstream stream(*fields);
+    std::string field;
+    for (int index = 3; index < 22 && stream >> field; ++index) {
+    }
+    unsigned long long startTicks = 0;
+    if (!(stream >> startTicks)) {
+        return std::nullopt;
+    }
+    double const started =
+        static_cast<double>(startTicks) / static_cast<double>(sysconf(_SC_CLK_TCK));
+    double const age = secondsSinceBoot() - started;
+    return age < 0 ? 0.0 : age;
+}
+
+bool ProcessTree::hasEnded(pid_t pid) {
+    std::optional<std::string> const fields = _statFields(pid);
+    return !fields || fields->empty() || (*fields)[0] == 'Z' || (*fields)[0] == 'X';
+}
+
+bool ProcessTree::stopChild(pid_t child, int& exitStatus) {
+    if (kill(child, SIGSTOP) != 0) {
+        return false;
+    }
+    while (true) {
+        int status = 0;
+        pid_t const result = waitpid(child, &status, WUNTRACED);
+        if (result == child && WIFSTOPPED(status)) {
+            return true;
+        }
+        if (result == child) {
+            exitStatus = status;
+            return false;
+        }
+        if (result < 0 && errno != EINTR) {
+            return false;
+        }
+    }
+}
+
+std::size_t ProcessTree::killDescendants(pid_t root) {
+    std::size_t signalsSent = 0;
+    for (int round = 0; round < gc_KillRounds; ++round) {
+        bool anyAlive = false;
+        for (pid_t pid : descendantsOf(root)) {
+            if (!hasEnded(pid)) {
+                anyAlive = true;
+                kill(pid, SIGKILL);
+                ++signalsSent;
+            }
+        }
+        if (!anyAlive) {
+            break;
+        }
+        usleep(gc_PauseBetweenRounds);
+    }
+    return signalsSent;
+}
+
+} // namespace Fleet
