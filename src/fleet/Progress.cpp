@@ -30,7 +30,7 @@ std::optional<double> Progress::estimateLeft(ProgressFigures const& figures) {
 }
 
 std::string Progress::format(ProgressFigures const& figures) {
-    std::optional<double> const left = estimateLeft(figures);
+    std::optional<double> const& left = figures.leftSeconds;
     std::string line = "machines " + std::to_string(figures.machinesDone) + "/" +
                        std::to_string(figures.machines) + "  partitions " +
                        std::to_string(figures.surveyed) + " ok " + std::to_string(figures.failed) +

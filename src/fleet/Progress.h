@@ -16,6 +16,8 @@ struct ProgressFigures {
     // Partitions listed so far.
     std::size_t partitions = 0;
     double elapsedSeconds = 0;
+    // The estimate of the time left; nullopt while there is none.
+    std::optional<double> leftSeconds;
     // The partition that has been running longest, and for how long.
     std::string longestName;
     double longestSeconds = 0;
@@ -29,7 +31,8 @@ public:
     // 00:01:12 elapsed, ~00:03:10 left  longest: 9119-MHE_21ABCDE-7 (45 s)"
     // (on one line).
     static std::string format(ProgressFigures const& figures);
-    // The time left from the pace so far; nullopt before anything finished.
+    // The time left at the pace so far (elapsed time per finished
+    // partition times the partitions left); nullopt before one finished.
     static std::optional<double> estimateLeft(ProgressFigures const& figures);
     // "HH:MM:SS"
     static std::string clock(double seconds);

@@ -346,6 +346,7 @@ void SurveyRun::_drawProgress() {
         }
     }
     figures.elapsedSeconds = _secondsSince(_start);
+    figures.leftSeconds = Progress::estimateLeft(figures);
     Progress::draw(Progress::format(figures));
 }
 
