@@ -1,0 +1,345 @@
+#include "report/FolderReader.h"
+
+#include "report/FailureReason.h"
+#include "report/LocalTime.h"
+#include "report/StatusText.h"
+#include "report/SummaryTotals.h"
+#include "report/TextSafety.h"
+#include "report/VpdDocument.h"
+
+#include <algorithm>
+#include <chrono>
+#include <filesystem>
+#include <fstream>
+#include <map>
+#include <sstream>
+#include <unistd.h>
+#include <vector>
+
+namespace report {
+
+namespace fs = std::filesystem;
+using Json = nlohmann::ordered_json;
+
+namespace {
+
+constexpr char filePrefix[] = "quorvexPYLON_VPD_Survey_ClientPartition_";
+constexpr char statusSuffix[] = ".status";
+constexpr char documentSuffix[] = ".VPD.xml";
+constexpr char noPartitionsLine[] = "No ACTIVE Partition Found.";
+constexpr char statusSeparator[] = "] - VPD Survey - ";
+constexpr char documentFolder[] = "VPD/";
+
+struct DocumentFile {
+    std::string name;
+    std::string id;
+    VpdDocument content;
+    bool used = false;
+};
+
+struct StatusLine {
+    std::string host;
+    std::string ip;
+    std::string statusText;
+};
+
+bool endsWith(std::string const& text, std::string const& suffix) {
+    return text.size() >= suffix.size() &&
+           text.compare(text.size() - suffix.size(), suffix.size(), suffix) == 0;
+}
+
+bool startsWith(std::string const& text, std::string const& prefix) {
+    return text.compare(0, prefix.size(), prefix) == 0;
+}
+
+std::string readText(fs::path const& path) {
+    std::ifstream file(path, std::ios::binary);
+    std::ostringstream text;
+    text << file.rdbuf();
+    return text.str();
+}
+
+// "<host> [<ip>] - VPD Survey - <status>": the host may hold anything, the
+// status texts never hold the separator, so the last one splits.
+std::optional<StatusLine> parseStatusLine(std::string const& line) {
+    std::string::size_type const separator = line.rfind(statusSeparator);
+    if (separator == std::string::npos) {
+        return std::nullopt;
+    }
+    std::string::size_type const open = line.rfind(" [", separator);
+    if (open == std::string::npos) {
+        return std::nullopt;
+    }
+    return StatusLine{line.substr(0, open), line.substr(open + 2, separator - open - 2),
+                      line.substr(separator + std::string(statusSeparator).size())};
+}
+
+std::vector<StatusLine> readStatusLines(fs::path const& path) {
+    std::istringstream text(readText(path));
+    std::vector<StatusLine> lines;
+    std::string line;
+    while (std::getline(text, line)) {
+        if (line == noPartitionsLine) {
+            continue;
+        }
+        if (auto parsed = parseStatusLine(line)) {
+            lines.push_back(*parsed);
+        }
+    }
+    return lines;
+}
+
+// Numeric IDs in numeric order, then the others in text order.
+bool isBeforeInIdOrder(DocumentFile const& a, DocumentFile const& b) {
+    auto const key = [](std::string const& id) {
+        bool const numeric =
+            !id.empty() && id.size() < 19 &&
+            std::all_of(id.begin(), id.end(), [](char c) { return c >= '0' && c <= '9'; });
+        return std::make_tuple(!numeric, numeric ? std::stoll(id) : 0LL, id);
+    };
+    return key(a.id) < key(b.id);
+}
+
+class FolderScan {
+public:
+    explicit FolderScan(fs::path folder) : _folder(std::move(folder)) {}
+
+    Json summary() {
+        std::map<std::string, fs::path> statusFiles;
+        std::vector<fs::path> documents;
+        listFolder(statusFiles, documents);
+        std::map<std::string, std::vector<DocumentFile>> documentsByMachine;
+        for (fs::path const& document : documents) {
+            assignDocument(document, statusFiles, documentsByMachine);
+        }
+        Json machines = Json::array();
+        Json identities = Json::array();
+        for (auto const& [identity, path] : statusFiles) {
+            noteTime(path);
+            machines.push_back(machine(identity, path, documentsByMachine[identity]));
+            identities.push_back(validUtf8(identity));
+        }
+        return runSummary(std::move(machines), std::move(identities));
+    }
+
+private:
+    void listFolder(std::map<std::string, fs::path>& statusFiles,
+                    std::vector<fs::path>& documents) const {
+        std::error_code error;
+        for (fs::directory_iterator entry(_folder, error), end; !error && entry != end;
+             entry.increment(error)) {
+            std::string const name = entry->path().filename().string();
+            if (!startsWith(name, filePrefix) || !entry->is_regular_file(error)) {
+                continue;
+            }
+            if (endsWith(name, statusSuffix)) {
+                std::string const identity =
+                    name.substr(sizeof filePrefix - 1,
+                                name.size() - (sizeof filePrefix - 1) - (sizeof statusSuffix - 1));
+                statusFiles.emplace(identity, entry->path());
+            } else if (endsWith(name, documentSuffix)) {
+                documents.push_back(entry->path());
+            }
+        }
+    }
+
+    // A document belongs to the machine with the longest identity its name
+    // starts with, followed by "-" and the partition ID.
+    void assignDocument(fs::path const& path, std::map<std::string, fs::path> const& statusFiles,
+                        std::map<std::string, std::vector<DocumentFile>>& byMachine) {
+        std::string const name = path.filename().string();
+        std::string const stem =
+            name.substr(sizeof filePrefix - 1,
+                        name.size() - (sizeof filePrefix - 1) - (sizeof documentSuffix - 1));
+        std::string const* owner = nullptr;
+        for (auto const& entry : statusFiles) {
+            if (startsWith(stem, entry.first + "-") &&
+                (owner == nullptr || entry.first.size() > owner->size())) {
+                owner = &entry.first;
+            }
+        }
+        if (owner == nullptr) {
+            return;
+        }
+        byMachine[*owner].push_back(
+            {name, stem.substr(owner->size() + 1), parseVpdDocument(readText(path)), false});
+        noteTime(path);
+    }
+
+    void noteTime(fs::path const& path) {
+        std::error_code error;
+        auto const time = fs::last_write_time(path, error);
+        if (error) {
+            return;
+        }
+        long long const seconds = std::chrono::duration_cast<std::chrono::seconds>(
+                                      time - fs::file_time_type::clock::now() +
+                                      std::chrono::system_clock::now().time_since_epoch())
+                                      .count();
+        _oldest = std::min(_oldest.value_or(seconds), seconds);
+        _newest = std::max(_newest.value_or(seconds), seconds);
+    }
+
+    Json machine(std::string const& identity, fs::path const& statusFile,
+                 std::vector<DocumentFile>& documents) {
+        std::sort(documents.begin(), documents.end(), isBeforeInIdOrder);
+        Json partitions = Json::array();
+        for (StatusLine const& line : readStatusLines(statusFile)) {
+            partitions.push_back(partition(line, documents));
+        }
+        Json counts = countOutcomes(partitions);
+        Json entry;
+        entry["identity"] = validUtf8(identity);
+        entry["return_code"] = overallCode(counts);
+        entry["status_file"] = validUtf8(fs::absolute(statusFile).lexically_normal().string());
+        entry["trace_file"] = traceFile(identity);
+        entry["counts"] = std::move(counts);
+        entry["partitions"] = std::move(partitions);
+        return entry;
+    }
+
+    // The machine's own trace, as quorvex-survey writes it beside the VPD
+    // folder; the single-machine tool's one trace holds only the last
+    // machine it ran for, so it is named for none.
+    Json traceFile(std::string const& identity) const {
+        fs::path vpd = fs::absolute(_folder).lexically_normal();
+        if (!vpd.has_filename()) {
+            vpd = vpd.parent_path();
+        }
+        fs::path const trace =
+            vpd.parent_path() / "Trace" / (std::string(filePrefix) + identity + ".Trace");
+        std::error_code error;
+        if (!fs::is_regular_file(trace, error)) {
+            return nullptr;
+        }
+        return validUtf8(trace.string());
+    }
+
+    Json partition(StatusLine const& line, std::vector<DocumentFile>& documents) {
+        std::optional<std::string> outcome = outcomeOfStatusText(line.statusText);
+        DocumentFile* document = matchDocument(line, outcome, documents);
+        std::optional<FailureReason> reason;
+        if (document != nullptr && document->content.reason) {
+            reason = parseFailureReason(*document->content.reason);
+        }
+        if (!outcome) {
+            outcome = reason && reason->action == "getFileFromPartition" ? "fetch_failure"
+                                                                         : "client_failure";
+        }
+        if (reason && reason->stoppedBy == "time limit" && *outcome != "interrupted") {
+            outcome = "timed_out";
+        }
+        if (reason && reason->stoppedBy && *reason->stoppedBy != "time limit") {
+            _signal = *reason->stoppedBy;
+        }
+        Json entry;
+        entry["id"] = document ? Json(validUtf8(document->id)) : Json(nullptr);
+        entry["host"] = validUtf8(line.host);
+        entry["ip"] = validUtf8(line.ip);
+        entry["active_status"] = nullptr;
+        entry["outcome"] = *outcome;
+        entry["status_text"] = validUtf8(line.statusText);
+        entry["return_code"] = *outcome == "surveyed" ? "0" : "8";
+        entry["rc"] = reason && reason->rc ? Json(*reason->rc) : Json(nullptr);
+        bool const clientRun = reason && reason->action == "runCmdOnPartition";
+        entry["rc_cmd"] = clientRun && reason->rcCmd ? Json(*reason->rcCmd) : Json(nullptr);
+        entry["document"] =
+            document ? Json(validUtf8(documentFolder + document->name)) : Json(nullptr);
+        entry["reason"] = reason ? Json(validUtf8(*document->content.reason)) : Json(nullptr);
+        entry["seconds"] = nullptr;
+        if (reason && reason->stoppedAfterSeconds && !reason->action.empty()) {
+            entry["time_limit"] = {{"action", reason->action},
+                                   {"stopped_after_seconds", *reason->stoppedAfterSeconds}};
+        }
+        return entry;
+    }
+
+    // The first unused document in ID order for the same host whose kind
+    // fits the status: fetched for a surveyed partition, a default one for a
+    // failure, one stopped by a signal for an interrupted partition; none for
+    // an inactive partition, which gets no document.
+    static DocumentFile* matchDocument(StatusLine const& line,
+                                       std::optional<std::string> const& outcome,
+                                       std::vector<DocumentFile>& documents) {
+        if (outcome == "inactive") {
+            return nullptr;
+        }
+        for (DocumentFile& document : documents) {
+            if (document.used || document.content.host != line.host ||
+                !fitsOutcome(document.content, outcome)) {
+                continue;
+            }
+            document.used = true;
+            return &document;
+        }
+        return nullptr;
+    }
+
+    static bool fitsOutcome(VpdDocument const& document,
+                            std::optional<std::string> const& outcome) {
+        if (outcome == "surveyed") {
+            return !document.reason;
+        }
+        if (!document.reason) {
+            return false;
+        }
+        std::optional<std::string> const stoppedBy = parseFailureReason(*document.reason).stoppedBy;
+        bool const bySignal = stoppedBy && *stoppedBy != "time limit";
+        if (outcome == "interrupted") {
+            return bySignal;
+        }
+        std::string const action = parseFailureReason(*document.reason).action;
+        if (outcome == "fetch_failure") {
+            return action == "getFileFromPartition" && !bySignal;
+        }
+        if (outcome == "channel_failure" || outcome == "client_failure") {
+            return action == "runCmdOnPartition" && !bySignal;
+        }
+        return !bySignal;
+    }
+
+    Json runSummary(Json machines, Json identities) const {
+        Json summary;
+        summary["schema_version"] = 1;
+        summary["tool"] = "quorvex-survey report";
+        summary["version"] = QUORVEX_VERSION;
+        summary["console_host"] = validUtf8(consoleHost());
+        long long const started = _oldest.value_or(0);
+        long long const ended = _newest.value_or(0);
+        summary["started"] = localTimeText(started);
+        summary["ended"] = localTimeText(ended);
+        summary["elapsed_seconds"] = ended - started;
+        summary["options"] = {{"jobs", nullptr},
+                              {"timeout_seconds", nullptr},
+                              {"all", false},
+                              {"identities", std::move(identities)}};
+        summary["interrupted"] = _signal ? Json(*_signal) : Json(nullptr);
+        Json totals = totalCounts(machines);
+        summary["return_code"] = overallCode(totals);
+        summary["exit_status"] = nullptr;
+        summary["totals"] = std::move(totals);
+        summary["machines"] = std::move(machines);
+        return summary;
+    }
+
+    static std::string consoleHost() {
+        char name[256] = {};
+        if (gethostname(name, sizeof name - 1) != 0) {
+            return "";
+        }
+        return name;
+    }
+
+    fs::path _folder;
+    std::optional<long long> _oldest;
+    std::optional<long long> _newest;
+    std::optional<std::string> _signal;
+};
+
+} // namespace
+
+Json readSummaryFromFolder(std::string const& vpdFolder) {
+    return FolderScan(vpdFolder).summary();
+}
+
+} // namespace report
