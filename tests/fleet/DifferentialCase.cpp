@@ -1,0 +1,168 @@
+#include "DifferentialCase.h"
+
+#include "QuorvexTest.h"
+#include "TextDifference.h"
+#include "survey/SurveyTest_Utility.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <set>
+#include <sstream>
+#include <utility>
+
+namespace FleetTest {
+
+namespace {
+
+constexpr char gc_Reference[] = "reference";
+constexpr char gc_StatusSuffix[] = ".status";
+constexpr char gc_NoPartitionLine[] = "No ACTIVE Partition Found.";
+constexpr char gc_SurveyedEnding[] = " - VPD Survey - Ok";
+constexpr char gc_MachineListingCall[] = "lsvtc\t-t0\n";
+
+std::vector<std::string> lines(std::string const& text) {
+    std::vector<std::string> result;
+    std::istringstream stream(text);
+    std::string line;
+    while (std::getline(stream, line)) {
+        result.push_back(line);
+    }
+    return result;
+}
+
+bool endsWith(std::string const& text, std::string const& ending) {
+    return text.size() >= ending.size() &&
+           text.compare(text.size() - ending.size(), ending.size(), ending) == 0;
+}
+
+std::string sortedLines(std::string const& text) {
+    std::vector<std::string> all = lines(text);
+    std::sort(all.begin(), all.end());
+    std::string joined;
+    for (std::string const& line : all) {
+        joined += line + "\n";
+    }
+    return joined;
+}
+
+std::string joinedLines(std::vector<std::string> const& texts) {
+    std::string joined;
+    for (std::string const& text : texts) {
+        joined += text + "\n";
+    }
+    return joined;
+}
+
+} // namespace
+
+DifferentialCase::DifferentialCase(std::string folder, long first, long last)
+    : _folder(std::move(folder)), _first(first), _last(last) {}
+
+std::string DifferentialCase::name() const {
+    return std::filesystem::path(_folder).filename().string();
+}
+
+void DifferentialCase::expectSameAsReference(int jobs) const {
+    std::string const run = "j" + std::to_string(jobs);
+    if (!QuorvexTest::fileExists(_file(run, "exit-status"))) {
+        ADD_FAILURE() << name() << " -j " << jobs << ": the run did not happen";
+        return;
+    }
+    _expectEqual(run, "stdout", QuorvexTest::readFile(_file(gc_Reference, "stdout")),
+                 QuorvexTest::readFile(_file(run, "stdout")));
+    _expectEqual(run, "stderr", _expectedStderr(), QuorvexTest::readFile(_file(run, "stderr")));
+    _expectEqual(run, "exit status", std::to_string(_expectedExitStatus()) + "\n",
+                 QuorvexTest::readFile(_file(run, "exit-status")));
+    _expectEqual(run, "console command lines (sorted)", _expectedCalls(),
+                 sortedLines(QuorvexTest::readFile(_file(run, "calls"))));
+    _expectEqual(run, "files left in /tmp", "", QuorvexTest::readFile(_file(run, "tmp")));
+    _expectSameFolder(run, "VPD");
+    _expectSameFolder(run, "Trace");
+}
+
+std::string DifferentialCase::_file(std::string const& run, std::string const& name) const {
+    return _folder + "/" + run + "/" + name;
+}
+
+std::vector<std::string> DifferentialCase::_identities() const {
+    return lines(QuorvexTest::readFile(_folder + "/identities"));
+}
+
+bool DifferentialCase::_surveysAll() const {
+    return QuorvexTest::readFile(_folder + "/mode") == "all\n";
+}
+
+// The warnings for identities given more than once, once each, in the order
+// of their first repetition, then the one-machine runs' texts.
+std::string DifferentialCase::_expectedStderr() const {
+    std::string warnings;
+    std::set<std::string> seen;
+    std::set<std::string> warned;
+    for (std::string const& identity : _identities()) {
+        if (!seen.insert(identity).second && warned.insert(identity).second) {
+            warnings +=
+                "quorvex-survey: warning: " + identity + " given more than once, surveyed once\n";
+        }
+    }
+    return warnings + QuorvexTest::readFile(_file(gc_Reference, "stderr"));
+}
+
+// The one-machine tool's rule over every listed partition of every machine:
+// 0 all surveyed, 4 some, 8 none or none listed.
+int DifferentialCase::_expectedExitStatus() const {
+    std::size_t listed = 0;
+    std::size_t surveyed = 0;
+    std::string const vpd = _folder + "/" + gc_Reference + "/VPD";
+    for (std::string const& name : SurveyTest_Utility::u_list_Folder(vpd)) {
+        if (!endsWith(name, gc_StatusSuffix)) {
+            continue;
+        }
+        for (std::string const& line : lines(QuorvexTest::readFile(vpd + "/" + name))) {
+            listed += line == gc_NoPartitionLine ? 0 : 1;
+            surveyed += endsWith(line, gc_SurveyedEnding) ? 1 : 0;
+        }
+    }
+    if (surveyed == 0) {
+        return 8;
+    }
+    return surveyed == listed ? 0 : 4;
+}
+
+std::string DifferentialCase::_expectedCalls() const {
+    std::string const calls = QuorvexTest::readFile(_file(gc_Reference, "calls"));
+    return sortedLines(_surveysAll() ? gc_MachineListingCall + calls : calls);
+}
+
+void DifferentialCase::_expectSameFolder(std::string const& run, std::string const& folder) const {
+    std::string const expectedFolder = _file(gc_Reference, folder);
+    std::string const actualFolder = _file(run, folder);
+    std::vector<std::string> const names = SurveyTest_Utility::u_list_Folder(expectedFolder);
+    _expectEqual(run, "names in " + folder, joinedLines(names),
+                 joinedLines(SurveyTest_Utility::u_list_Folder(actualFolder)));
+    for (std::string const& name : names) {
+        std::string const actualPath = actualFolder + "/" + name;
+        if (QuorvexTest::fileExists(actualPath)) {
+            _expectEqual(run, folder + "/" + name,
+                         _normalised(folder, QuorvexTest::readFile(expectedFolder + "/" + name)),
+                         _normalised(folder, QuorvexTest::readFile(actualPath)));
+        }
+    }
+}
+
+std::string DifferentialCase::_normalised(std::string const& folder,
+                                          std::string const& text) const {
+    return folder == "Trace" ? SurveyTest_Utility::u_normalise_TemporaryNames(text)
+                             : SurveyTest_Utility::u_normalise_TimeStamps(text, _first, _last);
+}
+
+void DifferentialCase::_expectEqual(std::string const& run, std::string const& what,
+                                    std::string const& expected, std::string const& actual) const {
+    std::string const difference = firstDifference(expected, actual);
+    if (!difference.empty()) {
+        ADD_FAILURE() << name() << " " << run << ": " << what << ": " << difference;
+    }
+}
+
+} // namespace FleetTest
