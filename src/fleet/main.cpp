@@ -1,5 +1,6 @@
 #include "fleet/ChildProcess.h"
 #include "fleet/CommandLine.h"
+#include "fleet/ProcessTree.h"
 #include "fleet/RunFiles.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
@@ -16,16 +17,34 @@
 
 namespace {
 
+constexpr int gc_PollMilliseconds = 50;
+
 // The console's managed machines, listed in a child of its own so that this
-// process never writes through the survey code's trace.
-std::vector<std::string> listManagedMachines() {
+// process never writes through the survey code's trace. A listing that runs
+// past the time limit, or an interruption, stops it with everything it
+// started; the run then has no machines.
+std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
     Fleet::ChildProcess lister(&Fleet::WorkUnits::listMachines);
     if (!lister.isStarted()) {
         return {};
     }
+    auto const started = std::chrono::steady_clock::now();
     while (lister.readAvailable()) {
-        pollfd descriptor{lister.resultDescriptor(), POLLIN, 0};
-        poll(&descriptor, 1, -1);
+        pollfd descriptors[] = {{lister.resultDescriptor(), POLLIN, 0},
+                                {Fleet::SignalPipe::readDescriptor(), POLLIN, 0}};
+        poll(descriptors, 2, gc_PollMilliseconds);
+        std::chrono::duration<double> const elapsed = std::chrono::steady_clock::now() - started;
+        bool const overLimit = timeoutSeconds > 0 && elapsed.count() >= timeoutSeconds;
+        if (overLimit || Fleet::SignalPipe::takeSignal() != 0) {
+            int status = 0;
+            if (Fleet::ProcessTree::stopChild(lister.pid(), status)) {
+                Fleet::ProcessTree::killDescendants(lister.pid());
+                lister.killAndReap();
+            } else {
+                lister.markReaped();
+            }
+            return {};
+        }
     }
     lister.killAndReap();
     return Fleet::WorkUnits::decodeMachines(lister.result());
@@ -55,7 +74,7 @@ int main(int argc, char** argv) {
 
     Fleet::Options const& options = parsed.options;
     std::vector<std::string> const identities =
-        options.all ? listManagedMachines() : options.identities;
+        options.all ? listManagedMachines(options.timeoutSeconds) : options.identities;
     Fleet::SurveyRun run(options, identities);
     int const exitStatus = run.run();
 
