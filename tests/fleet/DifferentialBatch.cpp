@@ -1,5 +1,7 @@
 #include "DifferentialBatch.h"
 
+#include "FleetTools.h"
+
 #include <ctime>
 #include <filesystem>
 #include <stdexcept>
@@ -26,14 +28,6 @@ std::string joined(std::vector<int> const& numbers) {
 }
 
 } // namespace
-
-std::string consoleWideTool() {
-    return QUORVEX_FLEET_TOOL;
-}
-
-std::string oneMachineTool() {
-    return QUORVEX_SURVEY_TOOL;
-}
 
 void DifferentialBatch::addGenerated(int firstSeed, int count) {
     QuorvexTest::CommandResult const made = QuorvexTest::runCommand(

@@ -12,11 +12,6 @@
 
 namespace FleetTest {
 
-// The console-wide survey's path in the build tree.
-std::string consoleWideTool();
-// The one-machine survey tool's path in the build tree.
-std::string oneMachineTool();
-
 class DifferentialBatch {
 public:
     DifferentialBatch() = default;
