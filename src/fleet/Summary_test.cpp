@@ -14,6 +14,9 @@ using Fleet::RunFacts;
 using Fleet::Summary;
 using Kind = Quorvex::PYLON::VPD::PartitionOutcomeKind;
 
+// The interpreter that Debian's python3-jsonschema belongs to.
+constexpr char gc_DebianPython[] = "/usr/bin/python3";
+
 PartitionRecord finished(Kind kind, std::string const& code) {
     PartitionRecord record;
     record.partition.set_PartitionID("7");
@@ -154,7 +157,7 @@ TEST(Summary, DocumentIsValidAgainstTheSchema) {
         "for name in sys.argv[2:]:\n"
         "    jsonschema.Draft202012Validator(schema).validate(json.load(open(name)))\n";
     QuorvexTest::CommandResult const result = QuorvexTest::runCommand(
-        {"python3", "-c", check, QuorvexTest::sourceRoot() + "/docs/summary.schema.json", document,
+        {gc_DebianPython, "-c", check, QuorvexTest::sourceRoot() + "/docs/summary.schema.json", document,
          second});
     EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
 }
@@ -170,7 +173,7 @@ TEST(Summary, SchemaCheckRejectsADocumentWithAnUnknownOutcome) {
                               "jsonschema.Draft202012Validator(schema).validate("
                               "json.load(open(sys.argv[2])))\n";
     QuorvexTest::CommandResult const result = QuorvexTest::runCommand(
-        {"python3", "-c", check, QuorvexTest::sourceRoot() + "/docs/summary.schema.json",
+        {gc_DebianPython, "-c", check, QuorvexTest::sourceRoot() + "/docs/summary.schema.json",
          document});
     EXPECT_NE(result.exitStatus, 0);
 }
