@@ -2,6 +2,7 @@
 
 #include "FleetTools.h"
 
+#include <algorithm>
 #include <ctime>
 #include <filesystem>
 #include <stdexcept>
@@ -25,6 +26,10 @@ std::string joined(std::vector<int> const& numbers) {
         text += (text.empty() ? "" : ",") + std::to_string(number);
     }
     return text;
+}
+
+bool contains(std::vector<std::string> const& texts, std::string const& text) {
+    return std::find(texts.begin(), texts.end(), text) != texts.end();
 }
 
 } // namespace
@@ -56,15 +61,21 @@ void DifferentialBatch::addShipped(std::string const& caseName, std::string cons
     _caseFolders.push_back(folder);
 }
 
-QuorvexTest::CommandResult DifferentialBatch::run(std::vector<int> const& jobCounts) {
+QuorvexTest::CommandResult DifferentialBatch::run(std::vector<int> const& jobCounts,
+                                                  std::vector<std::string> const& sandboxOptions) {
     std::vector<std::string> command{"/bin/bash", gc_CaseRunner, oneMachineTool(),
                                      consoleWideTool(), joined(jobCounts)};
     command.insert(command.end(), _caseFolders.begin(), _caseFolders.end());
     _first = static_cast<long>(std::time(nullptr));
-    QuorvexTest::CommandResult result =
-        QuorvexTest::runInSandbox({"--bind", _folder.path() + ":" + _folder.path(), "--vpd",
-                                   _vpd.path(), "--trace", _trace.path()},
-                                  command);
+    std::vector<std::string> options{"--bind", _folder.path() + ":" + _folder.path()};
+    if (!contains(sandboxOptions, "--no-vpd-dir")) {
+        options.insert(options.end(), {"--vpd", _vpd.path()});
+    }
+    if (!contains(sandboxOptions, "--no-trace-dir")) {
+        options.insert(options.end(), {"--trace", _trace.path()});
+    }
+    options.insert(options.end(), sandboxOptions.begin(), sandboxOptions.end());
+    QuorvexTest::CommandResult result = QuorvexTest::runInSandbox(options, command);
     _last = static_cast<long>(std::time(nullptr));
     return result;
 }

@@ -24,8 +24,11 @@ public:
                     std::vector<std::string> const& identities, bool all);
 
     // Runs every case at every job count; the sandbox's exit status (77: no
-    // sandbox could be made) and its output.
-    QuorvexTest::CommandResult run(std::vector<int> const& jobCounts);
+    // sandbox could be made) and its output. The result folders are fresh
+    // ones unless the sandbox options leave them missing ("--no-vpd-dir",
+    // "--no-trace-dir") or make them read-only.
+    QuorvexTest::CommandResult run(std::vector<int> const& jobCounts,
+                                   std::vector<std::string> const& sandboxOptions = {});
     std::vector<DifferentialCase> cases() const;
 
 private:

@@ -8,14 +8,17 @@
 
 #include <gtest/gtest.h>
 
+#include <cctype>
+
 namespace {
 
 using FleetTest::DifferentialBatch;
 
 std::vector<int> const gc_JobCounts{1, 4, 32};
 
-void expectSameAsReference(DifferentialBatch& batch) {
-    QuorvexTest::CommandResult const result = batch.run(gc_JobCounts);
+void expectSameAsReference(DifferentialBatch& batch,
+                           std::vector<std::string> const& sandboxOptions = {}) {
+    QuorvexTest::CommandResult const result = batch.run(gc_JobCounts, sandboxOptions);
     if (result.exitStatus == 77) {
         GTEST_SKIP() << "no private mount namespace for the sandbox: " << result.stderrText;
     }
@@ -40,6 +43,34 @@ TEST(FleetDifferential, ShippedScenariosGiveTheSameResults) {
     batch.addShipped("slow", "slow.scn", {"9119-MHE_21ABCDE"}, false);
     expectSameAsReference(batch);
 }
+
+// Result folders that are missing or read-only: whatever the one-machine
+// tool leaves and prints then, the console-wide survey does too.
+class ResultFolders : public ::testing::TestWithParam<std::string> {};
+
+TEST_P(ResultFolders, GiveTheSameResults) {
+    DifferentialBatch batch;
+    batch.addShipped("demo", "demo.scn", {"9119-MHE_21ABCDE"}, false);
+    batch.addShipped("odd-output", "odd-output.scn", {"9119-MHE_21ABCDE"}, false);
+    expectSameAsReference(batch, {GetParam()});
+}
+
+INSTANTIATE_TEST_SUITE_P(FleetDifferential, ResultFolders,
+                         ::testing::Values("--no-vpd-dir", "--no-trace-dir", "--readonly-vpd",
+                                           "--readonly-trace"),
+                         [](::testing::TestParamInfo<std::string> const& info) {
+                             std::string name;
+                             bool upper = true;
+                             for (char const c : info.param.substr(2)) {
+                                 if (c == '-') {
+                                     upper = true;
+                                 } else {
+                                     name += upper ? static_cast<char>(std::toupper(c)) : c;
+                                     upper = false;
+                                 }
+                             }
+                             return name;
+                         });
 
 // Two hundred generated consoles of two or three machines, in batches of
 // twenty-five seeds that ctest can run side by side.

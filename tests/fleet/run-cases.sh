@@ -28,8 +28,14 @@ shift 3
 readonly vpd=/var/adm/quorvex/VPD trace=/var/adm/quorvex/Trace
 readonly trace_name=quorvexPYLON_VPD_Survey_ClientPartition
 
+# The result folders may be missing or read-only: the runs must cope with it.
 clear_result_folders() {
-    find "$vpd" "$trace" -mindepth 1 -delete
+    local folder
+    for folder in "$vpd" "$trace"; do
+        if [[ -d $folder && -w $folder ]]; then
+            find "$folder" -mindepth 1 -delete
+        fi
+    done
 }
 
 tmp_entries() {
@@ -39,8 +45,8 @@ tmp_entries() {
 keep_results() {
     local out=$1
     mkdir -p "$out/VPD" "$out/Trace"
-    cp -a "$vpd/." "$out/VPD/"
-    cp -a "$trace/." "$out/Trace/"
+    if [[ -d $vpd ]]; then cp -a "$vpd/." "$out/VPD/"; fi
+    if [[ -d $trace ]]; then cp -a "$trace/." "$out/Trace/"; fi
     comm -13 "$out/../kept-in-tmp" <(tmp_entries) > "$out/tmp"
 }
 
