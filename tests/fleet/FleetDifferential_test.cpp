@@ -34,6 +34,8 @@ TEST(FleetDifferential, ShippedScenariosGiveTheSameResults) {
     DifferentialBatch batch;
     batch.addShipped("demo", "demo.scn", {"9119-MHE_21ABCDE"}, false);
     batch.addShipped("empty", "empty.scn", {"9119-MHE_21ABCDE"}, false);
+    batch.addShipped("demo-given-twice", "demo.scn", {"9119-MHE_21ABCDE", "9119-MHE_21ABCDE"},
+                     false);
     batch.addShipped("several-machines-all", "several-machines.scn",
                      {"8286-42A_10XYZ99", "9119-MHE_21ABCDE"}, true);
     batch.addShipped(
