@@ -14,6 +14,7 @@
 #include <map>
 #include <sstream>
 #include <unistd.h>
+#include <unordered_map>
 #include <vector>
 
 namespace report {
@@ -34,8 +35,13 @@ struct DocumentFile {
     std::string name;
     std::string id;
     VpdDocument content;
+    // The content's reason read once: a large console has thousands.
+    std::optional<FailureReason> failure;
     bool used = false;
 };
+
+// A machine's documents by host name, each host's in ID order.
+using DocumentsByHost = std::unordered_map<std::string, std::vector<DocumentFile*>>;
 
 struct StatusLine {
     std::string host;
@@ -161,8 +167,13 @@ private:
         if (owner == nullptr) {
             return;
         }
+        VpdDocument content = parseVpdDocument(readText(path));
+        std::optional<FailureReason> failure;
+        if (content.reason) {
+            failure = parseFailureReason(*content.reason);
+        }
         byMachine[*owner].push_back(
-            {name, stem.substr(owner->size() + 1), parseVpdDocument(readText(path)), false});
+            {name, stem.substr(owner->size() + 1), std::move(content), std::move(failure), false});
         noteTime(path);
     }
 
@@ -183,9 +194,15 @@ private:
     Json machine(std::string const& identity, fs::path const& statusFile,
                  std::vector<DocumentFile>& documents) {
         std::sort(documents.begin(), documents.end(), isBeforeInIdOrder);
+        DocumentsByHost byHost;
+        for (DocumentFile& document : documents) {
+            if (document.content.host) {
+                byHost[*document.content.host].push_back(&document);
+            }
+        }
         Json partitions = Json::array();
         for (StatusLine const& line : readStatusLines(statusFile)) {
-            partitions.push_back(partition(line, documents));
+            partitions.push_back(partition(line, byHost));
         }
         Json counts = countOutcomes(partitions);
         Json entry;
@@ -215,12 +232,12 @@ private:
         return validUtf8(trace.string());
     }
 
-    Json partition(StatusLine const& line, std::vector<DocumentFile>& documents) {
+    Json partition(StatusLine const& line, DocumentsByHost& byHost) {
         std::optional<std::string> outcome = outcomeOfStatusText(line.statusText);
-        DocumentFile* document = matchDocument(line, outcome, documents);
+        DocumentFile* document = matchDocument(line, outcome, byHost);
         std::optional<FailureReason> reason;
-        if (document != nullptr && document->content.reason) {
-            reason = parseFailureReason(*document->content.reason);
+        if (document != nullptr) {
+            reason = document->failure;
         }
         if (!outcome) {
             outcome = reason && reason->action == "getFileFromPartition" ? "fetch_failure"
@@ -260,35 +277,33 @@ private:
     // an inactive partition, which gets no document.
     static DocumentFile* matchDocument(StatusLine const& line,
                                        std::optional<std::string> const& outcome,
-                                       std::vector<DocumentFile>& documents) {
-        if (outcome == "inactive") {
+                                       DocumentsByHost& byHost) {
+        auto const sameHost = byHost.find(line.host);
+        if (outcome == "inactive" || sameHost == byHost.end()) {
             return nullptr;
         }
-        for (DocumentFile& document : documents) {
-            if (document.used || document.content.host != line.host ||
-                !fitsOutcome(document.content, outcome)) {
-                continue;
+        for (DocumentFile* document : sameHost->second) {
+            if (!document->used && fitsOutcome(document->failure, outcome)) {
+                document->used = true;
+                return document;
             }
-            document.used = true;
-            return &document;
         }
         return nullptr;
     }
 
-    static bool fitsOutcome(VpdDocument const& document,
+    static bool fitsOutcome(std::optional<FailureReason> const& failure,
                             std::optional<std::string> const& outcome) {
         if (outcome == "surveyed") {
-            return !document.reason;
+            return !failure;
         }
-        if (!document.reason) {
+        if (!failure) {
             return false;
         }
-        std::optional<std::string> const stoppedBy = parseFailureReason(*document.reason).stoppedBy;
-        bool const bySignal = stoppedBy && *stoppedBy != "time limit";
+        bool const bySignal = failure->stoppedBy && *failure->stoppedBy != "time limit";
         if (outcome == "interrupted") {
             return bySignal;
         }
-        std::string const action = parseFailureReason(*document.reason).action;
+        std::string const& action = failure->action;
         if (outcome == "fetch_failure") {
             return action == "getFileFromPartition" && !bySignal;
         }

@@ -27,31 +27,34 @@ table{border-collapse:collapse;width:100%}
 th,td{padding:4px 8px;border-bottom:1px solid var(--line);text-align:left;vertical-align:top}
 thead th{position:sticky;top:0;background:var(--head);font-weight:600;white-space:nowrap;z-index:1}
 .machines td,.machines th{vertical-align:middle}
+.machines th[scope=row]{white-space:nowrap}
 .machines .bar-cell{width:45%}
 .bar{display:flex;height:16px;border-radius:3px;overflow:hidden;background:#eef1f4;min-width:120px}
 .bar i{display:block;height:100%}
-.bar .s,.key .s{background:var(--s)}.bar .i,.key .i{background:var(--i)}
-.bar .c,.key .c{background:var(--c)}.bar .l,.key .l{background:var(--l)}
-.bar .f,.key .f{background:var(--f)}.bar .t,.key .t{background:var(--t)}
-.bar .x,.key .x{background:var(--x)}
-.key{display:inline-block;width:10px;height:10px;border-radius:2px;margin:0 4px 0 10px}
+.bar .s,.key.s{background:var(--s)}.bar .i,.key.i{background:var(--i)}
+.bar .c,.key.c{background:var(--c)}.bar .l,.key.l{background:var(--l)}
+.bar .f,.key.f{background:var(--f)}.bar .t,.key.t{background:var(--t)}
+.bar .x,.key.x{background:var(--x)}
+.key{display:inline-block;width:10px;height:10px;border-radius:2px;margin:0 4px 0 12px}
+.controls .key{margin-left:4px}
 .legend{color:var(--muted);font-size:13px}
 .code{font-weight:600;text-align:center}
 .code0{color:var(--s)}.code4{color:var(--l)}.code8{color:var(--c)}
 .num{text-align:right;font-variant-numeric:tabular-nums}
-#parts{table-layout:fixed}
-#parts td{overflow-wrap:anywhere}
-#parts col.m{width:13%}#parts col.id{width:5%}#parts col.h{width:12%}#parts col.ip{width:9%}
-#parts col.o{width:9%}#parts col.st{width:17%}#parts col.sec{width:6%}#parts col.d{width:7%}
-#parts col.r{width:22%}
-#parts td:nth-child(2),#parts td:nth-child(7){text-align:right;font-variant-numeric:tabular-nums}
-#parts tbody tr{border-left:4px solid transparent}
-#parts tr.s td:nth-child(5){color:var(--s)}#parts tr.i td:nth-child(5){color:#616161}
-#parts tr.c td:nth-child(5){color:var(--c)}#parts tr.l td:nth-child(5){color:var(--l)}
-#parts tr.f td:nth-child(5){color:var(--f)}#parts tr.t td:nth-child(5){color:#b07800}
-#parts tr.x td:nth-child(5){color:var(--x)}
-#parts td:nth-child(5){font-weight:600}
-#parts tbody tr:target{background:#fff8d6}
+.parts{table-layout:fixed}
+.parts td{overflow-wrap:anywhere}
+.parts col.m{width:13%}.parts col.id{width:5%}.parts col.h{width:13%}.parts col.ip{width:9%}
+.parts col.o{width:10%}.parts col.st{width:16%}.parts col.sec{width:6%}.parts col.d{width:7%}
+.parts col.r{width:21%}
+.parts td:nth-child(2),.parts td:nth-child(7){text-align:right;font-variant-numeric:tabular-nums}
+.parts tr.s td:nth-child(5){color:var(--s)}.parts tr.i td:nth-child(5){color:#616161}
+.parts tr.c td:nth-child(5){color:var(--c)}.parts tr.l td:nth-child(5){color:var(--l)}
+.parts tr.f td:nth-child(5){color:var(--f)}.parts tr.t td:nth-child(5){color:#b07800}
+.parts tr.x td:nth-child(5){color:var(--x)}
+.parts td:nth-child(5){font-weight:600;white-space:nowrap}
+.parts td:empty::after{content:"\2013";color:#b0b8c2}
+.parts th:nth-child(2),.parts th:nth-child(7){text-align:right}
+.parts tbody tr:target{background:#fff8d6}
 details summary{cursor:pointer;color:#0b57a4}
 details pre{margin:4px 0 0;white-space:pre-wrap;font:12px/1.35 ui-monospace,monospace;background:#f6f7f9;
 padding:6px;border-radius:4px}
@@ -65,34 +68,49 @@ thead button{font:inherit;font-weight:600;background:none;border:0;padding:0;cur
 thead th[aria-sort=ascending] button::after{content:" \25B2"}
 thead th[aria-sort=descending] button::after{content:" \25BC"}
 #more{margin:10px 0}
-html.js:not(.live) #parts tbody tr:nth-child(n+501){display:none}
 footer{padding:12px 24px;color:var(--muted);font-size:12px;border-top:1px solid var(--line)}
 )css";
 
-// Sorting and filtering work on arrays read once from the table, and the
-// table shows at most a page of the matching rows at a time: laying out tens
-// of thousands of rows is what makes a large page slow, not sorting them.
+// With script on, the browser keeps the table inside <noscript> as plain
+// text instead of building tens of thousands of rows: the script reads the
+// rows from that text once, sorts and filters arrays, and shows a page of
+// the matching rows at a time in a table of its own. The cells are the
+// page's own escaped markup, so they are shown as they are.
 char const* const pageScript = R"js(
 (function () {
   "use strict";
   var PAGE = 500;
-  var table = document.getElementById("parts");
-  var body = table.tBodies[0];
-  var rows = Array.prototype.slice.call(body.rows);
+  var source = document.getElementById("rows");
+  var live = document.getElementById("live");
   var form = document.getElementById("filters");
   var search = document.getElementById("q");
   var machineChoice = document.getElementById("machine");
   var countText = document.getElementById("count");
   var more = document.getElementById("more");
-  var outcomeOf = rows.map(function (row) { return row.className; });
+
+  var markup = source.textContent;
+  var bodyStart = markup.indexOf("<tbody>") + "<tbody>".length;
+  var bodyEnd = markup.lastIndexOf("</tbody>");
+  var head = markup.slice(markup.indexOf("<table"), bodyStart);
+  var rowTexts = markup.slice(bodyStart, bodyEnd).split("</tr>");
+  rowTexts.pop();
+  var cells = rowTexts.map(function (row) { return row.split("<td>"); });
+  var outcomeOf = cells.map(function (row) { return /class=(\w+)/.exec(row[0])[1]; });
   var columnKeys = [];
   var searchTexts = null;
-  var machineTexts = null;
-  var order = rows.map(function (row, index) { return index; });
+  var order = cells.map(function (row, index) { return index; });
   var shown = PAGE;
 
-  function cellTexts(column) {
-    return rows.map(function (row) { return row.cells[column].textContent; });
+  live.innerHTML = head + "</tbody></table>";
+  var table = live.firstChild;
+  table.id = "parts";
+  var body = table.tBodies[0];
+  source.parentNode.removeChild(source);
+
+  var entities = { "&amp;": "&", "&lt;": "<", "&gt;": ">", "&quot;": "\"", "&#39;": "'" };
+  function textOf(cell) {
+    return cell.replace(/<summary>[^<]*<\/summary>/g, "").replace(/<[^>]*>/g, "")
+      .replace(/&(?:amp|lt|gt|quot|#39);/g, function (entity) { return entities[entity]; });
   }
   function numberOrNull(text) {
     return text !== "" && isFinite(text) ? Number(text) : null;
@@ -106,8 +124,8 @@ char const* const pageScript = R"js(
   }
   function keysOf(column, type) {
     if (!columnKeys[column]) {
-      var texts = cellTexts(column);
-      columnKeys[column] = texts.map(function (text) {
+      columnKeys[column] = cells.map(function (row) {
+        var text = textOf(row[column + 1]).trim();
         if (type === "number") { return numberOrNull(text); }
         if (type === "ip") { return ipKey(text); }
         return text.toLowerCase();
@@ -128,7 +146,7 @@ char const* const pageScript = R"js(
     var ascending = header.getAttribute("aria-sort") !== "ascending";
     var keys = keysOf(column, header.getAttribute("data-type"));
     var direction = ascending ? 1 : -1;
-    order = rows.map(function (row, index) { return index; });
+    order = cells.map(function (row, index) { return index; });
     order.sort(function (a, b) {
       var ka = keys[a], kb = keys[b];
       // Empty cells last, whichever way the column runs.
@@ -154,32 +172,31 @@ char const* const pageScript = R"js(
     var chosen = chosenOutcomes();
     var query = search.value.trim().toLowerCase();
     var machine = machineChoice.value;
+    var machines = machine === "" ? null : keysOf(0, "machine");
     if (query !== "" && !searchTexts) {
-      searchTexts = rows.map(function (row) { return row.textContent.toLowerCase(); });
-    }
-    if (machine !== "" && !machineTexts) {
-      machineTexts = cellTexts(0);
+      searchTexts = cells.map(function (row) {
+        return row.slice(1).map(textOf).join("\n").toLowerCase();
+      });
     }
     return function (index) {
       return chosen[outcomeOf[index]] &&
-        (machine === "" || machineTexts[index] === machine) &&
+        (machines === null || machines[index] === machine.toLowerCase()) &&
         (query === "" || searchTexts[index].indexOf(query) !== -1);
     };
   }
   function render() {
     var matches = matcher();
-    var fragment = document.createDocumentFragment();
+    var page = [];
     var matched = 0;
     for (var k = 0; k < order.length; k++) {
       if (!matches(order[k])) { continue; }
-      if (matched < shown) { fragment.appendChild(rows[order[k]]); }
+      if (matched < shown) { page.push(rowTexts[order[k]]); }
       matched++;
     }
-    body.textContent = "";
-    body.appendChild(fragment);
+    body.innerHTML = page.join("</tr>") + (page.length ? "</tr>" : "");
     var listed = Math.min(matched, shown);
     countText.textContent = (listed < matched ? "showing " + listed + " of " : "") +
-      matched + " of " + rows.length + " partitions";
+      matched + " of " + cells.length + " partitions";
     more.hidden = listed >= matched;
   }
   var pending = null;
@@ -218,7 +235,6 @@ char const* const pageScript = R"js(
   });
   form.hidden = false;
   render();
-  document.documentElement.className += " live";
 }());
 )js";
 

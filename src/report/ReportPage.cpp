@@ -98,7 +98,7 @@ void appendHead(std::string& page, Json const& summary) {
             "<meta name=\"viewport\" content=\"width=device-width, initial-scale=1\">\n"
             "<title>Partition survey of " +
             shown(member(summary, "console_host")) + ", " + shown(member(summary, "started")) +
-            "</title>\n<script>document.documentElement.className = \"js\";</script>\n<style>";
+            "</title>\n<style>";
     page += pageStyle;
     page += "</style></head>\n<body>\n";
 }
@@ -214,13 +214,15 @@ void appendPartitionRow(std::string& page, Json const& partition, std::string co
     if (reason.is_string()) {
         page += "<details><summary>reason</summary><pre>" + shown(reason) + "</pre></details>";
     }
-    page += "\n";
+    // Closed, so that the line end is not part of the last cell.
+    page += "</tr>\n";
 }
 
 void appendPartitions(std::string& page, Json const& machines, std::string const& documentFolder) {
     page += "<section id=\"partitions\"><h2>Partitions</h2>\n";
     appendFilters(page, machines);
-    page += "<table id=\"parts\"><colgroup><col class=\"m\"><col class=\"id\"><col class=\"h\">"
+    page += "<div id=\"live\"></div>\n<noscript id=\"rows\"><table class=\"parts\"><colgroup><col "
+            "class=\"m\"><col class=\"id\"><col class=\"h\">"
             "<col class=\"ip\"><col class=\"o\"><col class=\"st\"><col class=\"sec\">"
             "<col class=\"d\"><col class=\"r\"></colgroup>\n<thead><tr><th>Machine"
             "<th data-type=\"number\">ID<th>Host<th data-type=\"ip\">IP<th>Outcome<th>Status"
@@ -235,7 +237,8 @@ void appendPartitions(std::string& page, Json const& machines, std::string const
         }
         ++index;
     }
-    page += "</tbody></table>\n<p id=\"more\" hidden><button type=\"button\">Show more</button>"
+    page += "</tbody></table></noscript>\n<p id=\"more\" hidden><button type=\"button\">Show "
+            "more</button>"
             "</p>\n</section>\n";
 }
 

@@ -102,6 +102,17 @@ TEST(ReportPage, OneRowPerPartitionWithOutcomeClassAndMachineAnchorOnTheFirst) {
     EXPECT_NE(std::string::npos, html.find("<a href=\"#m0\" data-machine=\"1-A_S\">1-A_S</a>"));
 }
 
+TEST(ReportPage, FullTableIsInsideNoscriptForTheScriptToRead) {
+    std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
+    std::size_t const start = html.find("<noscript id=\"rows\"><table class=\"parts\">");
+    std::size_t const row = html.find("<tr id=m0 class=s>");
+    std::size_t const end = html.find("</tbody></table></noscript>");
+    EXPECT_LT(start, row);
+    EXPECT_LT(row, end);
+    EXPECT_NE(std::string::npos, end);
+    EXPECT_LT(html.find("<div id=\"live\"></div>"), start);
+}
+
 TEST(ReportPage, DocumentsLinkRelativeToThePage) {
     std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
     EXPECT_NE(
