@@ -1,9 +1,8 @@
 #include "LeftProcesses.h"
 
 #include <algorithm>
+#include <fcntl.h>
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <sstream>
 #include <unistd.h>
 
@@ -11,11 +10,27 @@ namespace FleetTest {
 
 namespace {
 
-// The NUL-separated entries of /proc/<pid>/environ or cmdline; empty when the
+// The bytes of a /proc file; what could be read when the process ends while
+// it is read (read() then fails, which a file stream would throw for).
+std::string readProcFile(std::filesystem::path const& file) {
+    std::string text;
+    int const descriptor = ::open(file.c_str(), O_RDONLY);
+    if (descriptor < 0) {
+        return text;
+    }
+    char buffer[4096];
+    ssize_t count = 0;
+    while ((count = ::read(descriptor, buffer, sizeof buffer)) > 0) {
+        text.append(buffer, static_cast<std::size_t>(count));
+    }
+    ::close(descriptor);
+    return text;
+}
+
+// The NUL-separated entries of /proc/<pid>/environ or cmdline; none when the
 // process is gone or not readable.
 std::vector<std::string> entriesOf(std::filesystem::path const& file) {
-    std::ifstream in(file, std::ios::binary);
-    std::string const text((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
+    std::string const text = readProcFile(file);
     std::vector<std::string> entries;
     std::istringstream stream(text);
     std::string entry;

@@ -7,7 +7,7 @@ namespace FleetTest {
 
 namespace {
 
-constexpr std::size_t gc_ShownBytes = 40;
+constexpr std::size_t gc_ShownBytes = 120;
 
 std::string escaped(std::string const& text) {
     std::string shown;
