@@ -43,7 +43,9 @@ void restoreDefaultSignals() {
 } // namespace
 
 ChildProcess::ChildProcess(Body const& body) {
+    // An anonymous mapping takes -1 as its descriptor.
     void* memory =
+        // cppcheck-suppress invalidFunctionArg
         mmap(nullptr, sizeof(Slot), PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0);
     if (memory == MAP_FAILED) {
         return;
@@ -142,8 +144,8 @@ bool ChildProcess::reap() {
         return true;
     }
     int status = 0;
-    pid_t const result = waitpid(_pid, &status, WNOHANG);
-    if (result == _pid || (result < 0 && errno == ECHILD)) {
+    pid_t const ended = waitpid(_pid, &status, WNOHANG);
+    if (ended == _pid || (ended < 0 && errno == ECHILD)) {
         _reaped = true;
     }
     return _reaped;

@@ -2,6 +2,7 @@
 
 #include <CLI/CLI.hpp>
 
+#include <algorithm>
 #include <iostream>
 #include <set>
 
@@ -48,10 +49,9 @@ CommandLine::Parsed CommandLine::parse(int argc, char const* const* argv) {
         if (!options.all && options.identities.empty()) {
             throw CLI::RequiredError("IDENTITY or --all");
         }
-        for (auto const& identity : options.identities) {
-            if (identity.empty()) {
-                throw CLI::ValidationError("IDENTITY", "an identity must not be empty");
-            }
+        if (std::any_of(options.identities.begin(), options.identities.end(),
+                        [](std::string const& identity) { return identity.empty(); })) {
+            throw CLI::ValidationError("IDENTITY", "an identity must not be empty");
         }
     } catch (CLI::CallForHelp const&) {
         std::cout << app.help();

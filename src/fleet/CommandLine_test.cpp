@@ -2,7 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <iostream>
+#include <iterator>
 #include <sstream>
 
 namespace {
@@ -19,9 +21,9 @@ struct ParseRun {
 ParseRun parse(std::vector<std::string> arguments) {
     arguments.insert(arguments.begin(), "quorvex-survey");
     std::vector<char const*> argv;
-    for (auto const& argument : arguments) {
-        argv.push_back(argument.c_str());
-    }
+    argv.reserve(arguments.size());
+    std::transform(arguments.begin(), arguments.end(), std::back_inserter(argv),
+                   [](std::string const& argument) { return argument.c_str(); });
     std::ostringstream out;
     std::ostringstream err;
     std::streambuf* const oldOut = std::cout.rdbuf(out.rdbuf());

@@ -2,7 +2,9 @@
 
 #include "survey/calculate_ReturnCode.h"
 
+#include <algorithm>
 #include <iostream>
+#include <iterator>
 
 namespace Fleet {
 
@@ -36,9 +38,9 @@ std::string MachineReport::statusText(MachineRecord const& machine) {
 
 std::vector<std::string> MachineReport::returnCodes(MachineRecord const& machine) {
     std::vector<std::string> codes;
-    for (auto const& record : machine.partitions) {
-        codes.push_back(record.outcome.returnCode);
-    }
+    codes.reserve(machine.partitions.size());
+    std::transform(machine.partitions.begin(), machine.partitions.end(), std::back_inserter(codes),
+                   [](PartitionRecord const& record) { return record.outcome.returnCode; });
     return codes;
 }
 

@@ -1,15 +1,18 @@
 #include "fleet/ProcessTree.h"
 
-#include <dirent.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
+#include <chrono>
 #include <csignal>
 #include <ctime>
+#include <filesystem>
 #include <fstream>
 #include <iterator>
 #include <sstream>
+#include <thread>
 
 namespace Fleet {
 
@@ -17,7 +20,7 @@ namespace {
 
 // A tree of processes that keeps forking is still killed within this many rounds.
 constexpr int gc_KillRounds = 1000;
-constexpr useconds_t gc_PauseBetweenRounds = 1000;
+constexpr auto gc_PauseBetweenRounds = std::chrono::milliseconds(1);
 
 std::string readWholeFile(std::string const& path) {
     std::ifstream file(path, std::ios::binary);
@@ -30,16 +33,11 @@ std::string procPath(pid_t pid, char const* name) {
 
 std::vector<std::string> threadsOf(pid_t pid) {
     std::vector<std::string> threads;
-    DIR* directory = opendir(procPath(pid, "task").c_str());
-    if (directory == nullptr) {
-        return threads;
+    std::error_code error;
+    for (std::filesystem::directory_iterator entry(procPath(pid, "task"), error), end;
+         !error && entry != end; entry.increment(error)) {
+        threads.push_back(entry->path().filename().string());
     }
-    while (dirent const* entry = readdir(directory)) {
-        if (entry->d_name[0] != '.') {
-            threads.emplace_back(entry->d_name);
-        }
-    }
-    closedir(directory);
     return threads;
 }
 
@@ -66,20 +64,15 @@ std::vector<pid_t> ProcessTree::childrenOf(pid_t pid) {
 std::vector<pid_t> ProcessTree::descendantsOf(pid_t pid) {
     std::vector<pid_t> found = childrenOf(pid);
     for (std::size_t i = 0; i < found.size(); ++i) {
-        for (pid_t grandchild : childrenOf(found[i])) {
-            found.push_back(grandchild);
-        }
+        std::vector<pid_t> const grandchildren = childrenOf(found[i]);
+        found.insert(found.end(), grandchildren.begin(), grandchildren.end());
     }
     return found;
 }
 
 std::string ProcessTree::commandLineOf(pid_t pid) {
     std::string text = readWholeFile(procPath(pid, "cmdline"));
-    for (char& c : text) {
-        if (c == '\0') {
-            c = ' ';
-        }
-    }
+    std::replace(text.begin(), text.end(), '\0', ' ');
     return text;
 }
 
@@ -152,7 +145,7 @@ std::size_t ProcessTree::killDescendants(pid_t root) {
         if (!anyAlive) {
             break;
         }
-        usleep(gc_PauseBetweenRounds);
+        std::this_thread::sleep_for(gc_PauseBetweenRounds);
     }
     return signalsSent;
 }

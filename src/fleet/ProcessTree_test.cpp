@@ -11,6 +11,7 @@
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
+#include <iterator>
 #include <thread>
 
 namespace {
@@ -27,12 +28,10 @@ std::string runSleepingTree() {
 }
 
 std::vector<pid_t> liveDescendants(pid_t root) {
+    std::vector<pid_t> const all = ProcessTree::descendantsOf(root);
     std::vector<pid_t> live;
-    for (pid_t pid : ProcessTree::descendantsOf(root)) {
-        if (!ProcessTree::hasEnded(pid)) {
-            live.push_back(pid);
-        }
-    }
+    std::copy_if(all.begin(), all.end(), std::back_inserter(live),
+                 [](pid_t pid) { return !ProcessTree::hasEnded(pid); });
     return live;
 }
 

@@ -35,6 +35,7 @@ TEST(Scheduler, NeverMoreThanJobsRunAtOnce) {
     scheduler.takeStartable();
     scheduler.finish(listing(0));
     std::vector<std::string> ids;
+    ids.reserve(10);
     for (int i = 0; i < 10; ++i) {
         ids.push_back(std::to_string(i));
     }

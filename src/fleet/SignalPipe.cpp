@@ -29,7 +29,7 @@ int SignalPipe::readDescriptor() {
 
 void SignalPipe::_handle(int signalNumber) {
     int const savedErrno = errno;
-    unsigned char const byte = static_cast<unsigned char>(signalNumber);
+    auto const byte = static_cast<unsigned char>(signalNumber);
     // A full pipe already holds a signal for the loop; this one adds nothing.
     ssize_t const written = write(ms_writeEnd, &byte, 1);
     static_cast<void>(written);

@@ -4,7 +4,9 @@
 #include "fleet/RunFiles.h"
 #include "survey/calculate_ReturnCode.h"
 
+#include <algorithm>
 #include <ctime>
+#include <iterator>
 
 namespace Fleet {
 
@@ -95,9 +97,8 @@ nlohmann::json Summary::_machine(MachineRecord const& machine) {
     nlohmann::json counts = emptyCounts();
     _count(counts, machine);
     nlohmann::json partitions = nlohmann::json::array();
-    for (auto const& record : machine.partitions) {
-        partitions.push_back(_partition(record));
-    }
+    std::transform(machine.partitions.begin(), machine.partitions.end(),
+                   std::back_inserter(partitions), &Summary::_partition);
     return {{"identity", machine.identity},
             {"return_code", get_OverallCode(MachineReport::returnCodes(machine))},
             {"status_file", RunFiles::statusFile(machine.identity)},
@@ -108,9 +109,8 @@ nlohmann::json Summary::_machine(MachineRecord const& machine) {
 
 nlohmann::json Summary::build(RunFacts const& facts, std::vector<MachineRecord> const& machines) {
     nlohmann::json machineList = nlohmann::json::array();
-    for (auto const& machine : machines) {
-        machineList.push_back(_machine(machine));
-    }
+    std::transform(machines.begin(), machines.end(), std::back_inserter(machineList),
+                   &Summary::_machine);
     return {
         {"schema_version", 1},
         {"tool", "quorvex-survey"},
@@ -139,9 +139,10 @@ std::string Summary::text(nlohmann::json const& summary) {
 std::string Summary::localTime(std::time_t time) {
     std::tm local{};
     localtime_r(&time, &local);
-    char text[64];
-    std::size_t const length = std::strftime(text, sizeof text, "%Y-%m-%dT%H:%M:%S%z", &local);
-    std::string result(text, length);
+    char formatted[64];
+    std::size_t const length =
+        std::strftime(formatted, sizeof formatted, "%Y-%m-%dT%H:%M:%S%z", &local);
+    std::string result(formatted, length);
     // "+0100" becomes "+01:00".
     if (result.size() >= 5) {
         result.insert(result.size() - 2, ":");

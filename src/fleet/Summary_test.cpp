@@ -157,8 +157,8 @@ TEST(Summary, DocumentIsValidAgainstTheSchema) {
         "for name in sys.argv[2:]:\n"
         "    jsonschema.Draft202012Validator(schema).validate(json.load(open(name)))\n";
     QuorvexTest::CommandResult const result = QuorvexTest::runCommand(
-        {gc_DebianPython, "-c", check, QuorvexTest::sourceRoot() + "/docs/summary.schema.json", document,
-         second});
+        {gc_DebianPython, "-c", check, QuorvexTest::sourceRoot() + "/docs/summary.schema.json",
+         document, second});
     EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
 }
 
