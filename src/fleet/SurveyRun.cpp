@@ -93,9 +93,7 @@ int SurveyRun::run() {
         _markUnfinished();
     }
     _reportReadyMachines(true);
-    if (_showProgress) {
-        Progress::erase();
-    }
+    _eraseProgress();
     return _signal != 0 ? 128 + _signal : std::atoi(overallCode().c_str());
 }
 
@@ -305,10 +303,10 @@ void SurveyRun::_reportMachine(std::size_t index) {
         std::remove(pieces.front().c_str());
         return;
     }
-    if (_showProgress) {
-        Progress::erase();
-    }
+    _eraseProgress();
     MachineReport::print(machine);
+    // The block ends with the code digit and no line end.
+    _stderrLineOpen = true;
     RunFiles::writeAtomically(RunFiles::statusFile(machine.identity),
                               MachineReport::statusText(machine));
     RunFiles::joinPieces(pieces, RunFiles::traceFile(machine.identity));
@@ -319,7 +317,9 @@ double SurveyRun::_secondsSince(Clock::time_point start) const {
 }
 
 void SurveyRun::_drawProgress() {
-    if (!_showProgress || Clock::now() - _lastDraw < gc_ProgressInterval) {
+    // Once every machine is reported nothing is left to show.
+    if (!_showProgress || _reported == _machines.size() ||
+        Clock::now() - _lastDraw < gc_ProgressInterval) {
         return;
     }
     _lastDraw = Clock::now();
@@ -347,7 +347,20 @@ void SurveyRun::_drawProgress() {
     }
     figures.elapsedSeconds = _secondsSince(_start);
     figures.leftSeconds = Progress::estimateLeft(figures);
+    if (_stderrLineOpen) {
+        // The progress line goes below the last output line, never over it.
+        Progress::startLine();
+        _stderrLineOpen = false;
+    }
     Progress::draw(Progress::format(figures));
+    _progressShown = true;
+}
+
+void SurveyRun::_eraseProgress() {
+    if (_progressShown) {
+        Progress::erase();
+        _progressShown = false;
+    }
 }
 
 } // namespace Fleet

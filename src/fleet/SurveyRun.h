@@ -56,6 +56,7 @@ private:
     void _reportReadyMachines(bool runOver);
     void _reportMachine(std::size_t index);
     void _drawProgress();
+    void _eraseProgress();
     PartitionRecord& _record(Scheduler::Unit const& unit);
     double _secondsSince(Clock::time_point start) const;
 
@@ -66,6 +67,10 @@ private:
     std::size_t _reported = 0;
     int _signal = 0;
     bool _showProgress = false;
+    // A progress line is on the terminal now.
+    bool _progressShown = false;
+    // Standard error's last output line has no line end yet.
+    bool _stderrLineOpen = false;
     Clock::time_point _start;
     Clock::time_point _lastDraw;
 };
