@@ -1,5 +1,7 @@
 #include "report/FailureReason.h"
 
+#include "report/TextChecks.h"
+
 #include <regex>
 
 namespace report {
@@ -8,10 +10,6 @@ namespace {
 
 constexpr char clientRunReason[] = "Partition not surveyed, reason: \n";
 constexpr char fetchReason[] = "Unable to get File From Partition : \n";
-
-bool startsWith(std::string const& text, std::string const& prefix) {
-    return text.compare(0, prefix.size(), prefix) == 0;
-}
 
 std::optional<long long> codeOnLine(std::string const& reason, std::regex const& line) {
     std::smatch match;

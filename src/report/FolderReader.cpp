@@ -4,8 +4,10 @@
 #include "report/LocalTime.h"
 #include "report/StatusText.h"
 #include "report/SummaryTotals.h"
+#include "report/TextChecks.h"
 #include "report/TextSafety.h"
 #include "report/VpdDocument.h"
+#include "survey/Survey_Files.h"
 
 #include <algorithm>
 #include <chrono>
@@ -24,12 +26,24 @@ using Json = nlohmann::ordered_json;
 
 namespace {
 
-constexpr char filePrefix[] = "quorvexPYLON_VPD_Survey_ClientPartition_";
 constexpr char statusSuffix[] = ".status";
 constexpr char documentSuffix[] = ".VPD.xml";
 constexpr char noPartitionsLine[] = "No ACTIVE Partition Found.";
 constexpr char statusSeparator[] = "] - VPD Survey - ";
 constexpr char documentFolder[] = "VPD/";
+
+// The stem of every file name the survey writes, with the "_" before the
+// machine's identity.
+std::string const& filePrefix() {
+    static std::string const prefix = std::string(Quorvex::PYLON::VPD::gc_ProgramName) + "_";
+    return prefix;
+}
+
+// name without prefix and suffix.
+std::string middleOf(std::string const& name, std::string const& prefix,
+                     std::string const& suffix) {
+    return name.substr(prefix.size(), name.size() - prefix.size() - suffix.size());
+}
 
 struct DocumentFile {
     std::string name;
@@ -48,15 +62,6 @@ struct StatusLine {
     std::string ip;
     std::string statusText;
 };
-
-bool endsWith(std::string const& text, std::string const& suffix) {
-    return text.size() >= suffix.size() &&
-           text.compare(text.size() - suffix.size(), suffix.size(), suffix) == 0;
-}
-
-bool startsWith(std::string const& text, std::string const& prefix) {
-    return text.compare(0, prefix.size(), prefix) == 0;
-}
 
 std::string readText(fs::path const& path) {
     std::ifstream file(path, std::ios::binary);
@@ -98,9 +103,7 @@ std::vector<StatusLine> readStatusLines(fs::path const& path) {
 // Numeric IDs in numeric order, then the others in text order.
 bool isBeforeInIdOrder(DocumentFile const& a, DocumentFile const& b) {
     auto const key = [](std::string const& id) {
-        bool const numeric =
-            !id.empty() && id.size() < 19 &&
-            std::all_of(id.begin(), id.end(), [](char c) { return c >= '0' && c <= '9'; });
+        bool const numeric = id.size() < 19 && isDigits(id);
         return std::make_tuple(!numeric, numeric ? std::stoll(id) : 0LL, id);
     };
     return key(a.id) < key(b.id);
@@ -135,13 +138,11 @@ private:
         for (fs::directory_iterator entry(_folder, error), end; !error && entry != end;
              entry.increment(error)) {
             std::string const name = entry->path().filename().string();
-            if (!startsWith(name, filePrefix) || !entry->is_regular_file(error)) {
+            if (!startsWith(name, filePrefix()) || !entry->is_regular_file(error)) {
                 continue;
             }
             if (endsWith(name, statusSuffix)) {
-                std::string const identity =
-                    name.substr(sizeof filePrefix - 1,
-                                name.size() - (sizeof filePrefix - 1) - (sizeof statusSuffix - 1));
+                std::string const identity = middleOf(name, filePrefix(), statusSuffix);
                 statusFiles.emplace(identity, entry->path());
             } else if (endsWith(name, documentSuffix)) {
                 documents.push_back(entry->path());
@@ -154,9 +155,7 @@ private:
     void assignDocument(fs::path const& path, std::map<std::string, fs::path> const& statusFiles,
                         std::map<std::string, std::vector<DocumentFile>>& byMachine) {
         std::string const name = path.filename().string();
-        std::string const stem =
-            name.substr(sizeof filePrefix - 1,
-                        name.size() - (sizeof filePrefix - 1) - (sizeof documentSuffix - 1));
+        std::string const stem = middleOf(name, filePrefix(), documentSuffix);
         std::string const* owner = nullptr;
         for (auto const& entry : statusFiles) {
             if (startsWith(stem, entry.first + "-") &&
@@ -223,8 +222,7 @@ private:
         if (!vpd.has_filename()) {
             vpd = vpd.parent_path();
         }
-        fs::path const trace =
-            vpd.parent_path() / "Trace" / (std::string(filePrefix) + identity + ".Trace");
+        fs::path const trace = vpd.parent_path() / "Trace" / (filePrefix() + identity + ".Trace");
         std::error_code error;
         if (!fs::is_regular_file(trace, error)) {
             return nullptr;

@@ -5,7 +5,7 @@
 namespace report {
 
 std::string localTimeText(long long secondsSinceEpoch) {
-    std::time_t const time = static_cast<std::time_t>(secondsSinceEpoch);
+    auto const time = static_cast<std::time_t>(secondsSinceEpoch);
     std::tm local{};
     if (localtime_r(&time, &local) == nullptr) {
         return "";

@@ -79,7 +79,7 @@ footer{padding:12px 24px;color:var(--muted);font-size:12px;border-top:1px solid 
 char const* const pageScript = R"js(
 (function () {
   "use strict";
-  var PAGE = 500;
+  var PAGE = 200;
   var source = document.getElementById("rows");
   var live = document.getElementById("live");
   var form = document.getElementById("filters");
@@ -224,7 +224,7 @@ char const* const pageScript = R"js(
   form.addEventListener("submit", function (event) { event.preventDefault(); });
   search.addEventListener("input", renderSoon);
   more.querySelector("button").addEventListener("click", function () {
-    shown += PAGE * 10;
+    shown += PAGE * 5;
     render();
   });
   Array.prototype.forEach.call(document.querySelectorAll("a[data-machine]"), function (link) {

@@ -159,13 +159,22 @@ void appendMachines(std::string& page, Json const& machines) {
         std::string const identity = shown(member(machine, "identity"));
         std::string const code = shown(member(machine, "return_code"));
         bool const hasRows = !member(machine, "partitions").empty();
-        page += "<tr><th scope=\"row\">" +
-                (hasRows ? "<a href=\"#m" + std::to_string(index) + "\" data-machine=\"" +
-                               identity + "\">" + identity + "</a>"
-                         : identity) +
-                "<td class=\"code code" + code + "\">" + code + "<td class=\"num\">" +
-                std::to_string(countOf(counts, "partitions")) + "<td class=\"bar-cell\">" +
-                barOf(counts) + "\n";
+        page += R"(<tr><th scope="row">)";
+        if (hasRows) {
+            page += R"(<a href="#m)" + std::to_string(index) + R"(" data-machine=")";
+            page += identity;
+            page += R"(">)";
+            page += identity;
+            page += "</a>";
+        } else {
+            page += identity;
+        }
+        page += R"(<td class="code code)";
+        page += code;
+        page += R"(">)";
+        page += code;
+        page += R"(<td class="num">)" + std::to_string(countOf(counts, "partitions")) +
+                R"(<td class="bar-cell">)" + barOf(counts) + "\n";
         ++index;
     }
     page += "</tbody></table>\n<p class=\"legend\">";
@@ -178,14 +187,18 @@ void appendMachines(std::string& page, Json const& machines) {
 void appendFilters(std::string& page, Json const& machines) {
     page += "<form id=\"filters\" class=\"controls\" hidden>\n";
     for (OutcomeStyle const& style : outcomeStyles()) {
-        page += "<label><input type=\"checkbox\" name=\"o\" value=\"" +
-                std::string(style.cssClass) + "\" checked><span class=\"key " + style.cssClass +
-                "\"></span>" + style.label + "</label>\n";
+        page += R"(<label><input type="checkbox" name="o" value=")" + std::string(style.cssClass) +
+                R"(" checked><span class="key )" + style.cssClass + R"("></span>)" + style.label +
+                "</label>\n";
     }
-    page += "<label>Machine <select id=\"machine\"><option value=\"\">all</option>";
+    page += R"(<label>Machine <select id="machine"><option value="">all</option>)";
     for (Json const& machine : machines) {
         std::string const identity = shown(member(machine, "identity"));
-        page += "<option value=\"" + identity + "\">" + identity + "</option>";
+        page += R"(<option value=")";
+        page += identity;
+        page += R"(">)";
+        page += identity;
+        page += "</option>";
     }
     page += "</select></label>\n<label>Text <input type=\"search\" id=\"q\" "
             "placeholder=\"host, IP, status, reason…\"></label>\n<span id=\"count\"></span>\n"
@@ -253,7 +266,8 @@ void appendFooter(std::string& page, Json const& summary) {
 
 std::size_t expectedSize(Json const& summary) {
     constexpr std::size_t bytesPerRow = 260;
-    return 64 * 1024 +
+    constexpr std::size_t headAndMachines = std::size_t{64} * 1024;
+    return headAndMachines +
            bytesPerRow * static_cast<std::size_t>(countOf(member(summary, "totals"), "partitions"));
 }
 

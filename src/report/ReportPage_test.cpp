@@ -104,7 +104,7 @@ TEST(ReportPage, OneRowPerPartitionWithOutcomeClassAndMachineAnchorOnTheFirst) {
 
 TEST(ReportPage, FullTableIsInsideNoscriptForTheScriptToRead) {
     std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
-    std::size_t const start = html.find("<noscript id=\"rows\"><table class=\"parts\">");
+    std::size_t const start = html.find(R"(<noscript id="rows"><table class="parts">)");
     std::size_t const row = html.find("<tr id=m0 class=s>");
     std::size_t const end = html.find("</tbody></table></noscript>");
     EXPECT_LT(start, row);

@@ -1,7 +1,8 @@
 #include "report/StatusText.h"
 
+#include "report/TextChecks.h"
+
 #include <algorithm>
-#include <cctype>
 
 namespace report {
 
@@ -15,16 +16,6 @@ constexpr char clientFailedPrefix[] = "Partition Failed, RcCmd = ";
 constexpr char fetchFailedSeed[] = "get result Failed, rc = ";
 // The code is an unsigned 32-bit number: at most ten digits.
 constexpr std::size_t longestCode = 10;
-
-bool startsWith(std::string const& text, std::string const& prefix) {
-    return text.compare(0, prefix.size(), prefix) == 0;
-}
-
-bool isDigits(std::string const& text) {
-    return !text.empty() && std::all_of(text.begin(), text.end(), [](char c) {
-        return std::isdigit(static_cast<unsigned char>(c)) != 0;
-    });
-}
 
 bool isCodeAfter(std::string const& text, std::string const& prefix) {
     return startsWith(text, prefix) && isDigits(text.substr(prefix.size()));
