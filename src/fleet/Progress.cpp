@@ -1,5 +1,8 @@
 #include "fleet/Progress.h"
 
+#include <sys/ioctl.h>
+#include <unistd.h>
+
 #include <cmath>
 #include <cstdio>
 #include <iostream>
@@ -44,8 +47,17 @@ std::string Progress::format(ProgressFigures const& figures) {
     return line;
 }
 
+std::string Progress::fitToWidth(std::string const& line, std::size_t columns) {
+    if (columns == 0 || line.size() < columns) {
+        return line;
+    }
+    return line.substr(0, columns - 1);
+}
+
 void Progress::draw(std::string const& line) {
-    std::cerr << gc_EraseLine << line << std::flush;
+    winsize size{};
+    std::size_t const columns = ioctl(STDERR_FILENO, TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
+    std::cerr << gc_EraseLine << fitToWidth(line, columns) << std::flush;
 }
 
 void Progress::erase() {

@@ -37,7 +37,12 @@ public:
     // "HH:MM:SS"
     static std::string clock(double seconds);
 
-    // Redraws the line on standard error ("\r", the line, erase to its end).
+    // The line cut to fit a terminal of this many columns, one column left
+    // free: a line that wrapped could not be erased with one "\r".
+    static std::string fitToWidth(std::string const& line, std::size_t columns);
+
+    // Redraws the line on standard error ("\r", the line, erase to its end),
+    // cut to the terminal's width.
     static void draw(std::string const& line);
     // Takes the line away, leaving the cursor at the start of the line.
     static void erase();

@@ -37,6 +37,19 @@ TEST(Progress, WithoutEstimateOrRunningPartitionTheirPlacesSaySo) {
               "left");
 }
 
+TEST(Progress, LineIsCutToLeaveTheTerminalsLastColumnFree) {
+    std::string const line = Progress::format(exampleFigures());
+    EXPECT_EQ(Progress::fitToWidth(line, 80), line.substr(0, 79));
+    EXPECT_EQ(Progress::fitToWidth("abc", 4), "abc");
+    EXPECT_EQ(Progress::fitToWidth("abcd", 4), "abc");
+    EXPECT_EQ(Progress::fitToWidth("abcd", 1), "");
+}
+
+TEST(Progress, LineIsKeptWholeWhenTheWidthIsUnknown) {
+    std::string const line = Progress::format(exampleFigures());
+    EXPECT_EQ(Progress::fitToWidth(line, 0), line);
+}
+
 TEST(Progress, ClockCountsHoursBeyondADay) {
     EXPECT_EQ(Progress::clock(0), "00:00:00");
     EXPECT_EQ(Progress::clock(3661.5), "01:01:01");
