@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <ctime>
 #include <filesystem>
+#include <iterator>
 #include <stdexcept>
 
 namespace FleetTest {
@@ -82,9 +83,10 @@ QuorvexTest::CommandResult DifferentialBatch::run(std::vector<int> const& jobCou
 
 std::vector<DifferentialCase> DifferentialBatch::cases() const {
     std::vector<DifferentialCase> cases;
-    for (std::string const& folder : _caseFolders) {
-        cases.emplace_back(folder, _first, _last);
-    }
+    cases.reserve(_caseFolders.size());
+    std::transform(
+        _caseFolders.begin(), _caseFolders.end(), std::back_inserter(cases),
+        [this](std::string const& folder) { return DifferentialCase(folder, _first, _last); });
     return cases;
 }
 

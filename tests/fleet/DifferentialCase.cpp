@@ -47,6 +47,12 @@ std::string sortedLines(std::string const& text) {
     return joined;
 }
 
+std::string pathIn(std::string folder, std::string const& name) {
+    folder += '/';
+    folder += name;
+    return folder;
+}
+
 std::string joinedLines(std::vector<std::string> const& texts) {
     std::string joined;
     for (std::string const& text : texts) {
@@ -122,11 +128,11 @@ int DifferentialCase::_expectedExitStatus() const {
     std::size_t listed = 0;
     std::size_t surveyed = 0;
     std::string const vpd = _folder + "/" + gc_Reference + "/VPD";
-    for (std::string const& name : SurveyTest_Utility::u_list_Folder(vpd)) {
-        if (!endsWith(name, gc_StatusSuffix)) {
+    for (std::string const& fileName : SurveyTest_Utility::u_list_Folder(vpd)) {
+        if (!endsWith(fileName, gc_StatusSuffix)) {
             continue;
         }
-        for (std::string const& line : lines(QuorvexTest::readFile(vpd + "/" + name))) {
+        for (std::string const& line : lines(QuorvexTest::readFile(pathIn(vpd, fileName)))) {
             listed += line == gc_NoPartitionLine ? 0 : 1;
             surveyed += endsWith(line, gc_SurveyedEnding) ? 1 : 0;
         }
@@ -148,12 +154,13 @@ void DifferentialCase::_expectSameFolder(std::string const& run, std::string con
     std::vector<std::string> const names = SurveyTest_Utility::u_list_Folder(expectedFolder);
     _expectEqual(run, "names in " + folder, joinedLines(names),
                  joinedLines(SurveyTest_Utility::u_list_Folder(actualFolder)));
-    for (std::string const& name : names) {
-        std::string const actualPath = actualFolder + "/" + name;
+    for (std::string const& fileName : names) {
+        std::string const actualPath = pathIn(actualFolder, fileName);
         if (QuorvexTest::fileExists(actualPath)) {
-            _expectEqual(run, folder + "/" + name,
-                         _normalised(folder, QuorvexTest::readFile(expectedFolder + "/" + name)),
-                         _normalised(folder, QuorvexTest::readFile(actualPath)));
+            _expectEqual(
+                run, pathIn(folder, fileName),
+                _normalised(folder, QuorvexTest::readFile(pathIn(expectedFolder, fileName))),
+                _normalised(folder, QuorvexTest::readFile(actualPath)));
         }
     }
 }

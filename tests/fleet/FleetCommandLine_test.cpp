@@ -33,7 +33,9 @@ std::string lowerCase(std::string text) {
 }
 
 struct BadCommandLine {
+    // cppcheck-suppress unusedStructMember ; read by the test name generator
     std::string name;
+    // cppcheck-suppress unusedStructMember ; read through GetParam()
     std::vector<std::string> arguments;
 };
 

@@ -48,7 +48,7 @@ std::string quoted(std::vector<std::string> const& words) {
 std::string surveyCommand(std::vector<std::string> const& options) {
     std::vector<std::string> words{FleetTest::consoleWideTool()};
     words.insert(words.end(), options.begin(), options.end());
-    words.push_back(gc_Identity);
+    words.emplace_back(gc_Identity);
     return quoted(words);
 }
 
@@ -125,7 +125,7 @@ TEST(FleetProgress, NothingOfItWithQuiet) {
     SimulatedConsole const console(slowConsole());
     CommandResult const terminal = onTerminal(surveyCommand({"-j", "2", "--quiet"}));
     EXPECT_EQ(terminal.exitStatus, 4);
-    EXPECT_EQ(terminal.stdoutText.find_first_of("\033"), std::string::npos) << terminal.stdoutText;
+    EXPECT_EQ(terminal.stdoutText.find('\033'), std::string::npos) << terminal.stdoutText;
     EXPECT_EQ(terminal.stdoutText.find("machines "), std::string::npos) << terminal.stdoutText;
 }
 

@@ -2,6 +2,8 @@
 
 #include "QuorvexTest.h"
 
+#include <algorithm>
+#include <iterator>
 #include <utility>
 
 namespace FleetTest {
@@ -43,9 +45,10 @@ std::vector<std::string> SummaryFile::outcomes() const {
         return found;
     }
     for (auto const& machine : _document["machines"]) {
-        for (auto const& partition : machine.value("partitions", nlohmann::json::array())) {
-            found.push_back(partition.value("outcome", "(none)"));
-        }
+        nlohmann::json const partitions = machine.value("partitions", nlohmann::json::array());
+        std::transform(
+            partitions.begin(), partitions.end(), std::back_inserter(found),
+            [](nlohmann::json const& partition) { return partition.value("outcome", "(none)"); });
     }
     return found;
 }

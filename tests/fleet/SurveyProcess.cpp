@@ -1,8 +1,10 @@
 #include "SurveyProcess.h"
 
+#include <algorithm>
 #include <chrono>
 #include <csignal>
 #include <fcntl.h>
+#include <iterator>
 #include <stdexcept>
 #include <sys/wait.h>
 #include <thread>
@@ -28,9 +30,9 @@ int statusOf(int waitStatus) {
         ::_exit(126);
     }
     std::vector<char*> arguments;
-    for (std::string const& argument : argv) {
-        arguments.push_back(const_cast<char*>(argument.c_str()));
-    }
+    arguments.reserve(argv.size() + 1);
+    std::transform(argv.begin(), argv.end(), std::back_inserter(arguments),
+                   [](std::string const& argument) { return const_cast<char*>(argument.c_str()); });
     arguments.push_back(nullptr);
     ::execv(arguments[0], arguments.data());
     ::_exit(127);
