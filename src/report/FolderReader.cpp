@@ -13,6 +13,7 @@
 #include <chrono>
 #include <filesystem>
 #include <fstream>
+#include <iterator>
 #include <map>
 #include <sstream>
 #include <unistd.h>
@@ -199,10 +200,10 @@ private:
                 byHost[*document.content.host].push_back(&document);
             }
         }
+        std::vector<StatusLine> const lines = readStatusLines(statusFile);
         Json partitions = Json::array();
-        for (StatusLine const& line : readStatusLines(statusFile)) {
-            partitions.push_back(partition(line, byHost));
-        }
+        std::transform(lines.begin(), lines.end(), std::back_inserter(partitions),
+                       [&](StatusLine const& line) { return partition(line, byHost); });
         Json counts = countOutcomes(partitions);
         Json entry;
         entry["identity"] = validUtf8(identity);
@@ -280,13 +281,16 @@ private:
         if (outcome == "inactive" || sameHost == byHost.end()) {
             return nullptr;
         }
-        for (DocumentFile* document : sameHost->second) {
-            if (!document->used && fitsOutcome(document->failure, outcome)) {
-                document->used = true;
-                return document;
-            }
+        auto const& candidates = sameHost->second;
+        auto const found =
+            std::find_if(candidates.begin(), candidates.end(), [&](DocumentFile const* document) {
+                return !document->used && fitsOutcome(document->failure, outcome);
+            });
+        if (found == candidates.end()) {
+            return nullptr;
         }
-        return nullptr;
+        (*found)->used = true;
+        return *found;
     }
 
     static bool fitsOutcome(std::optional<FailureReason> const& failure,
@@ -312,27 +316,27 @@ private:
     }
 
     Json runSummary(Json machines, Json identities) const {
-        Json summary;
-        summary["schema_version"] = 1;
-        summary["tool"] = "quorvex-survey report";
-        summary["version"] = QUORVEX_VERSION;
-        summary["console_host"] = validUtf8(consoleHost());
+        Json run;
+        run["schema_version"] = 1;
+        run["tool"] = "quorvex-survey report";
+        run["version"] = QUORVEX_VERSION;
+        run["console_host"] = validUtf8(consoleHost());
         long long const started = _oldest.value_or(0);
         long long const ended = _newest.value_or(0);
-        summary["started"] = localTimeText(started);
-        summary["ended"] = localTimeText(ended);
-        summary["elapsed_seconds"] = ended - started;
-        summary["options"] = {{"jobs", nullptr},
-                              {"timeout_seconds", nullptr},
-                              {"all", false},
-                              {"identities", std::move(identities)}};
-        summary["interrupted"] = _signal ? Json(*_signal) : Json(nullptr);
+        run["started"] = localTimeText(started);
+        run["ended"] = localTimeText(ended);
+        run["elapsed_seconds"] = ended - started;
+        run["options"] = {{"jobs", nullptr},
+                          {"timeout_seconds", nullptr},
+                          {"all", false},
+                          {"identities", std::move(identities)}};
+        run["interrupted"] = _signal ? Json(*_signal) : Json(nullptr);
         Json totals = totalCounts(machines);
-        summary["return_code"] = overallCode(totals);
-        summary["exit_status"] = nullptr;
-        summary["totals"] = std::move(totals);
-        summary["machines"] = std::move(machines);
-        return summary;
+        run["return_code"] = overallCode(totals);
+        run["exit_status"] = nullptr;
+        run["totals"] = std::move(totals);
+        run["machines"] = std::move(machines);
+        return run;
     }
 
     static std::string consoleHost() {

@@ -18,6 +18,7 @@ header h1 span{font-weight:400;color:#c7d2de}
 .totals{display:flex;flex-wrap:wrap;gap:8px;margin:0;padding:0;list-style:none}
 .totals li{padding:6px 12px;border-radius:6px;background:#2c3e52;border-left:5px solid #6b7c8f}
 .totals li b{display:block;font-size:19px;line-height:1.2}
+.totals li[title]{cursor:pointer}
 .totals .s{border-color:var(--s)}.totals .i{border-color:var(--i)}.totals .c{border-color:var(--c)}
 .totals .l{border-color:var(--l)}.totals .f{border-color:var(--f)}.totals .t{border-color:var(--t)}
 .totals .x{border-color:var(--x)}
@@ -231,6 +232,17 @@ char const* const pageScript = R"js(
     link.addEventListener("click", function (event) {
       event.preventDefault();
       showMachine(link.getAttribute("data-machine"));
+    });
+  });
+  Array.prototype.forEach.call(document.querySelectorAll(".totals li[data-outcome]"), function (item) {
+    item.title = "Show only these partitions";
+    item.addEventListener("click", function () {
+      Array.prototype.forEach.call(form.querySelectorAll("input[name=o]"), function (box) {
+        box.checked = box.value === item.className;
+      });
+      shown = PAGE;
+      render();
+      table.scrollIntoView();
     });
   });
   form.hidden = false;

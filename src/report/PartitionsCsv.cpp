@@ -3,6 +3,8 @@
 #include "report/JsonMember.h"
 #include "report/TextSafety.h"
 
+#include <algorithm>
+#include <iterator>
 #include <vector>
 
 namespace report {
@@ -66,9 +68,10 @@ std::string partitionsCsv(Json const& summary) {
             std::vector<std::string> row = {fieldText(member(machine, "identity")),
                                             fieldText(member(machine, "return_code")),
                                             fieldText(member(partition, "id"))};
-            for (std::string const& column : partitionColumns()) {
-                row.push_back(fieldText(member(partition, column.c_str())));
-            }
+            std::transform(partitionColumns().begin(), partitionColumns().end(),
+                           std::back_inserter(row), [&](std::string const& column) {
+                               return fieldText(member(partition, column.c_str()));
+                           });
             appendRow(csv, row);
         }
     }

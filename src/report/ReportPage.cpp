@@ -5,6 +5,7 @@
 #include "report/SummaryTotals.h"
 #include "report/TextSafety.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <vector>
 
@@ -33,12 +34,11 @@ std::vector<OutcomeStyle> const& outcomeStyles() {
 }
 
 OutcomeStyle styleOf(std::string const& outcome) {
-    for (OutcomeStyle const& style : outcomeStyles()) {
-        if (outcome == style.name) {
-            return style;
-        }
-    }
-    return {"", "u", "unknown"};
+    auto const& styles = outcomeStyles();
+    auto const found = std::find_if(styles.begin(), styles.end(), [&](OutcomeStyle const& style) {
+        return outcome == style.name;
+    });
+    return found == styles.end() ? OutcomeStyle{"", "u", "unknown"} : *found;
 }
 
 // The text of a value as the page shows it, escaped; "" for null.

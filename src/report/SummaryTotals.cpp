@@ -1,5 +1,7 @@
 #include "report/SummaryTotals.h"
 
+#include <numeric>
+
 namespace report {
 
 using Json = nlohmann::ordered_json;
@@ -41,11 +43,10 @@ Json totalCounts(Json const& machines) {
     totals["machines"] = machines.size();
     Json const zero = zeroCounts();
     for (auto const& [name, value] : zero.items()) {
-        long long sum = value.get<long long>();
-        for (Json const& machine : machines) {
-            sum += machine["counts"].value(name, 0LL);
-        }
-        totals[name] = sum;
+        totals[name] = std::accumulate(machines.begin(), machines.end(), value.get<long long>(),
+                                       [&](long long sum, Json const& machine) {
+                                           return sum + machine["counts"].value(name, 0LL);
+                                       });
     }
     return totals;
 }

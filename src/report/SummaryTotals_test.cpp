@@ -2,15 +2,19 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <iterator>
+
 namespace {
 
 using Json = nlohmann::ordered_json;
 
 Json partitions(std::vector<std::string> const& outcomes) {
     Json list = Json::array();
-    for (std::string const& outcome : outcomes) {
-        list.push_back({{"outcome", outcome}});
-    }
+    std::transform(outcomes.begin(), outcomes.end(), std::back_inserter(list),
+                   [](std::string const& outcome) {
+                       return Json{{"outcome", outcome}};
+                   });
     return list;
 }
 

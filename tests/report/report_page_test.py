@@ -166,6 +166,12 @@ class PageTest(unittest.TestCase):
             self.assertEqual(self.summary["totals"][outcome], len(classes), outcome)
             self.assertTrue(all(c == css_class for c in classes), outcome)
 
+    def test_clicking_a_total_shows_only_its_partitions(self):
+        self.script("document.querySelector('.totals li[data-outcome=fetch_failure]').click();")
+        classes = self.rendered_row_classes()
+        self.assertEqual(self.summary["totals"]["fetch_failure"], len(classes))
+        self.assertEqual({"f"}, set(classes))
+
     def test_free_text_filter_keeps_matching_rows(self):
         self.script("const q = document.getElementById('q'); q.value = arguments[0];"
                     "q.dispatchEvent(new Event('input'));", ' B<C"D ')
