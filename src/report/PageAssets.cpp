@@ -9,6 +9,7 @@ char const* const pageStyle = R"css(
 :root{--s:#2e7d32;--i:#9e9e9e;--c:#c62828;--l:#ef6c00;--f:#8e24aa;--t:#f9a825;--x:#1565c0;
 --line:#d7dbe0;--muted:#5f6b7a;--head:#f3f5f8}
 *{box-sizing:border-box}
+[hidden]{display:none !important}
 body{margin:0;font:14px/1.45 system-ui,-apple-system,"Segoe UI",sans-serif;color:#1d2733;background:#fff}
 header{padding:18px 24px 14px;background:#1f2d3d;color:#fff}
 header h1{margin:0 0 4px;font-size:21px;font-weight:600}

@@ -42,11 +42,13 @@ Json totalCounts(Json const& machines) {
     Json totals;
     totals["machines"] = machines.size();
     Json const zero = zeroCounts();
-    for (auto const& [name, value] : zero.items()) {
-        totals[name] = std::accumulate(machines.begin(), machines.end(), value.get<long long>(),
-                                       [&](long long sum, Json const& machine) {
-                                           return sum + machine["counts"].value(name, 0LL);
-                                       });
+    for (auto const& item : zero.items()) {
+        std::string const& name = item.key();
+        totals[name] =
+            std::accumulate(machines.begin(), machines.end(), item.value().get<long long>(),
+                            [&](long long sum, Json const& machine) {
+                                return sum + machine["counts"].value(name, 0LL);
+                            });
     }
     return totals;
 }
