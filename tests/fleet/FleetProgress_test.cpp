@@ -19,11 +19,13 @@ using QuorvexTest::CommandResult;
 using QuorvexTest::SimulatedConsole;
 
 constexpr char gc_Identity[] = "1234-ABC_10ABCDE";
+constexpr char gc_SecondIdentity[] = "5678-DEF_20FGHIJ";
 constexpr std::size_t gc_Width = 300;
 
-// Six partitions whose client runs take 0.4 s each: a run of a few redraws.
+// Machines of six partitions whose client runs take 0.4 s each: a run of a
+// few redraws.
 std::string slowConsole() {
-    std::string scenario = "[lspartition 1234-ABC_10ABCDE]\nstdout ";
+    std::string scenario = "[lspartition *]\nstdout ";
     for (int id = 1; id <= 6; ++id) {
         scenario += std::to_string(id) + ",10.1.1.1" + std::to_string(id) + ",3,host" +
                     std::to_string(id) + ",Zeph,7.2;";
@@ -45,10 +47,11 @@ std::string quoted(std::vector<std::string> const& words) {
     return line;
 }
 
-std::string surveyCommand(std::vector<std::string> const& options) {
+std::string surveyCommand(std::vector<std::string> const& options,
+                          std::vector<std::string> const& identities = {gc_Identity}) {
     std::vector<std::string> words{FleetTest::consoleWideTool()};
     words.insert(words.end(), options.begin(), options.end());
-    words.emplace_back(gc_Identity);
+    words.insert(words.end(), identities.begin(), identities.end());
     return quoted(words);
 }
 
@@ -72,17 +75,17 @@ std::vector<std::string> shownLines(std::string const& text) {
     return lines;
 }
 
-// What the same run writes to its standard output and error, both going to
-// one file: the output lines in the order a terminal shows them.
-std::vector<std::string> outputLines() {
+// What the run writes to its standard output and error, both going to one
+// file: the output lines in the order a terminal shows them.
+std::vector<std::string> outputLines(std::string const& commandLine) {
     SurveyTest_Utility::u_clear_Folder("/var/adm/quorvex/VPD");
     SurveyTest_Utility::u_clear_Folder("/var/adm/quorvex/Trace");
-    return shownLines(QuorvexTest::runShell(surveyCommand({"-j", "2"}) + " 2>&1").stdoutText);
+    return shownLines(QuorvexTest::runShell(commandLine + " 2>&1").stdoutText);
 }
 
 TEST(FleetProgress, LiveLineIsRedrawnAndErasedBeforeOutputLines) {
     SimulatedConsole const console(slowConsole());
-    std::vector<std::string> const expected = outputLines();
+    std::vector<std::string> const expected = outputLines(surveyCommand({"-j", "2"}));
     CommandResult const terminal = onTerminal(surveyCommand({"-j", "2"}));
     EXPECT_EQ(terminal.exitStatus, 4) << terminal.stderrText;
     std::string const& bytes = terminal.stdoutText;
@@ -99,11 +102,24 @@ TEST(FleetProgress, LiveLineIsRedrawnAndErasedBeforeOutputLines) {
 
 TEST(FleetProgress, WideLineIsErasedOnANarrowTerminalToo) {
     SimulatedConsole const console(slowConsole());
-    std::vector<std::string> const expected = outputLines();
+    std::vector<std::string> const expected = outputLines(surveyCommand({"-j", "2"}));
     CommandResult const terminal = onTerminal("stty cols 80; " + surveyCommand({"-j", "2"}));
     FleetTest::TerminalScreen screen(80);
     screen.write(terminal.stdoutText);
     EXPECT_EQ(screen.rows(), expected) << "what an 80-column terminal shows at the end";
+}
+
+// One machine's block ends with its code and no line end; the next machine's
+// first line follows on the same row, as with the one-machine tool.
+TEST(FleetProgress, FinalScreenOfSeveralMachinesHoldsExactlyTheOutputLines) {
+    SimulatedConsole const console(slowConsole());
+    std::string const command = surveyCommand({"-j", "3"}, {gc_Identity, gc_SecondIdentity});
+    std::vector<std::string> const expected = outputLines(command);
+    CommandResult const terminal = onTerminal(command);
+    EXPECT_EQ(terminal.exitStatus, 4) << terminal.stderrText;
+    FleetTest::TerminalScreen screen(gc_Width);
+    screen.write(terminal.stdoutText);
+    EXPECT_EQ(screen.rows(), expected) << "the final screen holds exactly the output lines";
 }
 
 TEST(FleetProgress, NothingOfItWhenStandardErrorIsAFile) {

@@ -59,6 +59,19 @@ std::size_t TerminalScreen::_escape(std::string const& bytes, std::size_t at) {
         }
         return at + 2;
     }
+    if (bytes.compare(at, 3, "\033[A") == 0) {
+        _row = _row == 0 ? 0 : _row - 1;
+        return at + 2;
+    }
+    if (bytes.compare(at, 2, "\0337") == 0) {
+        _saved = {_row, _column};
+        return at + 1;
+    }
+    if (bytes.compare(at, 2, "\0338") == 0) {
+        _row = _saved.first;
+        _column = _saved.second;
+        return at + 1;
+    }
     _unknown.push_back(bytes.substr(at, 4));
     return at;
 }

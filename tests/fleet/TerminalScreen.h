@@ -2,11 +2,13 @@
 // What a terminal shows after a stream of bytes: enough of a terminal for a
 // program that redraws one line in place. Printable bytes overwrite the
 // screen at the cursor and wrap at the width, a carriage return goes to the
-// start of the row, a line feed to the start of the next row, and ESC [ K
-// erases from the cursor to the end of the row. Any other escape sequence
-// is recorded as unknown.
+// start of the row, a line feed to the start of the next row, ESC [ K
+// erases from the cursor to the end of the row, ESC [ A moves up a row, and
+// ESC 7 and ESC 8 save and restore the cursor. Any other escape sequence is
+// recorded as unknown.
 
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace FleetTest {
@@ -30,6 +32,7 @@ private:
     std::vector<std::string> _rows{""};
     std::size_t _row = 0;
     std::size_t _column = 0;
+    std::pair<std::size_t, std::size_t> _saved{0, 0};
     std::vector<std::string> _unknown;
 };
 
