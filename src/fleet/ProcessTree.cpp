@@ -1,5 +1,6 @@
 #include "fleet/ProcessTree.h"
 
+#include <fcntl.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -9,8 +10,6 @@
 #include <csignal>
 #include <ctime>
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <sstream>
 #include <thread>
 
@@ -22,9 +21,27 @@ namespace {
 constexpr int gc_KillRounds = 1000;
 constexpr auto gc_PauseBetweenRounds = std::chrono::milliseconds(1);
 
+// Read with plain read(): a /proc file of a process that ends while it is read
+// fails with an error, which then only ends the text.
 std::string readWholeFile(std::string const& path) {
-    std::ifstream file(path, std::ios::binary);
-    return std::string(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
+    std::string text;
+    int const descriptor = open(path.c_str(), O_RDONLY | O_CLOEXEC);
+    if (descriptor < 0) {
+        return text;
+    }
+    char buffer[4096];
+    while (true) {
+        ssize_t const n = read(descriptor, buffer, sizeof buffer);
+        if (n < 0 && errno == EINTR) {
+            continue;
+        }
+        if (n <= 0) {
+            break;
+        }
+        text.append(buffer, static_cast<std::size_t>(n));
+    }
+    close(descriptor);
+    return text;
 }
 
 std::string procPath(pid_t pid, char const* name) {
