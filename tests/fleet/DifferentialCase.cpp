@@ -1,5 +1,6 @@
 #include "DifferentialCase.h"
 
+#include "Lines.h"
 #include "QuorvexTest.h"
 #include "TextDifference.h"
 #include "survey/SurveyTest_Utility.h"
@@ -9,7 +10,6 @@
 #include <algorithm>
 #include <filesystem>
 #include <set>
-#include <sstream>
 #include <utility>
 
 namespace FleetTest {
@@ -22,23 +22,13 @@ constexpr char gc_NoPartitionLine[] = "No ACTIVE Partition Found.";
 constexpr char gc_SurveyedEnding[] = " - VPD Survey - Ok";
 constexpr char gc_MachineListingCall[] = "lsvtc\t-t0\n";
 
-std::vector<std::string> lines(std::string const& text) {
-    std::vector<std::string> result;
-    std::istringstream stream(text);
-    std::string line;
-    while (std::getline(stream, line)) {
-        result.push_back(line);
-    }
-    return result;
-}
-
 bool endsWith(std::string const& text, std::string const& ending) {
     return text.size() >= ending.size() &&
            text.compare(text.size() - ending.size(), ending.size(), ending) == 0;
 }
 
 std::string sortedLines(std::string const& text) {
-    std::vector<std::string> all = lines(text);
+    std::vector<std::string> all = linesOf(text);
     std::sort(all.begin(), all.end());
     std::string joined;
     for (std::string const& line : all) {
@@ -93,7 +83,7 @@ std::string DifferentialCase::_file(std::string const& run, std::string const& n
 }
 
 std::vector<std::string> DifferentialCase::_identities() const {
-    return lines(QuorvexTest::readFile(_folder + "/identities"));
+    return linesOf(QuorvexTest::readFile(_folder + "/identities"));
 }
 
 bool DifferentialCase::_surveysAll() const {
@@ -132,7 +122,7 @@ int DifferentialCase::_expectedExitStatus() const {
         if (!endsWith(fileName, gc_StatusSuffix)) {
             continue;
         }
-        for (std::string const& line : lines(QuorvexTest::readFile(pathIn(vpd, fileName)))) {
+        for (std::string const& line : linesOf(QuorvexTest::readFile(pathIn(vpd, fileName)))) {
             listed += line == gc_NoPartitionLine ? 0 : 1;
             surveyed += endsWith(line, gc_SurveyedEnding) ? 1 : 0;
         }

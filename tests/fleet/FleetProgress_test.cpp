@@ -5,13 +5,12 @@
 // not one byte of it appears.
 
 #include "FleetTools.h"
+#include "Lines.h"
 #include "QuorvexTest.h"
 #include "TerminalScreen.h"
 #include "survey/SurveyTest_Utility.h"
 
 #include <gtest/gtest.h>
-
-#include <sstream>
 
 namespace {
 
@@ -65,12 +64,9 @@ CommandResult onTerminal(std::string const& commandLine) {
 
 // The lines of a text as a screen shows them: blanks at their end cannot be seen.
 std::vector<std::string> shownLines(std::string const& text) {
-    std::vector<std::string> lines;
-    std::istringstream stream(text);
-    std::string line;
-    while (std::getline(stream, line)) {
+    std::vector<std::string> lines = FleetTest::linesOf(text);
+    for (std::string& line : lines) {
         line.erase(line.find_last_not_of(' ') + 1);
-        lines.push_back(line);
     }
     return lines;
 }

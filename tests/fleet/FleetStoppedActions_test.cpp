@@ -11,6 +11,7 @@
 #include "FleetTools.h"
 #include "KilledActionReference.h"
 #include "LeftProcesses.h"
+#include "Lines.h"
 #include "QuorvexTest.h"
 #include "SummaryFile.h"
 #include "SurveyProcess.h"
@@ -21,7 +22,6 @@
 #include <csignal>
 #include <ctime>
 #include <regex>
-#include <sstream>
 #include <thread>
 
 namespace {
@@ -64,20 +64,10 @@ void clearResultFolders() {
     SurveyTest_Utility::u_clear_Folder("/var/adm/quorvex/Trace");
 }
 
-std::vector<std::string> linesOf(std::string const& text) {
-    std::vector<std::string> lines;
-    std::istringstream stream(text);
-    std::string line;
-    while (std::getline(stream, line)) {
-        lines.push_back(line);
-    }
-    return lines;
-}
-
 // The lines matching the pattern.
 std::vector<std::string> matching(std::string const& text, std::regex const& pattern) {
     std::vector<std::string> found;
-    for (std::string const& line : linesOf(text)) {
+    for (std::string const& line : FleetTest::linesOf(text)) {
         if (std::regex_match(line, pattern)) {
             found.push_back(line);
         }
@@ -118,6 +108,14 @@ std::string traceBlock(std::string const& trace, std::string const& id) {
 std::string withoutFinalLineFeeds(std::string text) {
     text.erase(text.find_last_not_of('\n') + 1);
     return text;
+}
+
+// quorvex-survey with two partitions in flight, the given time limit and a
+// summary, surveying the one machine; its output goes to files in work.
+SurveyProcess startSurvey(QuorvexTest::TemporaryDirectory const& work, char const* timeLimit) {
+    return SurveyProcess({FleetTest::consoleWideTool(), "-t", timeLimit, "-j", "2", "--summary",
+                          work.file("summary.json"), gc_Identity},
+                         work.file("stdout"), work.file("stderr"));
 }
 
 // Waits until the console has received the client run of each partition.
@@ -185,9 +183,7 @@ TEST(FleetTimeLimit, HungActionIsStoppedAtTheLimitAndTheRunGoesOn) {
                                    "[runCmdOnPartition *]\n" + gc_Answer + fetchAnswer());
     QuorvexTest::TemporaryDirectory const work;
     long const first = static_cast<long>(std::time(nullptr));
-    SurveyProcess survey({FleetTest::consoleWideTool(), "-t", "2", "-j", "2", "--summary",
-                          work.file("summary.json"), gc_Identity},
-                         work.file("stdout"), work.file("stderr"));
+    SurveyProcess survey = startSurvey(work, "2");
     int const status = survey.waitForExit(60.0);
     EXPECT_LE(survey.secondsTaken(), 2.0 + 1.0 + gc_Margin) << "the run waited for the hung action";
     EXPECT_EQ(status, 4) << QuorvexTest::readFile(work.file("stderr"));
@@ -236,9 +232,7 @@ TEST_P(FleetInterruption, StopsWhatIsInFlightAndMarksWhatDidNotFinish) {
                                    "[runCmdOnPartition *]\n" + gc_Hang + fetchAnswer());
     QuorvexTest::TemporaryDirectory const work;
     long const first = static_cast<long>(std::time(nullptr));
-    SurveyProcess survey({FleetTest::consoleWideTool(), "-t", "0", "-j", "2", "--summary",
-                          work.file("summary.json"), gc_Identity},
-                         work.file("stdout"), work.file("stderr"));
+    SurveyProcess survey = startSurvey(work, "0");
     ASSERT_TRUE(waitForClientRuns(console, {"2", "3"})) << "partitions 2 and 3 never started";
     std::this_thread::sleep_for(std::chrono::milliseconds(300));
     survey.signal(signalNumber);
