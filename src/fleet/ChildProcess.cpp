@@ -1,5 +1,7 @@
 #include "fleet/ChildProcess.h"
 
+#include "fleet/ProcessTree.h"
+
 #include <fcntl.h>
 #include <sys/mman.h>
 #include <sys/prctl.h>
@@ -163,6 +165,13 @@ void ChildProcess::killAndReap() {
     if (isReaped()) {
         return;
     }
+    // Stopped first, so that it starts nothing while what it started is killed.
+    int status = 0;
+    if (!ProcessTree::stopChild(_pid, status)) {
+        _reaped = true;
+        return;
+    }
+    ProcessTree::killDescendants(_pid);
     kill(_pid, SIGKILL);
     while (waitpid(_pid, nullptr, 0) < 0 && errno == EINTR) {
     }

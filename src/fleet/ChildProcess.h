@@ -36,7 +36,7 @@ public:
     // The parent has reaped the child elsewhere (while stopping it).
     void markReaped();
     bool isReaped() const;
-    // Kills and reaps a child that is still there.
+    // Kills a child that is still there, with everything it started, and reaps it.
     void killAndReap();
 
     // The line the parent leaves in the slot; read by the child itself.

@@ -43,9 +43,16 @@ CommandLine::Parsed CommandLine::parse(int argc, char const* const* argv) {
     auto* identities =
         app.add_option("IDENTITY", options.identities, "Managed machine (type-model_serial)");
     identities->excludes(all);
+    report::addReportOption(app, options.reportFolder);
+    report::ReportRequest reportRequest;
+    CLI::App const* const reportCommand = report::addReportSubcommand(app, reportRequest);
     app.set_version_flag("--version", versionText());
     try {
         app.parse(argc, argv);
+        if (reportCommand->parsed()) {
+            parsed.reportRequest = reportRequest;
+            return parsed;
+        }
         if (!options.all && options.identities.empty()) {
             throw CLI::RequiredError("IDENTITY or --all");
         }

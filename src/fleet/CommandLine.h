@@ -1,5 +1,7 @@
 #pragma once
 
+#include "report/ReportCommand.h"
+
 #include <optional>
 #include <string>
 #include <vector>
@@ -12,6 +14,8 @@ struct Options {
     // Seconds one remote action may take; 0 for no limit.
     unsigned int timeoutSeconds = 1800;
     std::string summaryFile;
+    // --report DIR: the run's report is written there.
+    std::string reportFolder;
     bool quiet = false;
     bool all = false;
     // As given, an identity given more than once kept at its first place.
@@ -30,6 +34,8 @@ public:
         std::optional<int> exitStatus;
         // Warnings to print on standard error before anything else.
         std::vector<std::string> warnings;
+        // Set for "report [--from VPD_FOLDER] DIR", which surveys nothing.
+        std::optional<report::ReportRequest> reportRequest;
     };
 
     static constexpr int gc_ExitUsage = 64;

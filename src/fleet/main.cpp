@@ -6,6 +6,7 @@
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
 #include "fleet/WorkUnits.h"
+#include "report/ReportCommand.h"
 #include "utility/Trace.h"
 
 #include <poll.h>
@@ -50,8 +51,8 @@ std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
     return Fleet::WorkUnits::decodeMachines(lister.result());
 }
 
-void writeSummary(Fleet::RunFacts const& facts, Fleet::SurveyRun const& run) {
-    std::string const text = Fleet::Summary::text(Fleet::Summary::build(facts, run.machines()));
+void writeSummary(Fleet::RunFacts const& facts, nlohmann::json const& summary) {
+    std::string const text = Fleet::Summary::text(summary);
     if (!Fleet::RunFiles::writeAtomically(facts.options.summaryFile, text)) {
         std::cerr << "quorvex-survey: cannot write the summary to " << facts.options.summaryFile
                   << std::endl;
@@ -64,6 +65,9 @@ int main(int argc, char** argv) {
     auto const parsed = Fleet::CommandLine::parse(argc, argv);
     if (parsed.exitStatus) {
         return *parsed.exitStatus;
+    }
+    if (parsed.reportRequest) {
+        return report::runReportSubcommand(*parsed.reportRequest, std::cout, std::cerr);
     }
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;
@@ -78,7 +82,7 @@ int main(int argc, char** argv) {
     Fleet::SurveyRun run(options, identities);
     int const exitStatus = run.run();
 
-    if (!options.summaryFile.empty()) {
+    if (!options.summaryFile.empty() || !options.reportFolder.empty()) {
         Fleet::RunFacts facts;
         facts.options = options;
         // Every unit of work has ended: the host name command may trace here.
@@ -92,7 +96,13 @@ int main(int argc, char** argv) {
         }
         facts.returnCode = run.overallCode();
         facts.exitStatus = exitStatus;
-        writeSummary(facts, run);
+        nlohmann::json const summary = Fleet::Summary::build(facts, run.machines());
+        if (!options.summaryFile.empty()) {
+            writeSummary(facts, summary);
+        }
+        if (!options.reportFolder.empty()) {
+            report::writeRunReport(summary, options.reportFolder, std::cerr);
+        }
     }
     return exitStatus;
 }
