@@ -1,13 +1,16 @@
 #!/usr/bin/python3
-"""Leaves the files of a survey of a simulated console with three managed
-machines in OUT/VPD and OUT/Trace (the single-machine tool run once per
-machine inside tools/sandbox), then writes their report into OUT/report.
+"""Leaves the files of surveys of a simulated console with four managed
+machines in OUT/VPD and OUT/Trace, then writes their report into OUT/report
+with "quorvex-survey report --from OUT/VPD". Three machines are surveyed by
+the single-machine tool, once per machine; the fourth, whose one partition
+hangs, by "quorvex-survey -t 1 --summary OUT/run-summary.json --report
+OUT/run-report". Everything runs inside tools/sandbox.
 
 The console's answers hold what operators meet: surveyed, inactive and every
-kind of failed partition, a host name made of markup, texts with & < " and
-a host name whose bytes are not UTF-8.
+kind of failed partition, one stopped by the time limit, a host name made of
+markup, texts with & < " and a host name whose bytes are not UTF-8.
 
-Usage: make_survey.py --tool T --sandbox S --sim P --out OUT -- REPORT_COMMAND...
+Usage: make_survey.py --tool T --fleet Q --sandbox S --sim P --out OUT
 Exit status 77 when no sandbox can be made here (the reason on stderr).
 """
 import argparse
@@ -17,6 +20,7 @@ import subprocess
 import sys
 
 MACHINES = ["9119-MHE_21ABCDE", "8286-42A_10XYZ99", "1234-ABC_10ABCDE"]
+HANGING_MACHINE = "7063-CR2_06SLOW1"
 MARKUP_HOST = "<img src=x onerror=alert(1)>"
 
 
@@ -56,6 +60,8 @@ def scenario_text():
         "[lspartition 8286-42A_10XYZ99]\n"
         "stdout 1,10.40.50.61,3,gemini,Linux,5.14;2,10.40.50.62,3,a&b<c\"d,Zeph & <Co>,7.2;"
         "3,10.40.50.63,2,hydra,Zeph,7.1;\n\n"
+        f"[lspartition {HANGING_MACHINE}]\nstdout 9,10.60.70.89,3,slowpoke,Zeph,7.2;\n\n"
+        "[runCmdOnPartition 9]\ndelay 20\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n\n"
         "[lspartition *]\nstderr lspartition: managed system not found\nexit 1\n\n"
         f"[runCmdOnPartition *]\n{ok}\n"
         "[runCmdOnPartition 4]\nstdout Rc::1::RcCmd::0::RetStr1::timeout::RetStr2::\nexit 1\n\n"
@@ -74,10 +80,10 @@ def scenario_text():
 def main():
     parser = argparse.ArgumentParser()
     parser.add_argument("--tool", required=True)
+    parser.add_argument("--fleet", required=True)
     parser.add_argument("--sandbox", required=True)
     parser.add_argument("--sim", required=True)
     parser.add_argument("--out", required=True)
-    parser.add_argument("report_command", nargs="+")
     args = parser.parse_args()
 
     out = os.path.abspath(args.out)
@@ -89,21 +95,22 @@ def main():
         file.write(scenario_text().encode("latin-1"))
     environment = dict(os.environ, PYLON_SIM_SCENARIO=scenario,
                        PYLON_SIM_LOG=os.path.join(out, "calls.log"))
-    for machine in MACHINES:
-        run = subprocess.run(
-            [args.sandbox, "--sim", args.sim, "--bind", f"{out}:{out}",
-             "--vpd", os.path.join(out, "VPD"), "--trace", os.path.join(out, "Trace"),
-             "--", args.tool, "-c", machine],
-            env=environment, capture_output=True, check=False)
+    sandbox = [args.sandbox, "--sim", args.sim, "--bind", f"{out}:{out}",
+               "--vpd", os.path.join(out, "VPD"), "--trace", os.path.join(out, "Trace"), "--"]
+    surveys = [([args.tool, "-c", machine], 2) for machine in MACHINES]
+    surveys.append(([args.fleet, "-q", "-t", "1", "--summary", os.path.join(out, "run-summary.json"),
+                     "--report", os.path.join(out, "run-report"), HANGING_MACHINE], 8))
+    for command, expected in surveys:
+        run = subprocess.run(sandbox + command, env=environment, capture_output=True, check=False)
         if run.returncode == 77:
             sys.stderr.write(run.stderr.decode(errors="replace"))
             return 77
-        if run.returncode != 2:
-            sys.stderr.write(f"survey of {machine} ended with {run.returncode}\n")
+        if run.returncode != expected:
+            sys.stderr.write(f"{' '.join(command)} ended with {run.returncode}:\n"
+                             f"{run.stderr.decode(errors='replace')}")
             return 1
     report = subprocess.run(
-        args.report_command + ["report", "--from", os.path.join(out, "VPD"),
-                               os.path.join(out, "report")],
+        [args.fleet, "report", "--from", os.path.join(out, "VPD"), os.path.join(out, "report")],
         capture_output=True, check=False)
     if report.returncode != 0:
         sys.stderr.write(report.stderr.decode(errors="replace"))

@@ -96,6 +96,27 @@ class CsvTest(unittest.TestCase):
         self.assertIn("h\ufffdst", hosts)
 
 
+class RunReportTest(unittest.TestCase):
+    def test_report_after_a_run_carries_the_runs_summary(self):
+        run = os.path.join(os.path.dirname(REPORT), "run-report")
+        with open(os.path.join(run, "summary.json"), encoding="utf-8") as file:
+            reported = json.load(file)
+        with open(os.path.join(os.path.dirname(REPORT), "run-summary.json"),
+                  encoding="utf-8") as file:
+            self.assertEqual(json.load(file), reported)
+        self.assertEqual(1, reported["totals"]["timed_out"])
+        self.assertTrue(os.path.isfile(os.path.join(run, "index.html")))
+        self.assertTrue(os.path.isfile(os.path.join(run, "partitions.csv")))
+
+    def test_time_limit_is_read_back_from_the_default_document(self):
+        stopped = [p for _, p in all_partitions(load_summary()) if p["outcome"] == "timed_out"]
+        self.assertEqual(1, len(stopped))
+        self.assertEqual("slowpoke", stopped[0]["host"])
+        self.assertEqual("9", stopped[0]["id"])
+        self.assertEqual("runCmdOnPartition", stopped[0]["time_limit"]["action"])
+        self.assertIn("Stopped by the time limit of 1 s after ", stopped[0]["reason"])
+
+
 class PageTest(unittest.TestCase):
     driver = None
 
@@ -219,9 +240,10 @@ class PageTest(unittest.TestCase):
             rows = driver.execute_cdp_cmd("Runtime.evaluate", {
                 "expression": "document.querySelectorAll('.parts tbody tr').length"})
             self.assertEqual(self.summary["totals"]["partitions"], rows["result"]["value"])
-            hidden = driver.execute_cdp_cmd("Runtime.evaluate", {
-                "expression": "document.getElementById('filters').hidden"})
-            self.assertTrue(hidden["result"]["value"])
+            # The filters work only with script: they are not shown without it.
+            shown = driver.execute_cdp_cmd("Runtime.evaluate", {
+                "expression": "getComputedStyle(document.getElementById('filters')).display"})
+            self.assertEqual("none", shown["result"]["value"])
         finally:
             driver.quit()
 
