@@ -52,6 +52,24 @@ std::string shown(Json const& value) {
     return escapeHtml(value.dump());
 }
 
+// Seconds with one decimal, as the survey's stop lines give them; the CSV
+// and summary.json keep every digit.
+std::string secondsText(Json const& value) {
+    if (!value.is_number()) {
+        return shown(value);
+    }
+    char text[32] = {};
+    std::snprintf(text, sizeof text, "%.1f", value.get<double>());
+    return text;
+}
+
+// A reason ends with blank lines in the documents; on the page they would
+// only make the row taller.
+std::string withoutTrailingBlanks(std::string text) {
+    text.erase(text.find_last_not_of(" \n") + 1);
+    return text;
+}
+
 long long countOf(Json const& counts, char const* name) {
     Json const& value = member(counts, name);
     return value.is_number_integer() ? value.get<long long>() : 0;
@@ -120,8 +138,9 @@ void appendHeader(std::string& page, Json const& summary) {
     page += "<header>\n<h1>Partition survey <span>of console " +
             shown(member(summary, "console_host")) + "</span></h1>\n<p class=\"run\">Started <b>" +
             shown(member(summary, "started")) + "</b>, ended <b>" +
-            shown(member(summary, "ended")) + "</b> (" + shown(member(summary, "elapsed_seconds")) +
-            " s) &middot; overall code <b>" + shown(member(summary, "return_code")) + "</b>" +
+            shown(member(summary, "ended")) + "</b> (" +
+            secondsText(member(summary, "elapsed_seconds")) + " s) &middot; overall code <b>" +
+            shown(member(summary, "return_code")) + "</b>" +
             (interrupted.is_null() ? ""
                                    : " &middot; <b>interrupted by " + shown(interrupted) + "</b>") +
             " &middot; options: <b>" + optionsText(summary) + "</b></p>\n";
@@ -215,7 +234,7 @@ void appendPartitionRow(std::string& page, Json const& partition, std::string co
     page += "><td>" + identity + "<td>" + shown(member(partition, "id")) + "<td>" +
             shown(member(partition, "host")) + "<td>" + shown(member(partition, "ip")) + "<td>" +
             style.label + "<td>" + shown(member(partition, "status_text")) + "<td>" +
-            shown(member(partition, "seconds")) + "<td>";
+            secondsText(member(partition, "seconds")) + "<td>";
     Json const& document = member(partition, "document");
     if (document.is_string()) {
         std::string const path = document.get<std::string>();
@@ -225,7 +244,8 @@ void appendPartitionRow(std::string& page, Json const& partition, std::string co
     page += "<td>";
     Json const& reason = member(partition, "reason");
     if (reason.is_string()) {
-        page += "<details><summary>reason</summary><pre>" + shown(reason) + "</pre></details>";
+        page += "<details><summary>reason</summary><pre>" + withoutTrailingBlanks(shown(reason)) +
+                "</pre></details>";
     }
     // Closed, so that the line end is not part of the last cell.
     page += "</tr>\n";

@@ -19,8 +19,8 @@ Json partitionEntry(std::string const& id, std::string const& host, std::string 
             {"rc", nullptr},
             {"rc_cmd", nullptr},
             {"document", "VPD/quorvexPYLON_VPD_Survey_ClientPartition_1-A_S-" + id + ".VPD.xml"},
-            {"reason", outcome == "surveyed" ? Json(nullptr) : Json("why <not> & \"so\"")},
-            {"seconds", 2.5}};
+            {"reason", outcome == "surveyed" ? Json(nullptr) : Json("why <not> & \"so\"\n\n\n")},
+            {"seconds", 2.46}};
 }
 
 Json summary(Json partitions) {
@@ -42,7 +42,7 @@ Json summary(Json partitions) {
         {"console_host", "console<1>"},
         {"started", "2026-11-23T14:05:09+01:00"},
         {"ended", "2026-11-23T14:06:10+01:00"},
-        {"elapsed_seconds", 61},
+        {"elapsed_seconds", 61.04},
         {"options",
          {{"jobs", 8}, {"timeout_seconds", 1800}, {"all", true}, {"identities", Json::array()}}},
         {"interrupted", nullptr},
@@ -78,7 +78,7 @@ TEST(ReportPage, HeaderShowsConsoleTimesOptionsAndTotals) {
     std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
     EXPECT_NE(std::string::npos, html.find("of console console&lt;1&gt;</span>"));
     EXPECT_NE(std::string::npos, html.find("Started <b>2026-11-23T14:05:09+01:00</b>, ended "
-                                           "<b>2026-11-23T14:06:10+01:00</b> (61 s)"));
+                                           "<b>2026-11-23T14:06:10+01:00</b> (61.0 s)"));
     EXPECT_NE(std::string::npos, html.find("options: <b>-j 8 -t 1800 --all</b>"));
     EXPECT_NE(
         std::string::npos,
