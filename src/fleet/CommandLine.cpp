@@ -27,14 +27,17 @@ CommandLine::Parsed CommandLine::parse(int argc, char const* const* argv) {
     CLI::App app{"Surveys the client partitions of the PYLON console's managed machines, "
                  "several partitions at a time.",
                  gc_ProgramName};
-    app.option_defaults()->always_capture_default();
+    // Defaults are shown for the numbers only: CLI11 2.1 reads past the end of
+    // an empty list when it captures the identities' default.
     app.add_option("-j,--jobs", options.jobs,
                    "Partitions surveyed at the same time, over all machines (1 = one after the "
                    "other)")
-        ->check(CLI::Range(std::size_t{1}, gc_MostJobs));
+        ->check(CLI::Range(std::size_t{1}, gc_MostJobs))
+        ->capture_default_str();
     app.add_option("-t,--timeout", options.timeoutSeconds,
                    "Time limit in seconds of one remote action (0 = none)")
-        ->check(CLI::Range(0U, gc_LongestTimeout));
+        ->check(CLI::Range(0U, gc_LongestTimeout))
+        ->capture_default_str();
     app.add_option("--summary", options.summaryFile,
                    "Write a machine-readable summary of the run (JSON) to this file");
     app.add_flag("-q,--quiet", options.quiet, "No progress display");
