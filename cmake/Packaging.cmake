@@ -1,7 +1,9 @@
 # The Debian package of the survey tool: `cpack -G DEB` in a build tree.
-# It carries what the install rules give a console: the executable, its
-# manual page, and the folders /var/adm/quorvex/VPD and /var/adm/quorvex/Trace
-# that the tool writes into but never creates.
+# It carries what the install rules give a console: the executable and
+# quorvex-survey beside it, their manual pages, and the folders
+# /var/adm/quorvex/VPD and /var/adm/quorvex/Trace that the tools write into
+# but never create. quorvex-survey's libraries (CLI11, nlohmann-json) are
+# header-only, so the package gains no run-time dependency.
 
 set(CPACK_PACKAGE_NAME "quorvex-pylon-vpd-survey")
 set(CPACK_PACKAGE_VERSION "${PROJECT_VERSION}")
@@ -16,7 +18,10 @@ partitions, runs the inventory client on every active partition through the
 console's remote action command, fetches each partition's vital product data
 document as XML into /var/adm/quorvex/VPD, writes a default document with the
 reason for every partition that could not be surveyed, and leaves a status
-file and a trace log.")
+file and a trace log.
+quorvex-survey surveys several managed machines (or every one the console
+lists) in one run with the same results, several partitions at a time, with
+a time limit per remote action, a trace per machine and a JSON summary.")
 
 set(CPACK_PACKAGING_INSTALL_PREFIX "/usr")
 set(CPACK_STRIP_FILES ON)

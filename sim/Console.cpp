@@ -10,7 +10,9 @@
 #include <fstream>
 #include <iostream>
 #include <iterator>
+#include <optional>
 #include <thread>
+#include <unistd.h>
 
 namespace PylonSim {
 
@@ -45,6 +47,20 @@ Scenario _loadScenario() {
 void _wait(double seconds) {
     if (seconds > 0.0) {
         std::this_thread::sleep_for(std::chrono::duration<double>(seconds));
+    }
+}
+
+// A process that the tool starts and does not wait for, as a console action
+// may leave a helper running: it waits, prints nothing and ends.
+void _leaveChild(std::optional<double> const& seconds) {
+    if (!seconds) {
+        return;
+    }
+    std::cout.flush();
+    std::cerr.flush();
+    if (::fork() == 0) {
+        _wait(*seconds);
+        ::_exit(0);
     }
 }
 
@@ -112,6 +128,7 @@ int Console::_answerListing(std::string const& tool, std::vector<std::string> co
     Scenario const scenario = _loadScenario();
     std::string const name = tool == "lsvtc" ? "" : _identity(arguments);
     Response const response = scenario.find(tool, name);
+    _leaveChild(response.childDelay);
     _wait(response.delay.value_or(scenario.get_DefaultDelay()));
     return _print(response, "");
 }
@@ -127,6 +144,7 @@ int Console::_answerRemoteAction(std::vector<std::string> const& arguments) {
         return _print(unknown, "runact-api: unknown action \"" + request.get_Action() + "\"\n");
     }
     Response const response = scenario.find(request.get_Action(), request.get_PartitionID());
+    _leaveChild(response.childDelay);
     _wait(response.delay.value_or(scenario.get_DefaultDelay()));
     std::string const diagnostic =
         response.document ? _placeDocument(request, *response.document) : std::string();

@@ -5,8 +5,12 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <chrono>
+#include <csignal>
 #include <cstdlib>
+#include <string>
+#include <unistd.h>
 
 using QuorvexTest::CommandResult;
 using QuorvexTest::Invocation;
@@ -347,6 +351,22 @@ TEST(SimulatedConsole, DefaultDelayAppliesWhereASectionSetsNone) {
     double const remote = _secondsToRun({gc_Runact, "-c", "ZOR.ServiceEvent::::unknown"});
     EXPECT_GE(remote, 0.3);
     EXPECT_LT(_secondsToRun({gc_Runact, "-c", _remoteAction("runCmdOnPartition", "1")}), 0.3);
+}
+
+TEST(SimulatedConsole, ChildDelayLeavesAProcessRunningAfterTheAnswer) {
+    SimulatedConsole console("[lsvtc]\nstdout 0:A_B;\nchild-delay 30\n");
+    // An argument of its own makes the left process's command line unique.
+    std::string const commandLine =
+        std::string(gc_Lsvtc) + " -t0 left-child-" + std::to_string(::getpid());
+    CommandResult const found =
+        runShell(commandLine + " > /dev/null; echo $?; pgrep -f -x '" + commandLine + "'");
+    std::size_t const statusEnd = found.stdoutText.find('\n');
+    ASSERT_NE(std::string::npos, statusEnd) << found.stderrText;
+    EXPECT_EQ("0", found.stdoutText.substr(0, statusEnd)) << "the tool's own exit status";
+    std::string const left = found.stdoutText.substr(statusEnd + 1);
+    ASSERT_FALSE(left.empty()) << "no process left behind by the tool";
+    EXPECT_EQ(1, std::count(left.begin(), left.end(), '\n')) << "processes left: " << left;
+    EXPECT_EQ(0, ::kill(std::stoi(left), SIGKILL));
 }
 
 TEST(SimulatedConsole, MalformedScenarioIsRejectedNamingFileLineAndProblem) {

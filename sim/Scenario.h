@@ -15,6 +15,9 @@ struct Response {
     int exitCode = 0;
     // Seconds to wait before answering; unset takes the scenario's default.
     std::optional<double> delay;
+    // Seconds a child process that the tool starts and leaves behind waits
+    // before it ends; unset: no such child.
+    std::optional<double> childDelay;
     // The client document that getFileFromPartition places; unset: none.
     std::optional<std::string> document;
 };

@@ -103,6 +103,10 @@ void ScenarioParser::_parseLine(std::string const& line) {
         _parseDelay(value);
         return;
     }
+    if (key == "child-delay") {
+        _parseChildDelay(value);
+        return;
+    }
     _parseText(key, value);
 }
 
@@ -157,21 +161,35 @@ void ScenarioParser::_parseExitCode(std::string const& value) {
     _response.exitCode = static_cast<int>(code);
 }
 
-// Before the first section header the delay applies to every section.
-void ScenarioParser::_parseDelay(std::string const& value) {
-    _requireOnce("delay");
+// Seconds for "delay" or "child-delay": a number from 0 to 3600.
+double ScenarioParser::_parseSeconds(std::string const& key, std::string const& value) {
+    _requireOnce(key);
     std::string const text = _trimmed(value);
     char* end = nullptr;
     double const seconds = std::strtod(text.c_str(), &end);
     if (text.empty() || *end != '\0' || !std::isfinite(seconds) || seconds < 0.0 ||
         seconds > gc_MaximumDelay || text.find_first_of("xXnN") != std::string::npos) {
-        _fail("delay must be a number of seconds from 0 to 3600, not \"" + text + "\"");
+        _fail(key + " must be a number of seconds from 0 to 3600, not \"" + text + "\"");
     }
+    return seconds;
+}
+
+// Before the first section header the delay applies to every section.
+void ScenarioParser::_parseDelay(std::string const& value) {
+    double const seconds = _parseSeconds("delay", value);
     if (_tool.empty()) {
         _scenario._defaultDelay = seconds;
         return;
     }
     _response.delay = seconds;
+}
+
+void ScenarioParser::_parseChildDelay(std::string const& value) {
+    double const seconds = _parseSeconds("child-delay", value);
+    if (_tool.empty()) {
+        _fail("\"child-delay\" must follow a section header");
+    }
+    _response.childDelay = seconds;
 }
 
 void ScenarioParser::_parseText(std::string const& key, std::string const& value) {
@@ -185,7 +203,8 @@ void ScenarioParser::_parseText(std::string const& key, std::string const& value
         stream = Stream::Document;
     } else if (streamName != "stdout") {
         _fail("unknown key \"" + key +
-              "\" (expected stdout, stderr, document, their -nolf and -file forms, exit or delay)");
+              "\" (expected stdout, stderr, document, their -nolf and -file forms, exit, delay or "
+              "child-delay)");
     }
     if (formName != "" && formName != "nolf" && formName != "file") {
         _fail("unknown key \"" + key + "\" (a text key ends in nothing, -nolf or -file)");

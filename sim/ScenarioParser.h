@@ -26,6 +26,8 @@ private:
     void _closeSection();
     void _parseExitCode(std::string const& value);
     void _parseDelay(std::string const& value);
+    void _parseChildDelay(std::string const& value);
+    double _parseSeconds(std::string const& key, std::string const& value);
     void _parseText(std::string const& key, std::string const& value);
     void _requireOnce(std::string const& key);
     std::string _readBlock(std::string const& terminator);

@@ -157,7 +157,7 @@ TEST_F(ScenarioFile, ErrorNamesFileLineAndProblem) {
     EXPECT_EQ(
         path() +
             ":3: unknown key \"stdot\" (expected stdout, stderr, document, their -nolf and -file "
-            "forms, exit or delay)",
+            "forms, exit, delay or child-delay)",
         error.describe());
 }
 
@@ -222,6 +222,25 @@ TEST_F(ScenarioFile, BadDelayIsRejected) {
                   errorOf("[lsvtc]\ndelay " + value + "\n").problem)
             << value;
     }
+}
+
+TEST_F(ScenarioFile, ChildDelayIsReadPerSection) {
+    Scenario const scenario = load("[runCmdOnPartition 2]\nchild-delay 30\n[lsvtc]\n");
+    std::optional<double> const childDelay = scenario.find("runCmdOnPartition", "2").childDelay;
+    ASSERT_TRUE(childDelay);
+    EXPECT_EQ(30.0, *childDelay);
+    EXPECT_FALSE(scenario.find("lsvtc", "").childDelay);
+}
+
+TEST_F(ScenarioFile, ChildDelayBeforeTheFirstSectionIsRejected) {
+    EXPECT_EQ("\"child-delay\" must follow a section header", errorOf("child-delay 1\n").problem);
+}
+
+TEST_F(ScenarioFile, BadOrRepeatedChildDelayIsRejected) {
+    EXPECT_EQ("child-delay must be a number of seconds from 0 to 3600, not \"later\"",
+              errorOf("[lsvtc]\nchild-delay later\n").problem);
+    EXPECT_EQ("\"child-delay\" is given twice in this section",
+              errorOf("[lsvtc]\nchild-delay 1\nchild-delay 2\n").problem);
 }
 
 TEST_F(ScenarioFile, DocumentOutsideGetFileSectionsIsRejected) {

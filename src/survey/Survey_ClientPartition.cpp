@@ -8,6 +8,7 @@
 #include "system/DEBUG_System.h"
 #include "utility/Trace.h"
 
+#include <optional>
 #include <ostream>
 #include <sstream>
 
@@ -97,40 +98,81 @@ bool u_has_ChannelFailed(int const& result, ::Quorvex::RELAY::ReturnCode const& 
     return result != 0 || returnCode.get_Rc() != 0;
 }
 
-// One output entry of each kind for one partition.
-struct Outcome {
-    ::std::string fileName;
-    ::std::string returnCode;
-    ::std::string statusText;
-};
+using Outcome = PartitionOutcome;
+using OutcomeKind = PartitionOutcomeKind;
+using StopNote = Survey_ClientPartition::StopNote;
+
+::std::optional<int> u_get_Rc(::Quorvex::RELAY::ReturnCode const& returnCode) {
+    return returnCode.contains("Rc") ? ::std::optional<int>(returnCode.get_Rc()) : ::std::nullopt;
+}
+
+::std::optional<int> u_get_RcCmd(::Quorvex::RELAY::ReturnCode const& returnCode) {
+    return returnCode.contains("RcCmd") ? ::std::optional<int>(returnCode.get_RcCmd())
+                                        : ::std::nullopt;
+}
+
+// The stop note, when there is one, is one more line of the reason and ends
+// the partition's trace block.
+::std::string u_get_StopNote(StopNote const& stopNote) {
+    return stopNote ? stopNote() : ::std::string();
+}
+
+void u_write_DefaultDocument(::Quorvex::System::Partition const& partition,
+                             ResultNames const& names, ::std::string const& note,
+                             Outcome& outcome) {
+    if (!note.empty()) {
+        outcome.reason += note + "\n";
+    }
+    Survey_Utility::u_create_DefaultXML_forFailedPartition(partition, outcome.reason,
+                                                           names.localResult);
+    if (!note.empty()) {
+        g_Trace << note << ::std::endl;
+    }
+}
 
 Outcome u_record_ClientFailure(::Quorvex::System::Partition const& partition,
                                ResultNames const& names, int const& result,
-                               ::Quorvex::RELAY::ReturnCode const& returnCode) {
+                               ::Quorvex::RELAY::ReturnCode const& returnCode,
+                               StopNote const& stopNote) {
     bool const channelFailed = u_has_ChannelFailed(result, returnCode);
-    ::std::string const reason = ::std::string(gc_NotSurveyedReason) +
-                                 (channelFailed ? gc_ChannelFailedReason : gc_ClientFailedReason) +
-                                 Survey_Utility::u_transform_RELAY_ReturnCode_2_String(returnCode);
-    Survey_Utility::u_create_DefaultXML_forFailedPartition(partition, reason, names.localResult);
-    ::std::string const status =
+    Outcome outcome;
+    outcome.reason = ::std::string(gc_NotSurveyedReason) +
+                     (channelFailed ? gc_ChannelFailedReason : gc_ClientFailedReason) +
+                     Survey_Utility::u_transform_RELAY_ReturnCode_2_String(returnCode);
+    u_write_DefaultDocument(partition, names, u_get_StopNote(stopNote), outcome);
+    outcome.statusText =
         channelFailed
             ? u_write_OverSeed(gc_ClientFailedSeed, gc_ChannelFailed, returnCode.get_Rc())
             : u_write_OverSeed(gc_ClientFailedSeed, gc_ClientFailed, returnCode.get_RcCmd());
-    return {names.localResult, gc_NotSurveyed, status};
+    outcome.fileName = names.localResult;
+    outcome.returnCode = gc_NotSurveyed;
+    outcome.kind = channelFailed ? OutcomeKind::ChannelFailure : OutcomeKind::ClientFailure;
+    outcome.rc = u_get_Rc(returnCode);
+    outcome.rcCmd = u_get_RcCmd(returnCode);
+    return outcome;
 }
 
 Outcome u_record_FetchFailure(::Quorvex::System::Partition const& partition,
                               ResultNames const& names,
-                              ::Quorvex::RELAY::ReturnCode const& returnCode) {
-    ::std::string const reason = ::std::string(gc_FetchFailedReason) +
-                                 Survey_Utility::u_transform_RELAY_ReturnCode_2_String(returnCode);
-    Survey_Utility::u_create_DefaultXML_forFailedPartition(partition, reason, names.localResult);
-    return {names.localResult, gc_NotSurveyed,
-            u_write_OverSeed(gc_FetchFailedSeed, "", returnCode.get_Rc())};
+                              ::Quorvex::RELAY::ReturnCode const& clientCode,
+                              ::Quorvex::RELAY::ReturnCode const& returnCode,
+                              StopNote const& stopNote) {
+    Outcome outcome;
+    outcome.reason = ::std::string(gc_FetchFailedReason) +
+                     Survey_Utility::u_transform_RELAY_ReturnCode_2_String(returnCode);
+    u_write_DefaultDocument(partition, names, u_get_StopNote(stopNote), outcome);
+    outcome.statusText = u_write_OverSeed(gc_FetchFailedSeed, "", returnCode.get_Rc());
+    outcome.fileName = names.localResult;
+    outcome.returnCode = gc_NotSurveyed;
+    outcome.kind = OutcomeKind::FetchFailure;
+    outcome.rc = u_get_Rc(returnCode);
+    outcome.rcCmd = u_get_RcCmd(clientCode);
+    return outcome;
 }
 
 // Runs the client survey on the partition, then fetches its result.
-Outcome u_survey_ActivePartition(::Quorvex::System::Partition const& partition) {
+Outcome u_survey_ActivePartition(::Quorvex::System::Partition const& partition,
+                                 StopNote const& stopNote) {
     u_trace_Banner();
     ::Quorvex::RELAY::Interface relay{::Quorvex::RELAY::TargetPartition(partition)};
     u_trace_Partition(partition);
@@ -142,34 +184,46 @@ Outcome u_survey_ActivePartition(::Quorvex::System::Partition const& partition) 
     // Copies: the next operation replaces the interface's return codes.
     ::Quorvex::RELAY::ReturnCode const clientCode = relay.get_ReturnCode();
     if (u_has_ClientFailed(clientResult, clientCode)) {
-        return u_record_ClientFailure(partition, names, clientResult, clientCode);
+        return u_record_ClientFailure(partition, names, clientResult, clientCode, stopNote);
     }
 
     g_Trace << "\n\n\t 2.  > > > Get VPD Survey Result < < < \n";
     int const fetchResult = relay.getFileFromPartition(names.remoteResult, names.localResult);
     ::Quorvex::RELAY::ReturnCode const fetchCode = relay.get_ReturnCode();
     if (u_has_ChannelFailed(fetchResult, fetchCode)) {
-        return u_record_FetchFailure(partition, names, fetchCode);
+        return u_record_FetchFailure(partition, names, clientCode, fetchCode, stopNote);
     }
-    return {names.localResult, gc_Surveyed, gc_Ok};
-}
-
-// An inactive partition is skipped: no trace text, no file.
-Outcome u_survey_Partition(::Quorvex::System::Partition const& partition) {
-    if (Survey_Utility::_u_get_ActiveStatus(partition) <= gc_HighestInactiveStatus) {
-        return {"", gc_NotSurveyed, gc_Inactive};
-    }
-    return u_survey_ActivePartition(partition);
+    Outcome outcome;
+    outcome.fileName = names.localResult;
+    outcome.returnCode = gc_Surveyed;
+    outcome.statusText = gc_Ok;
+    outcome.kind = OutcomeKind::Surveyed;
+    outcome.rc = u_get_Rc(fetchCode);
+    outcome.rcCmd = u_get_RcCmd(clientCode);
+    return outcome;
 }
 
 } // namespace
+
+// An inactive partition is skipped: no trace text, no file.
+PartitionOutcome
+Survey_ClientPartition::survey_Partition(::Quorvex::System::Partition const& partition,
+                                         StopNote const& stopNote) {
+    if (Survey_Utility::_u_get_ActiveStatus(partition) <= gc_HighestInactiveStatus) {
+        Outcome outcome;
+        outcome.returnCode = gc_NotSurveyed;
+        outcome.statusText = gc_Inactive;
+        return outcome;
+    }
+    return u_survey_ActivePartition(partition, stopNote);
+}
 
 void Survey_ClientPartition::operator()(::Quorvex::PYLON::ListOf_Partitions const& partitions,
                                         ::std::vector<::std::string>& fileNames,
                                         ::std::vector<::std::string>& returnCodes,
                                         ::std::vector<::std::string>& statusTexts) const {
     for (::Quorvex::System::Partition const& partition : partitions) {
-        Outcome const outcome = u_survey_Partition(partition);
+        Outcome const outcome = survey_Partition(partition);
         fileNames.push_back(outcome.fileName);
         returnCodes.push_back(outcome.returnCode);
         statusTexts.push_back(outcome.statusText);

@@ -1,7 +1,10 @@
 #pragma once
 
 #include "pylon/ListOf_Partitions.h"
+#include "survey/PartitionOutcome.h"
+#include "system/Partition.h"
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -21,6 +24,16 @@ public:
                     ::std::vector<::std::string>& fileNames,
                     ::std::vector<::std::string>& returnCodes,
                     ::std::vector<::std::string>& statusTexts) const;
+
+    // Gives the line that says why a remote action of the partition was
+    // stopped from outside, or "" when none was.
+    using StopNote = ::std::function<::std::string()>;
+
+    // Surveys one partition as the loop does. A stop note, when it gives a
+    // line for a partition that gets a default document, is appended to the
+    // document's reason and written to the trace after the document.
+    static PartitionOutcome survey_Partition(::Quorvex::System::Partition const& partition,
+                                             StopNote const& stopNote = {});
 };
 
 } // namespace Quorvex::PYLON::VPD

@@ -11,6 +11,7 @@
 #include <algorithm>
 #include <iostream>
 #include <iterator>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -378,6 +379,111 @@ TEST_F(Survey_ClientPartition, TwoPartitionsOfOneIdentityShareTheirLocalFile) {
     EXPECT_EQ(run.outcomes, failed + failed);
     EXPECT_NE(u_document("3").find("displayName=\"second\""), std::string::npos);
     EXPECT_EQ(u_document("3").find("displayName=\"first\""), std::string::npos);
+}
+
+// What surveying one partition on its own left: the outcome's kind and
+// codes ("-" when unknown), whether the stop note was asked for, the reason,
+// and the trace.
+struct OneRun {
+    std::string outcome;
+    std::string reason;
+    std::string trace;
+};
+
+OneRun u_run_One(std::string const& scenario, Quorvex::System::Partition const& partition,
+                 std::string const& note) {
+    QuorvexTest::SimulatedConsole const console(scenario);
+    QuorvexTest::TemporaryDirectory const traceFolder;
+    std::string const tracePath = traceFolder.file("survey.Trace");
+    QuorvexTest::CommandResult const child =
+        QuorvexTest::runTracedInChild(tracePath, [&partition, &note]() {
+            bool asked = false;
+            Quorvex::PYLON::VPD::PartitionOutcome const outcome =
+                Quorvex::PYLON::VPD::Survey_ClientPartition::survey_Partition(partition,
+                                                                              [&asked, &note] {
+                                                                                  asked = true;
+                                                                                  return note;
+                                                                              });
+            auto const code = [](std::optional<int> const& value) {
+                return value ? std::to_string(*value) : std::string("-");
+            };
+            std::cout << outcome.fileName << "|" << outcome.returnCode << "|" << outcome.statusText
+                      << "|" << static_cast<int>(outcome.kind) << "|" << code(outcome.rc) << "|"
+                      << code(outcome.rcCmd) << "|" << (asked ? "asked" : "not asked") << "\n"
+                      << outcome.reason;
+            return 0;
+        });
+    EXPECT_EQ(child.exitStatus, 0);
+    std::size_t const lineEnd = child.stdoutText.find('\n');
+    return {child.stdoutText.substr(0, lineEnd), child.stdoutText.substr(lineEnd + 1),
+            QuorvexTest::normaliseTemporaryNames(QuorvexTest::readFile(tracePath),
+                                                 QuorvexTest::TemporaryNames::Numbered)};
+}
+
+constexpr char gc_Note[] = "Stopped by the time limit of 2 s after 2.0 s.";
+
+TEST_F(Survey_ClientPartition, OnePartitionSurveyedGivesBothCodesAndNoReason) {
+    OneRun const run =
+        u_run_One(std::string(gc_ClientOk) + gc_FetchOk, u_make_Partition("1", "3", "h1"), "");
+    EXPECT_EQ(run.outcome, u_local_File("1") + "|0|Ok|0|0|0|not asked");
+    EXPECT_EQ(run.reason, "");
+}
+
+TEST_F(Survey_ClientPartition, OneInactivePartitionHasNoCodesAndNoTrace) {
+    OneRun const run = u_run_One(gc_ClientOk, u_make_Partition("1", "1", "h1"), gc_Note);
+    EXPECT_EQ(run.outcome, "|8|Failed - Active Status < 3|1|-|-|not asked");
+    EXPECT_EQ(run.trace, "");
+}
+
+TEST_F(Survey_ClientPartition, OnePartitionWithChannelFailureGivesTheClientRunsCodes) {
+    OneRun const run = u_run_One("[runCmdOnPartition *]\n"
+                                 "stdout Rc::1::RcCmd::0::RetStr1::timeout::RetStr2::\n",
+                                 u_make_Partition("1", "3", "h1"), "");
+    EXPECT_EQ(run.outcome, u_local_File("1") + "|8|RELAY Failed, rc = 1|2|1|0|asked");
+    EXPECT_EQ(run.reason.rfind("Partition not surveyed, reason: \nRELAY Failed.\n", 0), 0U);
+}
+
+TEST_F(Survey_ClientPartition, OnePartitionWithClientFailureGivesItsRcCmd) {
+    OneRun const run = u_run_One("[runCmdOnPartition *]\n"
+                                 "stdout Rc::0::RcCmd::5::RetStr1::x::RetStr2::\n",
+                                 u_make_Partition("1", "3", "h1"), "");
+    EXPECT_EQ(run.outcome, u_local_File("1") + "|8|Partition Failed, RcCmd = 5|3|0|5|asked");
+}
+
+TEST_F(Survey_ClientPartition, OnePartitionWithFetchFailureGivesTheFetchRcAndTheClientRcCmd) {
+    OneRun const run =
+        u_run_One(std::string(gc_ClientOk) + "[getFileFromPartition *]\n"
+                                             "stdout Rc::3::RcCmd::7::RetStr1::x::RetStr2::\n",
+                  u_make_Partition("1", "3", "h1"), "");
+    EXPECT_EQ(run.outcome, u_local_File("1") + "|8|3et result Failed, rc = |4|3|0|asked");
+    EXPECT_EQ(run.reason.rfind("Unable to get File From Partition : \n", 0), 0U);
+}
+
+TEST_F(Survey_ClientPartition, StopNoteEndsTheReasonTheDocumentAndTheTraceBlock) {
+    // A client run stopped from outside ends without printing anything.
+    OneRun const run =
+        u_run_One("[runCmdOnPartition *]\n", u_make_Partition("1", "3", "h1"), gc_Note);
+    EXPECT_EQ(run.outcome, u_local_File("1") + "|8|RELAY Failed, rc = 4294967295|2|-|-|asked");
+    EXPECT_EQ(run.reason, std::string("Partition not surveyed, reason: \nRELAY Failed.\n\n\n\n") +
+                              gc_Note + "\n");
+    EXPECT_NE(u_document("1").find(std::string("\n") + gc_Note + "\n"), std::string::npos);
+    std::string const lastLine = std::string(gc_Note) + "\n";
+    ASSERT_GE(run.trace.size(), lastLine.size());
+    EXPECT_EQ(run.trace.substr(run.trace.size() - lastLine.size()), lastLine);
+}
+
+TEST_F(Survey_ClientPartition, EmptyStopNoteChangesNothing) {
+    OneRun const withEmptyNote =
+        u_run_One("[runCmdOnPartition *]\n", u_make_Partition("1", "3", "h1"), "");
+    std::string const document = u_document("1");
+    LoopRun const loop = u_run_Loop("[runCmdOnPartition *]\n", [] {
+        Quorvex::PYLON::ListOf_Partitions partitions;
+        partitions.push_back(u_make_Partition("1", "3", "h1"));
+        return partitions;
+    }());
+    EXPECT_EQ(withEmptyNote.trace, loop.trace);
+    EXPECT_EQ(withEmptyNote.reason, "Partition not surveyed, reason: \nRELAY Failed.\n\n\n\n");
+    EXPECT_EQ(document.size(), u_document("1").size());
 }
 
 } // namespace

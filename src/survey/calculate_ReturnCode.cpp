@@ -5,9 +5,7 @@
 #include <algorithm>
 #include <iostream>
 
-namespace {
-
-char const* u_get_OverallCode(std::vector<std::string> const& returnCodes) {
+char const* get_OverallCode(std::vector<std::string> const& returnCodes) {
     auto const surveyed = std::count(returnCodes.begin(), returnCodes.end(), "0");
     // Tested first, so that an empty sequence gives "8" too.
     // Kept for the console's scripts: see docs/compatibility.md#overall-code
@@ -20,10 +18,8 @@ char const* u_get_OverallCode(std::vector<std::string> const& returnCodes) {
     return "4";
 }
 
-} // namespace
-
 void calculate_ReturnCode(std::vector<std::string> const& returnCodes) {
     std::cerr << std::endl << Quorvex::PYLON::VPD::gc_ProgramName << " ReturnCode: " << std::endl;
-    std::cerr << u_get_OverallCode(returnCodes);
+    std::cerr << get_OverallCode(returnCodes);
     std::cerr.flush();
 }

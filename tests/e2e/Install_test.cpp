@@ -15,6 +15,7 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr char gc_Tool[] = "quorvexPYLON_VPD_Survey_ClientPartition";
+constexpr char gc_FleetProgram[] = "quorvex-survey";
 constexpr int gc_SandboxUnavailable = 77;
 
 // Installs the build tree with DESTDIR set to destDir and the given extra
@@ -63,6 +64,17 @@ TEST(SurveyInstallation, ManualPageCarriesTheProjectVersionAndNoPlaceholder) {
                   "\"");
     EXPECT_NE(page.find("\" -pylonv " + version + "\"\n"), std::string::npos);
     EXPECT_EQ(page.find('@'), std::string::npos);
+}
+
+TEST(SurveyInstallation, InstallsTheConsoleWideSurveyAndItsManualPageBesideTheTool) {
+    std::string const destDir = std::string(QUORVEX_INSTALL_SCRATCH) + "/fleet";
+    QuorvexTest::CommandResult const install = u_install(destDir, {"--prefix", "/opt/quorvex"});
+    ASSERT_EQ(install.exitStatus, 0) << install.stdoutText << install.stderrText;
+    EXPECT_TRUE(u_is_ExecutableFile(destDir + "/opt/quorvex/bin/" + gc_FleetProgram));
+    std::string const manualPage =
+        destDir + "/opt/quorvex/share/man/man8/" + gc_FleetProgram + ".8";
+    ASSERT_TRUE(QuorvexTest::fileExists(manualPage));
+    EXPECT_EQ(QuorvexTest::readFile(manualPage), QuorvexTest::readFile(QUORVEX_FLEET_MANUAL_PAGE));
 }
 
 TEST(SurveyInstallation, ConfiguredPrefixIsUsedWithoutAPrefixArgument) {

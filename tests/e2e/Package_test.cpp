@@ -25,6 +25,8 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr char gc_Tool[] = "quorvexPYLON_VPD_Survey_ClientPartition";
+// The console-wide survey that the package carries beside the tool.
+constexpr char gc_FleetProgram[] = "quorvex-survey";
 constexpr char gc_PackageName[] = "quorvex-pylon-vpd-survey";
 constexpr int gc_SandboxUnavailable = 77;
 
@@ -80,14 +82,18 @@ std::vector<std::string> u_paths(std::map<std::string, std::string> const& entri
 void u_expect_Contents(std::string const& package) {
     std::string const tool = std::string("./usr/bin/") + gc_Tool;
     std::string const manualPage = std::string("./usr/share/man/man8/") + gc_Tool + ".8";
+    std::string const program = std::string("./usr/bin/") + gc_FleetProgram;
+    std::string const programPage = std::string("./usr/share/man/man8/") + gc_FleetProgram + ".8";
     std::map<std::string, std::string> const entries = u_package_Contents(package);
     std::vector<std::string> const expected{
         "./usr/",
         "./usr/bin/",
+        program,
         tool,
         "./usr/share/",
         "./usr/share/man/",
         "./usr/share/man/man8/",
+        programPage,
         manualPage,
         "./var/",
         "./var/adm/",
@@ -98,6 +104,8 @@ void u_expect_Contents(std::string const& package) {
     ASSERT_EQ(u_paths(entries), expected);
     EXPECT_EQ(entries.at(tool), "-rwxr-xr-x");
     EXPECT_EQ(entries.at(manualPage), "-rw-r--r--");
+    EXPECT_EQ(entries.at(program), "-rwxr-xr-x");
+    EXPECT_EQ(entries.at(programPage), "-rw-r--r--");
     EXPECT_EQ(entries.at("./var/adm/quorvex/Trace/"), "drwxr-xr-x");
     EXPECT_EQ(entries.at("./var/adm/quorvex/VPD/"), "drwxr-xr-x");
 }
@@ -126,13 +134,22 @@ void u_expect_Unpacked(std::string const& root) {
     std::string const manualPage = root + "/usr/share/man/man8/" + gc_Tool + ".8";
     ASSERT_TRUE(QuorvexTest::fileExists(manualPage));
     EXPECT_EQ(QuorvexTest::readFile(manualPage), QuorvexTest::readFile(QUORVEX_MANUAL_PAGE));
+    std::string const programPage = root + "/usr/share/man/man8/" + gc_FleetProgram + ".8";
+    ASSERT_TRUE(QuorvexTest::fileExists(programPage));
+    EXPECT_EQ(QuorvexTest::readFile(programPage), QuorvexTest::readFile(QUORVEX_FLEET_MANUAL_PAGE));
+    QuorvexTest::CommandResult const version =
+        QuorvexTest::runCommand({root + "/usr/bin/" + gc_FleetProgram, "--version"});
+    EXPECT_EQ(version.exitStatus, 0);
+    EXPECT_EQ(version.stdoutText,
+              std::string(gc_FleetProgram) + " " + QUORVEX_PACKAGE_VERSION + "\n");
     for (char const* folder : {QuorvexTest::gc_VPD_Folder, QuorvexTest::gc_TraceFolder}) {
         EXPECT_TRUE(fs::is_directory(root + folder)) << folder;
         EXPECT_EQ(QuorvexTest::listFolder(root + folder), std::vector<std::string>{}) << folder;
     }
 }
 
-TEST(SurveyPackage, DebianPackageInstallsToolManualPageAndFoldersAndItsToolSurveysTheDemo) {
+TEST(SurveyPackage,
+     DebianPackageInstallsBothProgramsManualPagesAndFoldersAndItsToolSurveysTheDemo) {
     std::string const scratch = QUORVEX_PACKAGE_SCRATCH;
     std::error_code ignored;
     fs::remove_all(scratch, ignored);

@@ -1,0 +1,198 @@
+#include "fleet/ChildProcess.h"
+
+#include "fleet/ProcessTree.h"
+
+#include <fcntl.h>
+#include <sys/mman.h>
+#include <sys/prctl.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <csignal>
+#include <cstring>
+#include <iostream>
+#include <new>
+
+namespace Fleet {
+
+ChildProcess::Slot* ChildProcess::ms_ownSlot = nullptr;
+
+namespace {
+
+void writeAll(int descriptor, std::string const& text) {
+    std::size_t written = 0;
+    while (written < text.size()) {
+        ssize_t const n = write(descriptor, text.data() + written, text.size() - written);
+        if (n < 0 && errno == EINTR) {
+            continue;
+        }
+        if (n <= 0) {
+            return;
+        }
+        written += static_cast<std::size_t>(n);
+    }
+}
+
+// The child starts with the signal dispositions a plain program has.
+void restoreDefaultSignals() {
+    std::signal(SIGINT, SIG_DFL);
+    std::signal(SIGTERM, SIG_DFL);
+    std::signal(SIGPIPE, SIG_DFL);
+}
+
+} // namespace
+
+ChildProcess::ChildProcess(Body const& body) {
+    // An anonymous mapping takes -1 as its descriptor.
+    void* memory =
+        // cppcheck-suppress invalidFunctionArg
+        mmap(nullptr, sizeof(Slot), PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0);
+    if (memory == MAP_FAILED) {
+        return;
+    }
+    _slot = new (memory) Slot{};
+    int ends[2];
+    // Close-on-exec: the commands the child runs must not hold the pipe open.
+    if (pipe2(ends, O_CLOEXEC) != 0) {
+        return;
+    }
+    // Nothing buffered in the parent may be written twice by a child.
+    std::cout.flush();
+    std::cerr.flush();
+    _pid = fork();
+    if (_pid == 0) {
+        close(ends[0]);
+        _runChild(body, ends[1]);
+    }
+    close(ends[1]);
+    if (_pid < 0) {
+        close(ends[0]);
+        return;
+    }
+    _readEnd = ends[0];
+    fcntl(_readEnd, F_SETFL, fcntl(_readEnd, F_GETFL) | O_NONBLOCK);
+}
+
+void ChildProcess::_runChild(Body const& body, int writeEnd) {
+    restoreDefaultSignals();
+    setpgid(0, 0);
+    prctl(PR_SET_CHILD_SUBREAPER, 1);
+    ms_ownSlot = _slot;
+    try {
+        writeAll(writeEnd, body());
+    } catch (...) {
+        _exit(1);
+    }
+    close(writeEnd);
+    // Adopted orphans of a stopped action are reaped before the child goes.
+    while (waitpid(-1, nullptr, WNOHANG) > 0) {
+    }
+    _exit(0);
+}
+
+ChildProcess::~ChildProcess() {
+    killAndReap();
+    if (_readEnd >= 0) {
+        close(_readEnd);
+    }
+    if (_slot != nullptr) {
+        munmap(_slot, sizeof(Slot));
+    }
+}
+
+bool ChildProcess::isStarted() const {
+    return _pid > 0;
+}
+
+pid_t ChildProcess::pid() const {
+    return _pid;
+}
+
+int ChildProcess::resultDescriptor() const {
+    return _readEnd;
+}
+
+bool ChildProcess::readAvailable() {
+    if (_readEnd < 0) {
+        return false;
+    }
+    char buffer[65536];
+    while (true) {
+        ssize_t const n = read(_readEnd, buffer, sizeof buffer);
+        if (n > 0) {
+            _result.append(buffer, static_cast<std::size_t>(n));
+            continue;
+        }
+        if (n < 0 && errno == EINTR) {
+            continue;
+        }
+        if (n < 0 && errno == EAGAIN) {
+            return true;
+        }
+        close(_readEnd);
+        _readEnd = -1;
+        return false;
+    }
+}
+
+std::string const& ChildProcess::result() const {
+    return _result;
+}
+
+bool ChildProcess::reap() {
+    if (_reaped || _pid <= 0) {
+        return true;
+    }
+    int status = 0;
+    pid_t const ended = waitpid(_pid, &status, WNOHANG);
+    if (ended == _pid || (ended < 0 && errno == ECHILD)) {
+        _reaped = true;
+    }
+    return _reaped;
+}
+
+void ChildProcess::markReaped() {
+    _reaped = true;
+}
+
+bool ChildProcess::isReaped() const {
+    return _reaped || _pid <= 0;
+}
+
+void ChildProcess::killAndReap() {
+    if (isReaped()) {
+        return;
+    }
+    // Stopped first, so that it starts nothing while what it started is killed.
+    int status = 0;
+    if (!ProcessTree::stopChild(_pid, status)) {
+        _reaped = true;
+        return;
+    }
+    ProcessTree::killDescendants(_pid);
+    kill(_pid, SIGKILL);
+    while (waitpid(_pid, nullptr, 0) < 0 && errno == EINTR) {
+    }
+    _reaped = true;
+}
+
+std::string ChildProcess::stopNote() {
+    if (ms_ownSlot == nullptr || ms_ownSlot->hasNote.load() == 0) {
+        return "";
+    }
+    return std::string(ms_ownSlot->note);
+}
+
+void ChildProcess::setStopNote(std::string const& note) {
+    if (_slot == nullptr) {
+        return;
+    }
+    std::size_t const length = std::min(note.size(), sizeof(_slot->note) - 1);
+    std::memcpy(_slot->note, note.data(), length);
+    _slot->note[length] = '\0';
+    _slot->hasNote.store(1);
+}
+
+} // namespace Fleet

@@ -1,0 +1,63 @@
+#pragma once
+
+#include <sys/types.h>
+
+#include <atomic>
+#include <functional>
+#include <string>
+
+namespace Fleet {
+
+// One unit of work run in a forked process of its own. The child runs in a
+// process group of its own (a terminal's Ctrl-C reaches only the run's
+// parent), adopts the orphans of what it starts (so a stopped action's
+// processes stay findable under it), writes its result text into a pipe and
+// ends with _exit. A shared slot made before the fork lets the parent tell
+// the child, while it is stopped, why one of its actions was stopped.
+class ChildProcess {
+public:
+    using Body = std::function<std::string()>;
+
+    // Forks and runs body in the child; its returned text is the result.
+    explicit ChildProcess(Body const& body);
+    ~ChildProcess();
+    ChildProcess(ChildProcess const&) = delete;
+    ChildProcess& operator=(ChildProcess const&) = delete;
+
+    bool isStarted() const;
+    pid_t pid() const;
+    // The reading end of the result pipe, non-blocking; -1 once at its end.
+    int resultDescriptor() const;
+    // Reads what the pipe holds now; false once it is at its end.
+    bool readAvailable();
+    std::string const& result() const;
+    // Reaps the child when it has ended; true once reaped.
+    bool reap();
+    // The parent has reaped the child elsewhere (while stopping it).
+    void markReaped();
+    bool isReaped() const;
+    // Kills a child that is still there, with everything it started, and reaps it.
+    void killAndReap();
+
+    // The line the parent leaves in the slot; read by the child itself.
+    static std::string stopNote();
+    // Leaves the line in the slot of this child (parent side).
+    void setStopNote(std::string const& note);
+
+private:
+    struct Slot {
+        std::atomic<int> hasNote;
+        char note[240];
+    };
+    static Slot* ms_ownSlot;
+
+    [[noreturn]] void _runChild(Body const& body, int writeEnd);
+
+    pid_t _pid = -1;
+    int _readEnd = -1;
+    Slot* _slot = nullptr;
+    std::string _result;
+    bool _reaped = false;
+};
+
+} // namespace Fleet

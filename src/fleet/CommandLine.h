@@ -1,0 +1,49 @@
+#pragma once
+
+#include "report/ReportCommand.h"
+
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace Fleet {
+
+// The run's options as given on the command line.
+struct Options {
+    std::size_t jobs = 8;
+    // Seconds one remote action may take; 0 for no limit.
+    unsigned int timeoutSeconds = 1800;
+    std::string summaryFile;
+    // --report DIR: the run's report is written there.
+    std::string reportFolder;
+    bool quiet = false;
+    bool all = false;
+    // As given, an identity given more than once kept at its first place.
+    std::vector<std::string> identities;
+};
+
+// Reads the command line with CLI11. A bad command line prints its reason
+// and the usage on standard error and ends the program with 64 before
+// anything runs; --help and --version print on standard output and end it
+// with 0.
+class CommandLine {
+public:
+    struct Parsed {
+        Options options;
+        // Set when the program ends here with this status.
+        std::optional<int> exitStatus;
+        // Warnings to print on standard error before anything else.
+        std::vector<std::string> warnings;
+        // Set for "report [--from VPD_FOLDER] DIR", which surveys nothing.
+        std::optional<report::ReportRequest> reportRequest;
+    };
+
+    static constexpr int gc_ExitUsage = 64;
+
+    static Parsed parse(int argc, char const* const* argv);
+
+private:
+    static void _keepFirstOfEach(Parsed& parsed);
+};
+
+} // namespace Fleet

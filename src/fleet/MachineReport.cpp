@@ -1,0 +1,47 @@
+#include "fleet/MachineReport.h"
+
+#include "survey/calculate_ReturnCode.h"
+
+#include <algorithm>
+#include <iostream>
+#include <iterator>
+
+namespace Fleet {
+
+namespace {
+
+constexpr char gc_NoPartitions[] = "No ACTIVE Partition Found.\n";
+
+} // namespace
+
+void MachineReport::print(MachineRecord const& machine) {
+    for (auto const& record : machine.partitions) {
+        if (!record.outcome.fileName.empty()) {
+            std::cout << record.outcome.fileName << std::endl;
+            std::cerr << record.outcome.returnCode << std::endl;
+        }
+    }
+    calculate_ReturnCode(returnCodes(machine));
+}
+
+std::string MachineReport::statusText(MachineRecord const& machine) {
+    if (machine.partitions.empty()) {
+        return gc_NoPartitions;
+    }
+    std::string text;
+    for (auto const& record : machine.partitions) {
+        text += record.partition.get_HostName() + " [" + record.partition.get_IP() +
+                "] - VPD Survey - " + record.outcome.statusText + "\n";
+    }
+    return text;
+}
+
+std::vector<std::string> MachineReport::returnCodes(MachineRecord const& machine) {
+    std::vector<std::string> codes;
+    codes.reserve(machine.partitions.size());
+    std::transform(machine.partitions.begin(), machine.partitions.end(), std::back_inserter(codes),
+                   [](PartitionRecord const& record) { return record.outcome.returnCode; });
+    return codes;
+}
+
+} // namespace Fleet

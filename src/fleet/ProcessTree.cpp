@@ -1,0 +1,170 @@
+#include "fleet/ProcessTree.h"
+
+#include <fcntl.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <chrono>
+#include <csignal>
+#include <ctime>
+#include <filesystem>
+#include <sstream>
+#include <thread>
+
+namespace Fleet {
+
+namespace {
+
+// A tree of processes that keeps forking is still killed within this many rounds.
+constexpr int gc_KillRounds = 1000;
+constexpr auto gc_PauseBetweenRounds = std::chrono::milliseconds(1);
+
+// Read with plain read(): a /proc file of a process that ends while it is read
+// fails with an error, which then only ends the text.
+std::string readWholeFile(std::string const& path) {
+    std::string text;
+    int const descriptor = open(path.c_str(), O_RDONLY | O_CLOEXEC);
+    if (descriptor < 0) {
+        return text;
+    }
+    char buffer[4096];
+    while (true) {
+        ssize_t const n = read(descriptor, buffer, sizeof buffer);
+        if (n < 0 && errno == EINTR) {
+            continue;
+        }
+        if (n <= 0) {
+            break;
+        }
+        text.append(buffer, static_cast<std::size_t>(n));
+    }
+    close(descriptor);
+    return text;
+}
+
+std::string procPath(pid_t pid, char const* name) {
+    return "/proc/" + std::to_string(pid) + "/" + name;
+}
+
+std::vector<std::string> threadsOf(pid_t pid) {
+    std::vector<std::string> threads;
+    std::error_code error;
+    for (std::filesystem::directory_iterator entry(procPath(pid, "task"), error), end;
+         !error && entry != end; entry.increment(error)) {
+        threads.push_back(entry->path().filename().string());
+    }
+    return threads;
+}
+
+double secondsSinceBoot() {
+    timespec now{};
+    clock_gettime(CLOCK_BOOTTIME, &now);
+    return static_cast<double>(now.tv_sec) + static_cast<double>(now.tv_nsec) / 1e9;
+}
+
+} // namespace
+
+std::vector<pid_t> ProcessTree::childrenOf(pid_t pid) {
+    std::vector<pid_t> children;
+    for (auto const& thread : threadsOf(pid)) {
+        std::istringstream list(readWholeFile(procPath(pid, "task/") + thread + "/children"));
+        pid_t child = 0;
+        while (list >> child) {
+            children.push_back(child);
+        }
+    }
+    return children;
+}
+
+std::vector<pid_t> ProcessTree::descendantsOf(pid_t pid) {
+    std::vector<pid_t> found = childrenOf(pid);
+    for (std::size_t i = 0; i < found.size(); ++i) {
+        std::vector<pid_t> const grandchildren = childrenOf(found[i]);
+        found.insert(found.end(), grandchildren.begin(), grandchildren.end());
+    }
+    return found;
+}
+
+std::string ProcessTree::commandLineOf(pid_t pid) {
+    std::string text = readWholeFile(procPath(pid, "cmdline"));
+    std::replace(text.begin(), text.end(), '\0', ' ');
+    return text;
+}
+
+std::optional<std::string> ProcessTree::_statFields(pid_t pid) {
+    std::string const stat = readWholeFile(procPath(pid, "stat"));
+    // The command name in parentheses may hold blanks and parentheses itself.
+    std::size_t const end = stat.rfind(')');
+    if (end == std::string::npos || end + 2 > stat.size()) {
+        return std::nullopt;
+    }
+    return stat.substr(end + 2);
+}
+
+std::optional<double> ProcessTree::ageOf(pid_t pid) {
+    std::optional<std::string> const fields = _statFields(pid);
+    if (!fields) {
+        return std::nullopt;
+    }
+    // After the name: state is field 3, start time (clock ticks after boot) field 22.
+    std::istringstream stream(*fields);
+    std::string field;
+    for (int index = 3; index < 22 && stream >> field; ++index) {
+    }
+    unsigned long long startTicks = 0;
+    if (!(stream >> startTicks)) {
+        return std::nullopt;
+    }
+    double const started =
+        static_cast<double>(startTicks) / static_cast<double>(sysconf(_SC_CLK_TCK));
+    double const age = secondsSinceBoot() - started;
+    return age < 0 ? 0.0 : age;
+}
+
+bool ProcessTree::hasEnded(pid_t pid) {
+    std::optional<std::string> const fields = _statFields(pid);
+    return !fields || fields->empty() || (*fields)[0] == 'Z' || (*fields)[0] == 'X';
+}
+
+bool ProcessTree::stopChild(pid_t child, int& exitStatus) {
+    if (kill(child, SIGSTOP) != 0) {
+        return false;
+    }
+    while (true) {
+        int status = 0;
+        pid_t const result = waitpid(child, &status, WUNTRACED);
+        if (result == child && WIFSTOPPED(status)) {
+            return true;
+        }
+        if (result == child) {
+            exitStatus = status;
+            return false;
+        }
+        if (result < 0 && errno != EINTR) {
+            return false;
+        }
+    }
+}
+
+std::size_t ProcessTree::killDescendants(pid_t root) {
+    std::size_t signalsSent = 0;
+    for (int round = 0; round < gc_KillRounds; ++round) {
+        bool anyAlive = false;
+        for (pid_t pid : descendantsOf(root)) {
+            if (!hasEnded(pid)) {
+                anyAlive = true;
+                kill(pid, SIGKILL);
+                ++signalsSent;
+            }
+        }
+        if (!anyAlive) {
+            break;
+        }
+        std::this_thread::sleep_for(gc_PauseBetweenRounds);
+    }
+    return signalsSent;
+}
+
+} // namespace Fleet

@@ -1,0 +1,71 @@
+#include "fleet/Progress.h"
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <cmath>
+#include <cstdio>
+#include <iostream>
+
+namespace Fleet {
+
+namespace {
+
+constexpr char gc_EraseLine[] = "\r\033[K";
+
+} // namespace
+
+std::string Progress::clock(double seconds) {
+    long const whole = seconds < 0 ? 0 : static_cast<long>(seconds);
+    char text[32];
+    std::snprintf(text, sizeof text, "%02ld:%02ld:%02ld", whole / 3600, whole / 60 % 60,
+                  whole % 60);
+    return text;
+}
+
+std::optional<double> Progress::estimateLeft(ProgressFigures const& figures) {
+    std::size_t const finished = figures.surveyed + figures.failed;
+    if (finished == 0 || figures.partitions < finished) {
+        return std::nullopt;
+    }
+    return figures.elapsedSeconds / static_cast<double>(finished) *
+           static_cast<double>(figures.partitions - finished);
+}
+
+std::string Progress::format(ProgressFigures const& figures) {
+    std::optional<double> const& left = figures.leftSeconds;
+    std::string line = "machines " + std::to_string(figures.machinesDone) + "/" +
+                       std::to_string(figures.machines) + "  partitions " +
+                       std::to_string(figures.surveyed) + " ok " + std::to_string(figures.failed) +
+                       " failed " + std::to_string(figures.running) + " running /" +
+                       std::to_string(figures.partitions) + "  " + clock(figures.elapsedSeconds) +
+                       " elapsed, ~" + (left ? clock(*left) : std::string("--:--:--")) + " left";
+    if (!figures.longestName.empty()) {
+        line += "  longest: " + figures.longestName + " (" +
+                std::to_string(static_cast<long>(std::floor(figures.longestSeconds))) + " s)";
+    }
+    return line;
+}
+
+std::string Progress::fitToWidth(std::string const& line, std::size_t columns) {
+    if (columns == 0 || line.size() < columns) {
+        return line;
+    }
+    return line.substr(0, columns - 1);
+}
+
+void Progress::draw(std::string const& line) {
+    winsize size{};
+    std::size_t const columns = ioctl(STDERR_FILENO, TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
+    std::cerr << gc_EraseLine << fitToWidth(line, columns) << std::flush;
+}
+
+void Progress::erase() {
+    std::cerr << gc_EraseLine << std::flush;
+}
+
+void Progress::startLine() {
+    std::cerr << '\n' << std::flush;
+}
+
+} // namespace Fleet

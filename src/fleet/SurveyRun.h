@@ -1,0 +1,78 @@
+#pragma once
+
+#include "fleet/ChildProcess.h"
+#include "fleet/CommandLine.h"
+#include "fleet/RunRecords.h"
+#include "fleet/Scheduler.h"
+
+#include <chrono>
+#include <map>
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace Fleet {
+
+// One console-wide survey: lists each machine and surveys its partitions,
+// each unit of work in a forked process of its own, at most `jobs` at once;
+// stops remote actions that run past the time limit; prints each machine's
+// block, writes its status file and joins its trace as soon as it and every
+// machine before it are done. SIGINT and SIGTERM stop the run as documented
+// in quorvex-survey(8).
+class SurveyRun {
+public:
+    SurveyRun(Options options, std::vector<std::string> const& identities);
+
+    // Runs to the end and returns the exit status: the overall code (0, 4
+    // or 8), or 128 + the signal that interrupted the run.
+    int run();
+
+    std::vector<MachineRecord> const& machines() const;
+    int interruptingSignal() const;
+    std::string overallCode() const;
+
+private:
+    using Clock = std::chrono::steady_clock;
+    struct Running {
+        Scheduler::Unit unit;
+        std::unique_ptr<ChildProcess> child;
+        Clock::time_point started;
+        bool listingStopped = false;
+    };
+
+    void _startUnits();
+    void _startUnit(Scheduler::Unit const& unit);
+    void _waitForEvents();
+    void _takeSignal();
+    void _collectFinished();
+    void _finish(Running& running);
+    void _finishListing(Running& running);
+    void _finishSurvey(Running& running);
+    void _enforceLimits();
+    bool _stopAction(Running& running, pid_t action);
+    std::string _stopNote(double seconds) const;
+    void _markUnfinished();
+    // runOver: every machine left is reported, done or not.
+    void _reportReadyMachines(bool runOver);
+    void _reportMachine(std::size_t index);
+    void _drawProgress();
+    void _eraseProgress();
+    PartitionRecord& _record(Scheduler::Unit const& unit);
+    double _secondsSince(Clock::time_point start) const;
+
+    Options _options;
+    std::vector<MachineRecord> _machines;
+    Scheduler _scheduler;
+    std::vector<Running> _running;
+    std::size_t _reported = 0;
+    int _signal = 0;
+    bool _showProgress = false;
+    // A progress line is on the terminal now.
+    bool _progressShown = false;
+    // Standard error's last output line has no line end yet.
+    bool _stderrLineOpen = false;
+    Clock::time_point _start;
+    Clock::time_point _lastDraw;
+};
+
+} // namespace Fleet

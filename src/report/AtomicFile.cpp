@@ -1,0 +1,71 @@
+#include "report/AtomicFile.h"
+
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+#include <fcntl.h>
+#include <stdexcept>
+#include <sys/stat.h>
+#include <unistd.h>
+#include <vector>
+
+namespace report {
+
+namespace {
+
+std::string folderOf(std::string const& path) {
+    std::string::size_type const slash = path.rfind('/');
+    if (slash == std::string::npos) {
+        return ".";
+    }
+    return slash == 0 ? "/" : path.substr(0, slash);
+}
+
+std::string baseNameOf(std::string const& path) {
+    std::string::size_type const slash = path.rfind('/');
+    return slash == std::string::npos ? path : path.substr(slash + 1);
+}
+
+std::runtime_error failure(std::string const& path, int error) {
+    return std::runtime_error("cannot write " + path + ": " + std::strerror(error));
+}
+
+bool writeAll(int descriptor, std::string const& text) {
+    std::size_t written = 0;
+    while (written < text.size()) {
+        ssize_t const result = ::write(descriptor, text.data() + written, text.size() - written);
+        if (result < 0 && errno == EINTR) {
+            continue;
+        }
+        if (result <= 0) {
+            return false;
+        }
+        written += static_cast<std::size_t>(result);
+    }
+    return true;
+}
+
+} // namespace
+
+void writeFileAtomically(std::string const& path, std::string const& text) {
+    std::string const pattern = folderOf(path) + "/." + baseNameOf(path) + ".XXXXXX";
+    std::vector<char> temporary(pattern.begin(), pattern.end());
+    temporary.push_back('\0');
+    int const descriptor = ::mkstemp(temporary.data());
+    if (descriptor < 0) {
+        throw failure(path, errno);
+    }
+    // mkstemp makes the file readable by its owner only; a report is for
+    // everyone who may read the folder.
+    ::fchmod(descriptor, S_IRUSR | S_IWUSR | S_IRGRP | S_IROTH);
+    bool const complete = writeAll(descriptor, text);
+    int const error = errno;
+    bool const closed = ::close(descriptor) == 0;
+    if (!complete || !closed || std::rename(temporary.data(), path.c_str()) != 0) {
+        int const reported = complete && closed ? errno : error;
+        ::unlink(temporary.data());
+        throw failure(path, reported);
+    }
+}
+
+} // namespace report

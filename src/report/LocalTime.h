@@ -1,0 +1,11 @@
+#pragma once
+
+#include <string>
+
+namespace report {
+
+// The local time of a moment in ISO 8601 with its offset
+// ("2026-11-23T14:05:09+01:00"); empty when it cannot be formed.
+std::string localTimeText(long long secondsSinceEpoch);
+
+} // namespace report

@@ -1,0 +1,81 @@
+#include "report/PartitionsCsv.h"
+
+#include "report/JsonMember.h"
+#include "report/TextSafety.h"
+
+#include <algorithm>
+#include <iterator>
+#include <vector>
+
+namespace report {
+
+using Json = nlohmann::ordered_json;
+
+namespace {
+
+constexpr char rowEnd[] = "\r\n";
+
+std::vector<std::string> const& partitionColumns() {
+    static std::vector<std::string> const columns = {
+        "host", "ip",     "active_status", "outcome",  "status_text", "return_code",
+        "rc",   "rc_cmd", "seconds",       "document", "reason"};
+    return columns;
+}
+
+std::string csvField(std::string const& text) {
+    if (text.find_first_of(",\"\r\n") == std::string::npos) {
+        return text;
+    }
+    std::string quoted = "\"";
+    for (char const c : text) {
+        quoted += c;
+        if (c == '"') {
+            quoted += '"';
+        }
+    }
+    return quoted + "\"";
+}
+
+std::string fieldText(Json const& value) {
+    if (value.is_null()) {
+        return "";
+    }
+    if (value.is_string()) {
+        return validUtf8(value.get<std::string>());
+    }
+    return value.dump();
+}
+
+void appendRow(std::string& csv, std::vector<std::string> const& fields) {
+    for (std::size_t i = 0; i < fields.size(); ++i) {
+        if (i > 0) {
+            csv += ',';
+        }
+        csv += csvField(fields[i]);
+    }
+    csv += rowEnd;
+}
+
+} // namespace
+
+std::string partitionsCsv(Json const& summary) {
+    std::string csv;
+    std::vector<std::string> header = {"machine", "machine_return_code", "partition_id"};
+    header.insert(header.end(), partitionColumns().begin(), partitionColumns().end());
+    appendRow(csv, header);
+    for (Json const& machine : member(summary, "machines")) {
+        for (Json const& partition : member(machine, "partitions")) {
+            std::vector<std::string> row = {fieldText(member(machine, "identity")),
+                                            fieldText(member(machine, "return_code")),
+                                            fieldText(member(partition, "id"))};
+            std::transform(partitionColumns().begin(), partitionColumns().end(),
+                           std::back_inserter(row), [&](std::string const& column) {
+                               return fieldText(member(partition, column.c_str()));
+                           });
+            appendRow(csv, row);
+        }
+    }
+    return csv;
+}
+
+} // namespace report

@@ -1,0 +1,18 @@
+#pragma once
+
+#include <nlohmann/json.hpp>
+
+#include <string>
+
+namespace report {
+
+// partitions.csv of a summary: a header row, then one row per listed
+// partition of every machine, in the summary's order. RFC 4180: fields
+// holding a comma, a double quote, CR or LF are quoted with inner quotes
+// doubled, and every row ends with CRLF; the text is UTF-8. Columns:
+// machine, machine_return_code, partition_id, host, ip, active_status,
+// outcome, status_text, return_code, rc, rc_cmd, seconds, document, reason;
+// a value the summary has as null is an empty field.
+std::string partitionsCsv(nlohmann::ordered_json const& summary);
+
+} // namespace report

@@ -1,0 +1,58 @@
+#include "report/ReportCommand.h"
+
+#include "report/FolderReader.h"
+#include "report/ReportWriter.h"
+
+#include <CLI/CLI.hpp>
+#include <stdexcept>
+
+namespace report {
+
+namespace {
+
+constexpr char programName[] = "quorvex-survey";
+
+bool writeReportReporting(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
+                          std::string const& folder, std::ostream& errors) {
+    try {
+        writeReport(summary, vpdFolder, folder);
+    } catch (std::exception const& failure) {
+        errors << programName << ": report: " << failure.what() << "\n";
+        return false;
+    }
+    return true;
+}
+
+} // namespace
+
+CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request) {
+    CLI::App* const command = app.add_subcommand(
+        "report", "write the report (index.html, partitions.csv, summary.json) of the "
+                  "survey files earlier runs left into DIR");
+    command->add_option("--from", request.vpdFolder, "folder of the status files and VPD documents")
+        ->capture_default_str()
+        ->check(CLI::ExistingDirectory);
+    command->add_option("DIR", request.folder, "folder to write the report into")->required();
+    return command;
+}
+
+CLI::Option* addReportOption(CLI::App& app, std::string& folder) {
+    return app.add_option("--report", folder, "after the run, write its report into DIR")
+        ->type_name("DIR");
+}
+
+int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors) {
+    nlohmann::ordered_json const summary = readSummaryFromFolder(request.vpdFolder);
+    if (!writeReportReporting(summary, request.vpdFolder, request.folder, errors)) {
+        return 1;
+    }
+    out << request.folder << "/index.html\n";
+    return 0;
+}
+
+bool writeRunReport(nlohmann::ordered_json const& summary, std::string const& folder,
+                    std::ostream& errors) {
+    return writeReportReporting(summary, defaultVpdFolder, folder, errors);
+}
+
+} // namespace report

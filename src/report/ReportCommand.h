@@ -1,0 +1,40 @@
+#pragma once
+
+#include <CLI/App.hpp>
+#include <nlohmann/json.hpp>
+
+#include <ostream>
+#include <string>
+
+namespace report {
+
+// The console's folder of status files and VPD documents.
+inline constexpr char defaultVpdFolder[] = "/var/adm/quorvex/VPD";
+
+// What "report [--from VPD_FOLDER] DIR" was given.
+struct ReportRequest {
+    std::string vpdFolder = defaultVpdFolder;
+    std::string folder;
+};
+
+// Registers the subcommand "report [--from VPD_FOLDER] DIR" on app, filling
+// request when it is given; returns the subcommand, so that the caller can
+// ask whether it was parsed.
+CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request);
+
+// Registers the option "--report DIR" on app, filling folder when given.
+CLI::Option* addReportOption(CLI::App& app, std::string& folder);
+
+// Writes the report of the survey files in request.vpdFolder into
+// request.folder and prints the page's path on out. Returns 0, or 1 with the
+// reason on errors when a file cannot be written.
+int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors);
+
+// Writes the report of a run's summary into folder, its documents lying in
+// the console's VPD folder; prints nothing on success, so that the run's
+// standard output stays what the survey prints. Returns false with the
+// reason on errors when a file cannot be written.
+bool writeRunReport(nlohmann::ordered_json const& summary, std::string const& folder,
+                    std::ostream& errors);
+
+} // namespace report

@@ -1,0 +1,162 @@
+#include "report/ReportPage.h"
+
+#include <gtest/gtest.h>
+
+#include <regex>
+
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+Json partitionEntry(std::string const& id, std::string const& host, std::string const& outcome) {
+    return {{"id", id},
+            {"host", host},
+            {"ip", "10.0.0." + id},
+            {"active_status", nullptr},
+            {"outcome", outcome},
+            {"status_text", outcome == "surveyed" ? "Ok" : "RELAY Failed, rc = 1"},
+            {"return_code", outcome == "surveyed" ? "0" : "8"},
+            {"rc", nullptr},
+            {"rc_cmd", nullptr},
+            {"document", "VPD/quorvexPYLON_VPD_Survey_ClientPartition_1-A_S-" + id + ".VPD.xml"},
+            {"reason", outcome == "surveyed" ? Json(nullptr) : Json("why <not> & \"so\"\n\n\n")},
+            {"seconds", 2.46}};
+}
+
+Json summary(Json partitions) {
+    Json counts = {{"partitions", partitions.size()},
+                   {"surveyed", 1},
+                   {"inactive", 0},
+                   {"channel_failure", 1},
+                   {"client_failure", 0},
+                   {"fetch_failure", 0},
+                   {"timed_out", 0},
+                   {"interrupted", 0}};
+    Json machine = {{"identity", "1-A_S"}, {"return_code", "4"}, {"counts", counts}};
+    machine["partitions"] = std::move(partitions);
+    Json totals = counts;
+    totals["machines"] = 1;
+    return {
+        {"tool", "quorvex-survey"},
+        {"version", "4.0.11"},
+        {"console_host", "console<1>"},
+        {"started", "2026-11-23T14:05:09+01:00"},
+        {"ended", "2026-11-23T14:06:10+01:00"},
+        {"elapsed_seconds", 61.04},
+        {"options",
+         {{"jobs", 8}, {"timeout_seconds", 1800}, {"all", true}, {"identities", Json::array()}}},
+        {"interrupted", nullptr},
+        {"return_code", "4"},
+        {"totals", totals},
+        {"machines", Json::array({machine})}};
+}
+
+std::string page(Json const& partitions) {
+    return report::reportPage(summary(partitions), "../VPD");
+}
+
+std::size_t occurrences(std::string const& text, std::string const& what) {
+    std::size_t count = 0;
+    for (auto at = text.find(what); at != std::string::npos; at = text.find(what, at + 1)) {
+        ++count;
+    }
+    return count;
+}
+
+TEST(ReportPage, IsOneDocumentWithStyleAndScriptInlineAndNothingFetched) {
+    std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
+    EXPECT_EQ(0U, html.find("<!DOCTYPE html>\n"));
+    EXPECT_NE(std::string::npos, html.find("<style>"));
+    EXPECT_NE(std::string::npos, html.find("<script>"));
+    EXPECT_EQ(std::string::npos, html.find("src="));
+    EXPECT_EQ(std::string::npos, html.find("http:"));
+    EXPECT_EQ(std::string::npos, html.find("https:"));
+    EXPECT_EQ(std::string::npos, html.find("<link"));
+}
+
+TEST(ReportPage, HeaderShowsConsoleTimesOptionsAndTotals) {
+    std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
+    EXPECT_NE(std::string::npos, html.find("of console console&lt;1&gt;</span>"));
+    EXPECT_NE(std::string::npos, html.find("Started <b>2026-11-23T14:05:09+01:00</b>, ended "
+                                           "<b>2026-11-23T14:06:10+01:00</b> (61.0 s)"));
+    EXPECT_NE(std::string::npos, html.find("options: <b>-j 8 -t 1800 --all</b>"));
+    EXPECT_NE(
+        std::string::npos,
+        html.find("<li class=\"c\" data-outcome=\"channel_failure\"><b>1</b>channel failure"));
+}
+
+TEST(ReportPage, HostNameMarkupShowsAsTextEverywhere) {
+    std::string const html =
+        page(Json::array({partitionEntry("1", "<img src=x onerror=alert(1)>", "channel_failure")}));
+    EXPECT_EQ(std::string::npos, html.find("<img"));
+    EXPECT_NE(std::string::npos, html.find("<td>&lt;img src=x onerror=alert(1)&gt;<td>"));
+    EXPECT_NE(std::string::npos, html.find("<pre>why &lt;not&gt; &amp; &quot;so&quot;</pre>"));
+}
+
+TEST(ReportPage, OneRowPerPartitionWithOutcomeClassAndMachineAnchorOnTheFirst) {
+    std::string const html = page(Json::array(
+        {partitionEntry("1", "a", "surveyed"), partitionEntry("2", "b", "channel_failure")}));
+    EXPECT_NE(std::string::npos, html.find("<tr id=m0 class=s><td>1-A_S<td>1<td>a<td>10.0.0.1<td>"
+                                           "surveyed<td>Ok<td>2.5<td>"));
+    EXPECT_NE(std::string::npos, html.find("<tr class=c><td>1-A_S<td>2<td>b"));
+    EXPECT_NE(std::string::npos, html.find("<a href=\"#m0\" data-machine=\"1-A_S\">1-A_S</a>"));
+}
+
+TEST(ReportPage, FullTableIsInsideNoscriptForTheScriptToRead) {
+    std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
+    std::size_t const start = html.find(R"(<noscript id="rows"><table class="parts">)");
+    std::size_t const row = html.find("<tr id=m0 class=s>");
+    std::size_t const end = html.find("</tbody></table></noscript>");
+    EXPECT_LT(start, row);
+    EXPECT_LT(row, end);
+    EXPECT_NE(std::string::npos, end);
+    EXPECT_LT(html.find("<div id=\"live\"></div>"), start);
+}
+
+TEST(ReportPage, DocumentsLinkRelativeToThePage) {
+    std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
+    EXPECT_NE(
+        std::string::npos,
+        html.find("<a href=\"../VPD/quorvexPYLON_VPD_Survey_ClientPartition_1-A_S-1.VPD.xml\">"
+                  "XML</a>"));
+}
+
+TEST(ReportPage, DocumentLinkEncodesCharactersThatAreSpecialInUrls) {
+    Json odd = partitionEntry("1", "a", "surveyed");
+    odd["document"] = "VPD/x #?%\"<.VPD.xml";
+    std::string const html = page(Json::array({odd}));
+    EXPECT_NE(std::string::npos, html.find("href=\"../VPD/x%20%23%3F%25%22%3C.VPD.xml\""));
+}
+
+TEST(ReportPage, ReasonOnlyOnDemandAndOnlyForFailures) {
+    std::string const html = page(Json::array(
+        {partitionEntry("1", "a", "surveyed"), partitionEntry("2", "b", "channel_failure")}));
+    EXPECT_EQ(1U, occurrences(html, "<details><summary>reason</summary>"));
+}
+
+TEST(ReportPage, MachineBarHasOneSegmentPerOutcomePresent) {
+    std::string const html = page(Json::array(
+        {partitionEntry("1", "a", "surveyed"), partitionEntry("2", "b", "channel_failure")}));
+    EXPECT_NE(std::string::npos,
+              html.find("<div class=\"bar\"><i class=\"s\" style=\"width:50.000%\" title=\"1 "
+                        "surveyed\"></i><i class=\"c\" style=\"width:50.000%\" title=\"1 channel "
+                        "failure\"></i></div><td class=\"legend\">1 surveyed, 1 channel failure"));
+}
+
+TEST(ReportPage, SummaryWithFieldsMissingStillGivesAPage) {
+    std::string const html = report::reportPage(Json::object(), "../VPD");
+    EXPECT_NE(std::string::npos, html.find("</html>"));
+    EXPECT_NE(std::string::npos, html.find("read from the files earlier runs left"));
+}
+
+TEST(ReportPage, RowMarkupStaysSmallForLargeConsoles) {
+    Json partitions = Json::array();
+    for (int i = 0; i < 1000; ++i) {
+        partitions.push_back(partitionEntry(std::to_string(i), "host-" + std::to_string(i),
+                                            i % 4 == 0 ? "channel_failure" : "surveyed"));
+    }
+    // 50 machines of 1,000 partitions must stay under 20 MB.
+    EXPECT_LT(page(partitions).size(), 20U * 1000 * 1000 / 50);
+}
+
+} // namespace

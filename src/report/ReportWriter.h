@@ -1,0 +1,21 @@
+#pragma once
+
+#include <nlohmann/json.hpp>
+
+#include <string>
+
+namespace report {
+
+// Writes the report of a summary into folder (made when missing):
+// index.html, partitions.csv and summary.json, each through a temporary
+// name renamed when complete. vpdFolder is where the summary's documents
+// lie; the page links to them relative to folder. Throws
+// std::runtime_error when a file cannot be written.
+void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
+                 std::string const& folder);
+
+// summary.json's text: the summary indented by two spaces, bytes that are
+// not UTF-8 replaced by U+FFFD, ending with a line end.
+std::string summaryText(nlohmann::ordered_json const& summary);
+
+} // namespace report

@@ -1,0 +1,48 @@
+#include "report/StatusText.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+using report::outcomeOfStatusText;
+
+TEST(StatusText, FixedTextsOfSurveyedInactiveAndInterrupted) {
+    EXPECT_EQ("surveyed", outcomeOfStatusText("Ok"));
+    EXPECT_EQ("inactive", outcomeOfStatusText("Failed - Active Status < 3"));
+    EXPECT_EQ("interrupted", outcomeOfStatusText("Interrupted - not surveyed"));
+}
+
+TEST(StatusText, ChannelFailureWithItsCode) {
+    EXPECT_EQ("channel_failure", outcomeOfStatusText("RELAY Failed, rc = 4"));
+    EXPECT_EQ("channel_failure", outcomeOfStatusText("RELAY Failed, rc = 4294967295"));
+}
+
+TEST(StatusText, ClientFailureWithItsCode) {
+    EXPECT_EQ("client_failure", outcomeOfStatusText("Partition Failed, RcCmd = 9"));
+}
+
+TEST(StatusText, FetchFailureCodeWrittenOverTheSeed) {
+    EXPECT_EQ("fetch_failure", outcomeOfStatusText("2et result Failed, rc = "));
+    EXPECT_EQ("fetch_failure", outcomeOfStatusText("0et result Failed, rc = "));
+    EXPECT_EQ("fetch_failure", outcomeOfStatusText("42t result Failed, rc = "));
+    EXPECT_EQ("fetch_failure", outcomeOfStatusText("4294967295 Failed, rc = "));
+}
+
+TEST(StatusText, FetchSeedWithoutCodeOrWithWrongRestIsNotRecognised) {
+    EXPECT_EQ(std::nullopt, outcomeOfStatusText("get result Failed, rc = "));
+    EXPECT_EQ(std::nullopt, outcomeOfStatusText("2get result Failed, rc = "));
+    EXPECT_EQ(std::nullopt, outcomeOfStatusText("2et result Failed, rc = 5"));
+}
+
+TEST(StatusText, FailurePrefixWithoutCodeIsNotRecognised) {
+    EXPECT_EQ(std::nullopt, outcomeOfStatusText("RELAY Failed, rc = "));
+    EXPECT_EQ(std::nullopt, outcomeOfStatusText("Partition Failed, RcCmd = x"));
+}
+
+TEST(StatusText, UnknownAndEmptyTextsAreNotRecognised) {
+    EXPECT_EQ(std::nullopt, outcomeOfStatusText(""));
+    EXPECT_EQ(std::nullopt, outcomeOfStatusText("ok"));
+    EXPECT_EQ(std::nullopt, outcomeOfStatusText("Ok "));
+}
+
+} // namespace

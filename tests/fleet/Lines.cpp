@@ -1,0 +1,17 @@
+#include "Lines.h"
+
+#include <sstream>
+
+namespace FleetTest {
+
+std::vector<std::string> linesOf(std::string const& text) {
+    std::vector<std::string> lines;
+    std::istringstream stream(text);
+    std::string line;
+    while (std::getline(stream, line)) {
+        lines.push_back(line);
+    }
+    return lines;
+}
+
+} // namespace FleetTest

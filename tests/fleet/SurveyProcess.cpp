@@ -1,0 +1,97 @@
+#include "SurveyProcess.h"
+
+#include <algorithm>
+#include <chrono>
+#include <csignal>
+#include <fcntl.h>
+#include <iterator>
+#include <stdexcept>
+#include <sys/wait.h>
+#include <thread>
+#include <unistd.h>
+
+namespace FleetTest {
+
+namespace {
+
+constexpr auto gc_PollPause = std::chrono::milliseconds(20);
+
+int statusOf(int waitStatus) {
+    return WIFSIGNALED(waitStatus) ? 128 + WTERMSIG(waitStatus) : WEXITSTATUS(waitStatus);
+}
+
+[[noreturn]] void execute(std::vector<std::string> const& argv, std::string const& stdoutPath,
+                          std::string const& stderrPath) {
+    int const input = ::open("/dev/null", O_RDONLY);
+    int const output = ::open(stdoutPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0644);
+    int const error = ::open(stderrPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0644);
+    if (input < 0 || output < 0 || error < 0 || ::dup2(input, 0) < 0 || ::dup2(output, 1) < 0 ||
+        ::dup2(error, 2) < 0) {
+        ::_exit(126);
+    }
+    std::vector<char*> arguments;
+    arguments.reserve(argv.size() + 1);
+    std::transform(argv.begin(), argv.end(), std::back_inserter(arguments),
+                   [](std::string const& argument) { return const_cast<char*>(argument.c_str()); });
+    arguments.push_back(nullptr);
+    ::execv(arguments[0], arguments.data());
+    ::_exit(127);
+}
+
+} // namespace
+
+double monotonicSeconds() {
+    return std::chrono::duration<double>(std::chrono::steady_clock::now().time_since_epoch())
+        .count();
+}
+
+SurveyProcess::SurveyProcess(std::vector<std::string> const& argv, std::string const& stdoutPath,
+                             std::string const& stderrPath) {
+    _started = monotonicSeconds();
+    _pid = ::fork();
+    if (_pid < 0) {
+        throw std::runtime_error("cannot start " + argv.front());
+    }
+    if (_pid == 0) {
+        execute(argv, stdoutPath, stderrPath);
+    }
+}
+
+SurveyProcess::~SurveyProcess() {
+    if (_pid > 0) {
+        ::kill(_pid, SIGKILL);
+        ::waitpid(_pid, nullptr, 0);
+    }
+}
+
+void SurveyProcess::signal(int signalNumber) const {
+    if (_pid > 0) {
+        ::kill(_pid, signalNumber);
+    }
+}
+
+int SurveyProcess::waitForExit(double boundSeconds) {
+    while (_pid > 0) {
+        int waitStatus = 0;
+        if (::waitpid(_pid, &waitStatus, WNOHANG) == _pid) {
+            _ended = monotonicSeconds();
+            _pid = -1;
+            return statusOf(waitStatus);
+        }
+        if (monotonicSeconds() - _started > boundSeconds) {
+            ::kill(_pid, SIGKILL);
+            ::waitpid(_pid, nullptr, 0);
+            _ended = monotonicSeconds();
+            _pid = -1;
+            return -1;
+        }
+        std::this_thread::sleep_for(gc_PollPause);
+    }
+    return -1;
+}
+
+double SurveyProcess::secondsTaken() const {
+    return _ended - _started;
+}
+
+} // namespace FleetTest

@@ -1,0 +1,267 @@
+#!/usr/bin/python3
+"""The report of a generated survey, checked the way people and programs
+meet it: the page in headless Chromium (driven through chromium-driver with
+Selenium), partitions.csv with Python's csv reader. Both against the
+report's summary.json.
+
+Usage: report_page_test.py REPORT_FOLDER TEST_NAME
+Exit status 0 passed, 1 failed, 77 skipped (the reason is printed).
+"""
+import csv
+import io
+import json
+import os
+import shutil
+import sys
+import tempfile
+import unittest
+
+SKIP = 77
+MARKUP_HOST = "<img src=x onerror=alert(1)>"
+OUTCOME_CLASSES = {
+    "surveyed": "s", "inactive": "i", "channel_failure": "c", "client_failure": "l",
+    "fetch_failure": "f", "timed_out": "t", "interrupted": "x",
+}
+CSV_COLUMNS = ["machine", "machine_return_code", "partition_id", "host", "ip", "active_status",
+               "outcome", "status_text", "return_code", "rc", "rc_cmd", "seconds", "document",
+               "reason"]
+REPORT = os.environ.get("REPORT_FOLDER", "")
+
+
+def load_summary():
+    with open(os.path.join(REPORT, "summary.json"), encoding="utf-8") as file:
+        return json.load(file)
+
+
+def all_partitions(summary):
+    return [(machine, partition) for machine in summary["machines"]
+            for partition in machine["partitions"]]
+
+
+def browser_missing():
+    """Why no headless Chromium can be driven here, or None."""
+    for program in ("chromium", "chromedriver"):
+        if shutil.which(program) is None:
+            return f"{program} is not installed (Debian packages chromium, chromium-driver)"
+    try:
+        import selenium  # noqa: F401 pylint: disable=import-outside-toplevel,unused-import
+    except ImportError:
+        return "Python's selenium is not installed (Debian package python3-selenium)"
+    return None
+
+
+def start_chromium(profile, script=True):
+    from selenium import webdriver  # pylint: disable=import-outside-toplevel
+    from selenium.webdriver.chrome.service import Service  # pylint: disable=import-outside-toplevel
+    options = webdriver.ChromeOptions()
+    options.binary_location = shutil.which("chromium")
+    for argument in ("--headless", "--no-sandbox", "--disable-gpu", "--disable-quic",
+                     "--no-first-run", "--disable-background-networking",
+                     "--disable-component-update", "--disable-sync",
+                     "--window-size=1400,1000", f"--user-data-dir={profile}"):
+        options.add_argument(argument)
+    if not script:
+        options.add_argument("--blink-settings=scriptEnabled=false")
+    driver = webdriver.Chrome(service=Service(shutil.which("chromedriver")), options=options)
+    # Any alert the page might raise is recorded instead of shown.
+    driver.execute_cdp_cmd("Page.addScriptToEvaluateOnNewDocument", {
+        "source": "window.__alerts = []; window.alert = function (m) { window.__alerts.push(String(m)); };"})
+    return driver
+
+
+class CsvTest(unittest.TestCase):
+    def test_csv_rows_match_the_summary(self):
+        with open(os.path.join(REPORT, "partitions.csv"), "rb") as file:
+            raw = file.read()
+        text = raw.decode("utf-8")
+        rows = list(csv.reader(io.StringIO(text, newline="")))
+        # RFC 4180 as Python writes it: CRLF after each row, quotes only where needed.
+        rewritten = io.StringIO(newline="")
+        csv.writer(rewritten, lineterminator="\r\n").writerows(rows)
+        self.assertEqual(rewritten.getvalue(), text)
+        self.assertEqual(CSV_COLUMNS, rows[0])
+        expected = []
+        for machine, partition in all_partitions(load_summary()):
+            def field(value):
+                return "" if value is None else (value if isinstance(value, str) else json.dumps(value))
+            expected.append([machine["identity"], machine["return_code"], field(partition["id"])] +
+                            [field(partition[column]) for column in CSV_COLUMNS[3:]])
+        self.assertEqual(expected, rows[1:])
+
+    def test_csv_carries_markup_and_replacement_characters_as_text(self):
+        with open(os.path.join(REPORT, "partitions.csv"), encoding="utf-8", newline="") as file:
+            hosts = [row["host"] for row in csv.DictReader(file)]
+        self.assertIn(MARKUP_HOST, hosts)
+        self.assertIn("a&b<c\"d", hosts)
+        self.assertIn("h\ufffdst", hosts)
+
+
+class RunReportTest(unittest.TestCase):
+    def test_report_after_a_run_carries_the_runs_summary(self):
+        run = os.path.join(os.path.dirname(REPORT), "run-report")
+        with open(os.path.join(run, "summary.json"), encoding="utf-8") as file:
+            reported = json.load(file)
+        with open(os.path.join(os.path.dirname(REPORT), "run-summary.json"),
+                  encoding="utf-8") as file:
+            self.assertEqual(json.load(file), reported)
+        self.assertEqual(1, reported["totals"]["timed_out"])
+        self.assertTrue(os.path.isfile(os.path.join(run, "index.html")))
+        self.assertTrue(os.path.isfile(os.path.join(run, "partitions.csv")))
+
+    def test_time_limit_is_read_back_from_the_default_document(self):
+        stopped = [p for _, p in all_partitions(load_summary()) if p["outcome"] == "timed_out"]
+        self.assertEqual(1, len(stopped))
+        self.assertEqual("slowpoke", stopped[0]["host"])
+        self.assertEqual("9", stopped[0]["id"])
+        self.assertEqual("runCmdOnPartition", stopped[0]["time_limit"]["action"])
+        self.assertIn("Stopped by the time limit of 1 s after ", stopped[0]["reason"])
+
+
+class PageTest(unittest.TestCase):
+    driver = None
+
+    @classmethod
+    def setUpClass(cls):
+        reason = browser_missing()
+        if reason:
+            raise unittest.SkipTest(reason)
+        cls.profile = tempfile.mkdtemp(prefix="report-chromium-")
+        cls.driver = start_chromium(cls.profile)
+        cls.summary = load_summary()
+
+    @classmethod
+    def tearDownClass(cls):
+        if cls.driver is not None:
+            cls.driver.quit()
+            shutil.rmtree(cls.profile, ignore_errors=True)
+
+    def setUp(self):
+        self.driver.get("file://" + os.path.join(REPORT, "index.html"))
+
+    def script(self, code, *arguments):
+        return self.driver.execute_script(code, *arguments)
+
+    def rendered_row_classes(self):
+        return self.script("return Array.from(document.querySelectorAll('#parts tbody tr'))"
+                           ".filter(r => r.offsetParent !== null).map(r => r.className);")
+
+    def choose_only(self, css_class):
+        self.script("document.querySelectorAll('#filters input[name=o]').forEach(b => {"
+                    " b.checked = b.value === arguments[0]; });"
+                    "document.getElementById('filters').dispatchEvent(new Event('change'));",
+                    css_class)
+
+    def test_header_totals_match_the_summary(self):
+        shown = self.script("const t = {}; document.querySelectorAll('.totals li').forEach(li => {"
+                            " t[li.dataset.outcome || li.lastChild.textContent.trim()] ="
+                            " Number(li.querySelector('b').textContent); }); return t;")
+        totals = self.summary["totals"]
+        self.assertEqual(totals["machines"], shown["machines"])
+        self.assertEqual(totals["partitions"], shown["partitions"])
+        for outcome in OUTCOME_CLASSES:
+            self.assertEqual(totals[outcome], shown[outcome], outcome)
+
+    def test_rows_per_outcome_match_the_summary(self):
+        classes = self.rendered_row_classes()
+        self.assertEqual(self.summary["totals"]["partitions"], len(classes))
+        for outcome, css_class in OUTCOME_CLASSES.items():
+            self.assertEqual(self.summary["totals"][outcome], classes.count(css_class), outcome)
+
+    def test_markup_host_name_shows_as_text_and_runs_nothing(self):
+        hosts = self.script("return Array.from(document.querySelectorAll('#parts tbody tr'))"
+                            ".map(r => r.cells[2].textContent);")
+        self.assertIn(MARKUP_HOST, hosts)
+        self.assertIn("a&b<c\"d", hosts)
+        self.assertEqual(0, self.script("return document.images.length;"))
+        self.assertEqual([], self.script("return window.__alerts;"))
+
+    def test_bytes_that_are_not_utf8_show_as_replacement_character(self):
+        hosts = self.script("return Array.from(document.querySelectorAll('#parts tbody tr'))"
+                            ".map(r => r.cells[2].textContent);")
+        self.assertIn("h\ufffdst", hosts)
+
+    def test_filtering_by_outcome_leaves_only_those_rows(self):
+        for outcome, css_class in OUTCOME_CLASSES.items():
+            self.choose_only(css_class)
+            classes = self.rendered_row_classes()
+            self.assertEqual(self.summary["totals"][outcome], len(classes), outcome)
+            self.assertTrue(all(c == css_class for c in classes), outcome)
+
+    def test_clicking_a_total_shows_only_its_partitions(self):
+        self.script("document.querySelector('.totals li[data-outcome=fetch_failure]').click();")
+        classes = self.rendered_row_classes()
+        self.assertEqual(self.summary["totals"]["fetch_failure"], len(classes))
+        self.assertEqual({"f"}, set(classes))
+
+    def test_free_text_filter_keeps_matching_rows(self):
+        self.script("const q = document.getElementById('q'); q.value = arguments[0];"
+                    "q.dispatchEvent(new Event('input'));", ' B<C"D ')
+        self.script("return new Promise(r => setTimeout(r, 400));")
+        hosts = self.script("return Array.from(document.querySelectorAll('#parts tbody tr'))"
+                            ".map(r => r.cells[2].textContent);")
+        self.assertEqual(["a&b<c\"d"], hosts)
+
+    def test_sorting_by_host_orders_rows_both_ways(self):
+        header = "document.querySelectorAll('#parts thead th')[2].querySelector('button').click();"
+        read = ("return Array.from(document.querySelectorAll('#parts tbody tr'))"
+                ".map(r => r.cells[2].textContent);")
+        self.script(header)
+        ascending = self.script(read)
+        non_empty = [h for h in ascending if h]
+        self.assertEqual(sorted(non_empty, key=str.lower), non_empty)
+        self.script(header)
+        descending = [h for h in self.script(read) if h]
+        self.assertEqual(sorted(non_empty, key=str.lower, reverse=True), descending)
+        self.assertEqual("descending", self.script(
+            "return document.querySelectorAll('#parts thead th')[2].getAttribute('aria-sort');"))
+
+    def test_machine_link_shows_that_machines_partitions(self):
+        self.script("document.querySelector('a[data-machine=\"8286-42A_10XYZ99\"]').click();")
+        machines = set(self.script("return Array.from(document.querySelectorAll('#parts tbody tr'))"
+                                   ".map(r => r.cells[0].textContent);"))
+        self.assertEqual({"8286-42A_10XYZ99"}, machines)
+
+    def test_reason_opens_on_demand_and_document_links_resolve(self):
+        reasons = self.script("return Array.from(document.querySelectorAll('#parts details'))"
+                              ".map(d => d.open);")
+        failed = sum(1 for _, p in all_partitions(self.summary) if p["reason"] is not None)
+        self.assertEqual([False] * failed, reasons)
+        links = self.script("return Array.from(document.querySelectorAll('#parts a')).map(a => a.href);")
+        documents = [p for _, p in all_partitions(self.summary) if p["document"] is not None]
+        self.assertEqual(len(documents), len(links))
+        for link in links:
+            self.assertTrue(link.startswith("file://"))
+            self.assertTrue(os.path.isfile(link[len("file://"):]), link)
+
+    def test_page_reads_fully_without_script(self):
+        driver = start_chromium(tempfile.mkdtemp(prefix="report-chromium-"), script=False)
+        try:
+            driver.get("file://" + os.path.join(REPORT, "index.html"))
+            rows = driver.execute_cdp_cmd("Runtime.evaluate", {
+                "expression": "document.querySelectorAll('.parts tbody tr').length"})
+            self.assertEqual(self.summary["totals"]["partitions"], rows["result"]["value"])
+            # The filters work only with script: they are not shown without it.
+            shown = driver.execute_cdp_cmd("Runtime.evaluate", {
+                "expression": "getComputedStyle(document.getElementById('filters')).display"})
+            self.assertEqual("none", shown["result"]["value"])
+        finally:
+            driver.quit()
+
+
+def main():
+    global REPORT  # pylint: disable=global-statement
+    REPORT = os.path.abspath(sys.argv[1])
+    if not os.path.isfile(os.path.join(REPORT, "summary.json")):
+        print(f"skipped: no report in {REPORT}: the survey could not be made here "
+              "(see the test report.MakeSurveyAndReport)")
+        return SKIP
+    suite = unittest.defaultTestLoader.loadTestsFromName(sys.argv[2], sys.modules[__name__])
+    result = unittest.TextTestRunner(verbosity=2).run(suite)
+    if result.skipped and not result.failures and not result.errors:
+        print("skipped:", "; ".join(reason for _, reason in result.skipped))
+        return SKIP
+    return 0 if result.wasSuccessful() and result.testsRun > 0 else 1
+
+
+if __name__ == "__main__":
+    sys.exit(main())
