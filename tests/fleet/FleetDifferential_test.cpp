@@ -43,6 +43,8 @@ TEST(FleetDifferential, ShippedScenariosGiveTheSameResults) {
         {"9119-MHE_21ABCDE", "7063-CR2_06HMC01", "1234-ABC_10ABCDE", "8286-42A_10XYZ99"}, false);
     batch.addShipped("odd-output", "odd-output.scn", {"9119-MHE_21ABCDE"}, false);
     batch.addShipped("slow", "slow.scn", {"9119-MHE_21ABCDE"}, false);
+    batch.addShipped("console-all", "console.scn",
+                     {"8286-42A_10XYZ99", "9009-22A_78KLM01", "9119-MHE_21ABCDE"}, true);
     expectSameAsReference(batch);
 }
 
