@@ -64,8 +64,4 @@ void Progress::erase() {
     std::cerr << gc_EraseLine << std::flush;
 }
 
-void Progress::startLine() {
-    std::cerr << '\n' << std::flush;
-}
-
 } // namespace Fleet

@@ -46,8 +46,6 @@ public:
     static void draw(std::string const& line);
     // Takes the line away, leaving the cursor at the start of the line.
     static void erase();
-    // Ends an output line left open, so that the progress line starts below it.
-    static void startLine();
 };
 
 } // namespace Fleet

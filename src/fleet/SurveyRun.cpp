@@ -317,8 +317,10 @@ double SurveyRun::_secondsSince(Clock::time_point start) const {
 }
 
 void SurveyRun::_drawProgress() {
-    // Once every machine is reported nothing is left to show.
-    if (!_showProgress || _reported == _machines.size() ||
+    // Once every machine is reported nothing is left to show; and the line
+    // is never drawn over the code digit that ends a machine's block, which
+    // the next machine's output continues as the single-machine tool's does.
+    if (!_showProgress || _reported == _machines.size() || _stderrLineOpen ||
         Clock::now() - _lastDraw < gc_ProgressInterval) {
         return;
     }
@@ -347,11 +349,6 @@ void SurveyRun::_drawProgress() {
     }
     figures.elapsedSeconds = _secondsSince(_start);
     figures.leftSeconds = Progress::estimateLeft(figures);
-    if (_stderrLineOpen) {
-        // The progress line goes below the last output line, never over it.
-        Progress::startLine();
-        _stderrLineOpen = false;
-    }
     Progress::draw(Progress::format(figures));
     _progressShown = true;
 }

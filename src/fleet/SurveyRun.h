@@ -69,7 +69,8 @@ private:
     bool _showProgress = false;
     // A progress line is on the terminal now.
     bool _progressShown = false;
-    // Standard error's last output line has no line end yet.
+    // Standard error's last output line has no line end yet (a machine's
+    // block ends with its code digit): no progress line is drawn from then on.
     bool _stderrLineOpen = false;
     Clock::time_point _start;
     Clock::time_point _lastDraw;
