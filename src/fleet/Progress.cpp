@@ -13,6 +13,12 @@ namespace {
 
 constexpr char gc_EraseLine[] = "\r\033[K";
 
+// From the row below an open row back to just after its text (columns
+// count from 1).
+std::string u_backToOpenRow(std::size_t openColumns) {
+    return "\033[A\033[" + std::to_string(openColumns + 1) + "G";
+}
+
 } // namespace
 
 std::string Progress::clock(double seconds) {
@@ -54,14 +60,23 @@ std::string Progress::fitToWidth(std::string const& line, std::size_t columns) {
     return line.substr(0, columns - 1);
 }
 
-void Progress::draw(std::string const& line) {
+void Progress::draw(std::string const& line, std::size_t openColumns) {
     winsize size{};
     std::size_t const columns = ioctl(STDERR_FILENO, TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
-    std::cerr << gc_EraseLine << fitToWidth(line, columns) << std::flush;
+    std::string const shown = fitToWidth(line, columns);
+    if (openColumns == 0) {
+        std::cerr << gc_EraseLine << shown << std::flush;
+        return;
+    }
+    std::cerr << "\n\r" << shown << "\033[K" << u_backToOpenRow(openColumns) << std::flush;
 }
 
-void Progress::erase() {
-    std::cerr << gc_EraseLine << std::flush;
+void Progress::erase(std::size_t openColumns) {
+    if (openColumns == 0) {
+        std::cerr << gc_EraseLine << std::flush;
+        return;
+    }
+    std::cerr << "\033[B" << gc_EraseLine << u_backToOpenRow(openColumns) << std::flush;
 }
 
 } // namespace Fleet

@@ -41,11 +41,16 @@ public:
     // free: a line that wrapped could not be erased with one "\r".
     static std::string fitToWidth(std::string const& line, std::size_t columns);
 
-    // Redraws the line on standard error ("\r", the line, erase to its end),
-    // cut to the terminal's width.
-    static void draw(std::string const& line);
-    // Takes the line away, leaving the cursor at the start of the line.
-    static void erase();
+    // Redraws the line on standard error, cut to the terminal's width.
+    // openColumns is the length of the output row the cursor ends, which has
+    // no line end yet (a machine's block ends with its code digit, and the
+    // next machine's output continues that row); 0 when the row is empty.
+    // An open row is left as it is: the line goes on the row below and the
+    // cursor comes back to just after the row's text.
+    static void draw(std::string const& line, std::size_t openColumns);
+    // Takes the line away, leaving the cursor where output continues: at the
+    // start of the row, or just after an open row's text.
+    static void erase(std::size_t openColumns);
 };
 
 } // namespace Fleet

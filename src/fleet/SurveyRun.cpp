@@ -306,7 +306,7 @@ void SurveyRun::_reportMachine(std::size_t index) {
     _eraseProgress();
     MachineReport::print(machine);
     // The block ends with the code digit and no line end.
-    _stderrLineOpen = true;
+    _openColumns = std::string(get_OverallCode(MachineReport::returnCodes(machine))).size();
     RunFiles::writeAtomically(RunFiles::statusFile(machine.identity),
                               MachineReport::statusText(machine));
     RunFiles::joinPieces(pieces, RunFiles::traceFile(machine.identity));
@@ -317,10 +317,8 @@ double SurveyRun::_secondsSince(Clock::time_point start) const {
 }
 
 void SurveyRun::_drawProgress() {
-    // Once every machine is reported nothing is left to show; and the line
-    // is never drawn over the code digit that ends a machine's block, which
-    // the next machine's output continues as the single-machine tool's does.
-    if (!_showProgress || _reported == _machines.size() || _stderrLineOpen ||
+    // Once every machine is reported nothing is left to show.
+    if (!_showProgress || _reported == _machines.size() ||
         Clock::now() - _lastDraw < gc_ProgressInterval) {
         return;
     }
@@ -349,13 +347,13 @@ void SurveyRun::_drawProgress() {
     }
     figures.elapsedSeconds = _secondsSince(_start);
     figures.leftSeconds = Progress::estimateLeft(figures);
-    Progress::draw(Progress::format(figures));
+    Progress::draw(Progress::format(figures), _openColumns);
     _progressShown = true;
 }
 
 void SurveyRun::_eraseProgress() {
     if (_progressShown) {
-        Progress::erase();
+        Progress::erase(_openColumns);
         _progressShown = false;
     }
 }

@@ -69,9 +69,9 @@ private:
     bool _showProgress = false;
     // A progress line is on the terminal now.
     bool _progressShown = false;
-    // Standard error's last output line has no line end yet (a machine's
-    // block ends with its code digit): no progress line is drawn from then on.
-    bool _stderrLineOpen = false;
+    // The length of standard error's last output line while it has no line
+    // end (a machine's block ends with its code digit); 0 once it has one.
+    std::size_t _openColumns = 0;
     Clock::time_point _start;
     Clock::time_point _lastDraw;
 };

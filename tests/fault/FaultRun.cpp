@@ -86,6 +86,10 @@ void FaultRun::setPrelude(std::string const& shellText) {
     _prelude = shellText;
 }
 
+void FaultRun::runToolCopiedTo(std::string const& folder) {
+    _toolCopyFolder = folder;
+}
+
 void FaultRun::measurePeakMemory() {
     _measurePeakMemory = true;
 }
@@ -186,7 +190,7 @@ std::vector<std::string> FaultRun::_resultFolders() const {
 std::vector<std::string> FaultRun::_command(std::string const& identity) const {
     std::vector<std::string> command{"/bin/sh",
                                      "-c",
-                                     gc_CommandHead + _prelude + gc_CommandTail,
+                                     gc_CommandHead + _toolCopying() + _prelude + gc_CommandTail,
                                      "fault",
                                      file(gc_TmpListing),
                                      file(gc_QuorvexListing)};
@@ -195,8 +199,23 @@ std::vector<std::string> FaultRun::_command(std::string const& identity) const {
                        {"/usr/bin/time", "-q", "-f", "%M", "-o", file(gc_PeakMemory)});
     }
     command.insert(command.end(), {"timeout", "--kill-after=5", std::to_string(gc_TimeLimit),
-                                   QUORVEX_SURVEY_TOOL, "-c", identity});
+                                   _toolPath(), "-c", identity});
     return command;
+}
+
+// The shell line that copies the tool to its folder, or nothing.
+std::string FaultRun::_toolCopying() const {
+    if (_toolCopyFolder.empty()) {
+        return "";
+    }
+    return "cp '" + std::string(QUORVEX_SURVEY_TOOL) + "' '" + _toolCopyFolder + "/' || exit 125\n";
+}
+
+std::string FaultRun::_toolPath() const {
+    if (_toolCopyFolder.empty()) {
+        return QUORVEX_SURVEY_TOOL;
+    }
+    return _toolCopyFolder + "/" + fs::path(QUORVEX_SURVEY_TOOL).filename().string();
 }
 
 std::vector<std::string> FaultRun::_readListing(std::string const& name) const {

@@ -43,6 +43,10 @@ public:
     void addSandboxOptions(std::vector<std::string> const& options);
     // Shell commands run inside the sandbox just before the tool.
     void setPrelude(std::string const& shellText);
+    // The tool is copied into folder inside the sandbox before the prelude
+    // and run from there, so that a prelude mounting a new /tmp does not hide
+    // it when the build tree lies under /tmp.
+    void runToolCopiedTo(std::string const& folder);
     // Measure the peak resident set size of the tool and the commands it
     // runs (the largest of them) with /usr/bin/time.
     void measurePeakMemory();
@@ -71,6 +75,8 @@ private:
     std::vector<std::string> _toolPlacement() const;
     std::vector<std::string> _resultFolders() const;
     std::vector<std::string> _command(std::string const& identity) const;
+    std::string _toolCopying() const;
+    std::string _toolPath() const;
     std::vector<std::string> _readListing(std::string const& name) const;
 
     QuorvexTest::SimulatedConsole _console;
@@ -80,6 +86,7 @@ private:
     std::map<std::string, std::string> _replacedTools;
     std::vector<std::string> _sandboxOptions;
     std::string _prelude;
+    std::string _toolCopyFolder;
     bool _measurePeakMemory = false;
     long _first = 0;
     long _last = 0;

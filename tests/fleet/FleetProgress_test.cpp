@@ -117,6 +117,38 @@ TEST(FleetProgress, FinalScreenOfSeveralMachinesHoldsExactlyTheOutputLines) {
     EXPECT_EQ(screen.rows(), expected) << "the final screen holds exactly the output lines";
 }
 
+// The first machine has one quick partition, the second one that takes
+// 1.5 s: a while to watch after the first block has ended with its code.
+std::string secondMachineSlowConsole() {
+    return std::string("[lspartition ") + gc_SecondIdentity +
+           "]\nstdout 7,10.1.1.17,3,host7,Zeph,7.2;\n"
+           "[lspartition *]\nstdout 1,10.1.1.11,3,host1,Zeph,7.2;\n"
+           "[runCmdOnPartition 7]\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\ndelay 1.5\n"
+           "[runCmdOnPartition *]\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
+           "[getFileFromPartition *]\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
+           "document-nolf <fetched/>\n";
+}
+
+TEST(FleetProgress, LineIsDrawnAgainBelowTheCodeAfterTheFirstMachinesBlock) {
+    SimulatedConsole const console(secondMachineSlowConsole());
+    std::string const command = surveyCommand({"-j", "2"}, {gc_Identity, gc_SecondIdentity});
+    std::vector<std::string> const expected = outputLines(command);
+    CommandResult const terminal = onTerminal(command);
+    EXPECT_EQ(terminal.exitStatus, 0) << terminal.stderrText;
+    std::string const& bytes = terminal.stdoutText;
+    std::size_t const firstCode = bytes.find("ReturnCode: \r\n0");
+    ASSERT_NE(firstCode, std::string::npos) << bytes;
+    EXPECT_NE(bytes.find("\n\rmachines 1/2  partitions 1 ok 0 failed 1 running /2  ", firstCode),
+              std::string::npos)
+        << "no progress line below the first machine's code: " << bytes;
+    EXPECT_NE(bytes.find("\033[K\033[A\033[2G", firstCode), std::string::npos) << bytes;
+
+    FleetTest::TerminalScreen screen(gc_Width);
+    screen.write(bytes);
+    EXPECT_EQ(screen.unknownSequences(), std::vector<std::string>{});
+    EXPECT_EQ(screen.rows(), expected) << "the final screen holds exactly the output lines";
+}
+
 TEST(FleetProgress, NothingOfItWhenStandardErrorIsAFile) {
     SimulatedConsole const console(slowConsole());
     QuorvexTest::TemporaryDirectory const work;

@@ -1,5 +1,7 @@
 #include "TerminalScreen.h"
 
+#include <algorithm>
+
 namespace FleetTest {
 
 TerminalScreen::TerminalScreen(std::size_t width) : _width(width) {}
@@ -63,6 +65,15 @@ std::size_t TerminalScreen::_escape(std::string const& bytes, std::size_t at) {
         _row = _row == 0 ? 0 : _row - 1;
         return at + 2;
     }
+    if (bytes.compare(at, 3, "\033[B") == 0) {
+        ++_row;
+        return at + 2;
+    }
+    if (std::size_t const end = _columnSequenceEnd(bytes, at); end != 0) {
+        std::size_t const column = std::stoul(bytes.substr(at + 2, end - at - 2));
+        _column = std::min(column == 0 ? 0 : column - 1, _width - 1);
+        return end;
+    }
     if (bytes.compare(at, 2, "\0337") == 0) {
         _saved = {_row, _column};
         return at + 1;
@@ -74,6 +85,19 @@ std::size_t TerminalScreen::_escape(std::string const& bytes, std::size_t at) {
     }
     _unknown.push_back(bytes.substr(at, 4));
     return at;
+}
+
+// The index of the G ending an "ESC [ digits G" sequence at bytes[at]; 0 if
+// there is none.
+std::size_t TerminalScreen::_columnSequenceEnd(std::string const& bytes, std::size_t at) {
+    if (bytes.compare(at, 2, "\033[") != 0) {
+        return 0;
+    }
+    std::size_t const end = bytes.find_first_not_of("0123456789", at + 2);
+    if (end == at + 2 || end == std::string::npos || bytes[end] != 'G') {
+        return 0;
+    }
+    return end;
 }
 
 } // namespace FleetTest

@@ -3,8 +3,9 @@
 // program that redraws one line in place. Printable bytes overwrite the
 // screen at the cursor and wrap at the width, a carriage return goes to the
 // start of the row, a line feed to the start of the next row, ESC [ K
-// erases from the cursor to the end of the row, ESC [ A moves up a row, and
-// ESC 7 and ESC 8 save and restore the cursor. Any other escape sequence is
+// erases from the cursor to the end of the row, ESC [ A and ESC [ B move up
+// and down a row, ESC [ n G moves to column n (from 1), and ESC 7 and ESC 8
+// save and restore the cursor. Any other escape sequence is
 // recorded as unknown.
 
 #include <string>
@@ -27,6 +28,7 @@ public:
 private:
     void _put(char c);
     std::size_t _escape(std::string const& bytes, std::size_t at);
+    static std::size_t _columnSequenceEnd(std::string const& bytes, std::size_t at);
 
     std::size_t _width;
     std::vector<std::string> _rows{""};

@@ -33,6 +33,16 @@ TEST(TerminalScreen, SavedCursorAndRowUpReturnToAnEarlierPlace) {
     EXPECT_EQ(shown("one\ntwo\033[A\rON"), (std::vector<std::string>{"ONe", "two"}));
 }
 
+TEST(TerminalScreen, RowDownAndColumnMoveReturnAfterAnOpenRow) {
+    EXPECT_EQ(shown("code 4\n\rline\033[K\033[A\033[7G\033[B\r\033[K\033[A\033[7GX"),
+              (std::vector<std::string>{"code 4X"}));
+    EXPECT_EQ(shown("ab\033[99Gc", 10), (std::vector<std::string>{"ab       c"}));
+    TerminalScreen screen(20);
+    screen.write("a\033[B\033[3Gb");
+    EXPECT_EQ(screen.unknownSequences(), std::vector<std::string>{});
+    EXPECT_EQ(screen.rows(), (std::vector<std::string>{"a", "  b"}));
+}
+
 TEST(TerminalScreen, OtherEscapeSequencesAreReported) {
     TerminalScreen screen(20);
     screen.write("a\033[1mb");

@@ -44,6 +44,33 @@ bool _makeTmpReadOnly() {
                    nullptr) == 0;
 }
 
+bool _isProotSandbox() {
+    char const* kind = std::getenv("QUORVEX_SANDBOX_KIND");
+    return kind != nullptr && std::string(kind) == "proot";
+}
+
+// Under proot no mount namespace can be made, but the command runs without
+// capabilities, so file modes hold: a /tmp without write permission refuses
+// new files as a read-only mount does. Run in the child, which puts the mode
+// back after the check, so the parent can still clear up in /tmp.
+int _checkWithTmpWithoutWritePermission(std::function<bool()> const& check) {
+    namespace fs = std::filesystem;
+    constexpr fs::perms readAndSearchOnly = fs::perms::owner_read | fs::perms::owner_exec |
+                                            fs::perms::group_read | fs::perms::group_exec |
+                                            fs::perms::others_read | fs::perms::others_exec;
+    std::error_code error;
+    fs::perms const mode = fs::status(gc_TemporaryFolder, error).permissions();
+    if (!error) {
+        fs::permissions(gc_TemporaryFolder, readAndSearchOnly, error);
+    }
+    if (error) {
+        return gc_NoReadOnlyTmp;
+    }
+    int const result = check() ? gc_CheckHeld : gc_CheckFailed;
+    fs::permissions(gc_TemporaryFolder, mode, error);
+    return result;
+}
+
 } // namespace
 
 std::string sandboxPath() {
@@ -90,6 +117,10 @@ CommandResult runInSandbox(std::vector<std::string> const& sandboxOptions,
 }
 
 int checkWithReadOnlyTmp(std::function<bool()> const& check) {
+    if (_isProotSandbox()) {
+        return runInChild([&check]() { return _checkWithTmpWithoutWritePermission(check); })
+            .exitStatus;
+    }
     return runInChild([&check]() {
                if (!_makeTmpReadOnly()) {
                    return gc_NoReadOnlyTmp;

@@ -42,8 +42,10 @@ inline constexpr int gc_NoReadOnlyTmp = 2;
 
 // Runs check in a child process with a mount namespace of its own where /tmp
 // is read-only (its files stay readable), so that no shell command can make
-// its output files there. Returns gc_CheckHeld or gc_CheckFailed, or
-// gc_NoReadOnlyTmp when /tmp could not be made read-only.
+// its output files there; in a proot sandbox, where no namespace can be made,
+// /tmp loses its write permission for the time of the check instead.
+// Returns gc_CheckHeld or gc_CheckFailed, or gc_NoReadOnlyTmp when /tmp could
+// not be made read-only.
 int checkWithReadOnlyTmp(std::function<bool()> const& check);
 
 } // namespace QuorvexTest
