@@ -9,25 +9,12 @@
 
 namespace Fleet {
 
-namespace {
-
-constexpr char gc_TraceFolder[] = "Trace/";
-constexpr char gc_StatusSuffix[] = ".status";
-constexpr char gc_TraceSuffix[] = ".Trace";
-
-std::string machineStem(char const* folder, std::string const& identity) {
-    using namespace Quorvex::PYLON::VPD;
-    return std::string(gc_QuorvexDirectory) + folder + gc_ProgramName + "_" + identity;
-}
-
-} // namespace
-
 std::string RunFiles::statusFile(std::string const& identity) {
-    return machineStem(Quorvex::PYLON::VPD::gc_VPD_Folder, identity) + gc_StatusSuffix;
+    return Quorvex::PYLON::VPD::get_StatusFileName(identity);
 }
 
 std::string RunFiles::traceFile(std::string const& identity) {
-    return machineStem(gc_TraceFolder, identity) + gc_TraceSuffix;
+    return Quorvex::PYLON::VPD::get_MachineTraceFileName(identity);
 }
 
 std::string RunFiles::tracePiece(std::string const& identity, std::size_t piece) {

@@ -14,8 +14,8 @@ namespace {
 
 using QuorvexTest::CommandResult;
 
-constexpr char gc_VPD_Folder[] = QuorvexTest::gc_VPD_Folder;
-constexpr char gc_Trace_Folder[] = QuorvexTest::gc_TraceFolder;
+constexpr char const* gc_VPD_Folder = QuorvexTest::gc_VPD_Folder;
+constexpr char const* gc_Trace_Folder = QuorvexTest::gc_TraceFolder;
 constexpr char gc_Machine[] = "9119-MHE_21ABCDE";
 constexpr char gc_StatusFile[] =
     "/var/adm/quorvex/VPD/quorvexPYLON_VPD_Survey_ClientPartition_9119-MHE_21ABCDE.status";

@@ -27,6 +27,11 @@ std::string get_TraceFileName() {
     return std::string(gc_QuorvexDirectory) + gc_Trace_Folder + gc_ProgramName + gc_TraceSuffix;
 }
 
+std::string get_MachineTraceFileName(std::string const& machineIdentity) {
+    return std::string(gc_QuorvexDirectory) + gc_Trace_Folder + gc_ProgramName + gc_NameSeparator +
+           machineIdentity + gc_TraceSuffix;
+}
+
 std::string get_StatusFileName(std::string const& machineIdentity) {
     return std::string(gc_QuorvexDirectory) + gc_VPD_Folder + gc_ProgramName + gc_NameSeparator +
            machineIdentity + gc_StatusSuffix;

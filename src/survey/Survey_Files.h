@@ -15,6 +15,11 @@ inline constexpr char gc_ProgramName[] = "quorvexPYLON_VPD_Survey_ClientPartitio
 // The trace of the run: rewritten by every run.
 std::string get_TraceFileName();
 
+// The trace of one machine's survey in a run over several machines, which
+// keeps every machine's trace: the run's trace name with "_" and the machine
+// identity before its suffix.
+std::string get_MachineTraceFileName(std::string const& machineIdentity);
+
 // The status file of the machine named on the command line, the identity
 // taken as given.
 std::string get_StatusFileName(std::string const& machineIdentity);

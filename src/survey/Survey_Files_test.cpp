@@ -12,6 +12,12 @@ TEST(Survey_Files, TraceFileIsInTheTraceFolderNamedAfterTheTool) {
               "/var/adm/quorvex/Trace/quorvexPYLON_VPD_Survey_ClientPartition.Trace");
 }
 
+TEST(Survey_Files, MachineTraceIsTheRunTraceNamedAfterTheIdentityAsGiven) {
+    EXPECT_EQ(VPD::get_MachineTraceFileName("1234-ABC_10ABCDE"),
+              "/var/adm/quorvex/Trace/"
+              "quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE.Trace");
+}
+
 TEST(Survey_Files, StatusFileIsInTheVPDFolderNamedAfterTheIdentityAsGiven) {
     EXPECT_EQ(
         VPD::get_StatusFileName("1234-ABC_10ABCDE"),
