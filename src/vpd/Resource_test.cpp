@@ -231,9 +231,12 @@ TEST(VPD_Resource, MovingCopiesAndLeavesTheSourceWhole) {
     Resource source = u_threeLevelTree();
     Resource const moved(std::move(source)); // NOLINT(performance-move-const-arg)
     EXPECT_EQ(resourceText(moved), gc_ThreeLevelTree);
+    // cppcheck-suppress accessMoved
     EXPECT_EQ(resourceText(source), gc_ThreeLevelTree); // NOLINT(bugprone-use-after-move)
     Resource target;
-    target = std::move(source);                         // NOLINT(performance-move-const-arg)
+    // cppcheck-suppress accessMoved
+    target = std::move(source); // NOLINT(performance-move-const-arg)
+    // cppcheck-suppress accessMoved
     EXPECT_EQ(resourceText(source), gc_ThreeLevelTree); // NOLINT(bugprone-use-after-move)
     EXPECT_TRUE(source.insert_Resource("Partitions", Resource("p", "p")));
 }
