@@ -25,6 +25,17 @@ if(QUORVEX_COVERAGE)
   target_link_options(quorvex_options INTERFACE --coverage)
 endif()
 
+# quorvex_link_cxx_runtime(<executable>)
+# With QUORVEX_STATIC_CXX_RUNTIME the C++ runtime is linked into the
+# executable: the shared one maps pages these programs never need and costs
+# a relocation pass at every start, and the console starts them (and the
+# simulated console's tools) once per machine or per remote action.
+function(quorvex_link_cxx_runtime target)
+  if(QUORVEX_STATIC_CXX_RUNTIME)
+    target_link_options(${target} PRIVATE -static-libstdc++ -static-libgcc)
+  endif()
+endfunction()
+
 # Root of the source tree, for tests and tools that need the sandbox runner
 # or the simulated console's scenarios.
 set(QUORVEX_SOURCE_ROOT "${PROJECT_SOURCE_DIR}")

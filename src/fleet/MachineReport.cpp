@@ -44,4 +44,18 @@ std::vector<std::string> MachineReport::returnCodes(MachineRecord const& machine
     return codes;
 }
 
+std::optional<std::string> MachineReport::traceText(MachineRecord const& machine) {
+    std::optional<std::string> text;
+    auto const append = [&text](std::optional<std::string> const& piece) {
+        if (piece) {
+            (text ? *text : text.emplace()).append(*piece);
+        }
+    };
+    append(machine.listingTrace);
+    for (auto const& record : machine.partitions) {
+        append(record.trace);
+    }
+    return text;
+}
+
 } // namespace Fleet

@@ -83,4 +83,23 @@ TEST(MachineReport, ReturnCodesFollowListingOrder) {
               (std::vector<std::string>{"0", "8", "8"}));
 }
 
+TEST(MachineReport, TraceJoinsTheListingAndThePartitionBlocksInListingOrder) {
+    MachineRecord machine = mixedMachine();
+    machine.listingTrace = "listing\n";
+    machine.partitions[2].trace = "third\n";
+    machine.partitions[0].trace = "first\n";
+    EXPECT_EQ(MachineReport::traceText(machine), std::optional<std::string>("listing\nfirst\nthird\n"));
+}
+
+TEST(MachineReport, TraceOfPartitionsAloneKeepsTheirBlocks) {
+    MachineRecord machine = mixedMachine();
+    machine.partitions[1].trace = "";
+    machine.partitions[2].trace = "third\n";
+    EXPECT_EQ(MachineReport::traceText(machine), std::optional<std::string>("third\n"));
+}
+
+TEST(MachineReport, NoTraceWhenNoUnitWroteOne) {
+    EXPECT_EQ(MachineReport::traceText(mixedMachine()), std::nullopt);
+}
+
 } // namespace

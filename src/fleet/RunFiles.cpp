@@ -6,6 +6,7 @@
 
 #include <cstdio>
 #include <fstream>
+#include <sstream>
 
 namespace Fleet {
 
@@ -17,8 +18,8 @@ std::string RunFiles::traceFile(std::string const& identity) {
     return Quorvex::PYLON::VPD::get_MachineTraceFileName(identity);
 }
 
-std::string RunFiles::tracePiece(std::string const& identity, std::size_t piece) {
-    return traceFile(identity) + ".piece-" + std::to_string(getpid()) + "-" + std::to_string(piece);
+std::string RunFiles::tracePiece(std::string const& identity, std::size_t slot) {
+    return traceFile(identity) + ".piece-" + std::to_string(getpid()) + "-" + std::to_string(slot);
 }
 
 std::string RunFiles::_temporaryName(std::string const& path) {
@@ -47,31 +48,21 @@ bool RunFiles::writeAtomically(std::string const& path, std::string const& text)
     return true;
 }
 
-void RunFiles::joinPieces(std::vector<std::string> const& pieces, std::string const& target) {
-    std::string const temporary = _temporaryName(target);
-    bool anyPiece = false;
-    {
-        std::ofstream joined;
-        for (auto const& piece : pieces) {
-            std::ifstream input(piece, std::ios::binary);
-            if (!input) {
-                continue;
-            }
-            if (!anyPiece) {
-                joined.open(temporary, std::ios::binary | std::ios::trunc);
-                anyPiece = true;
-            }
-            if (joined && input.peek() != std::ifstream::traits_type::eof()) {
-                joined << input.rdbuf();
-            }
-        }
+std::optional<std::string> RunFiles::takePiece(std::string const& piece) {
+    std::ifstream input(piece, std::ios::binary);
+    if (!input) {
+        return std::nullopt;
     }
-    for (auto const& piece : pieces) {
+    std::ostringstream text;
+    if (input.peek() != std::ifstream::traits_type::eof()) {
+        text << input.rdbuf();
+    }
+    input.close();
+    if (truncate(piece.c_str(), 0) != 0) {
+        // A piece that cannot be emptied must not reach the slot's next unit.
         std::remove(piece.c_str());
     }
-    if (anyPiece && std::rename(temporary.c_str(), target.c_str()) != 0) {
-        std::remove(temporary.c_str());
-    }
+    return text.str();
 }
 
 } // namespace Fleet

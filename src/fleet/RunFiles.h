@@ -1,7 +1,7 @@
 #pragma once
 
+#include <optional>
 #include <string>
-#include <vector>
 
 namespace Fleet {
 
@@ -14,14 +14,17 @@ class RunFiles {
 public:
     static std::string statusFile(std::string const& identity);
     static std::string traceFile(std::string const& identity);
-    // The temporary piece of a machine's trace written by one unit of work.
-    static std::string tracePiece(std::string const& identity, std::size_t piece);
+    // The temporary piece of a machine's trace that the unit of work running
+    // in one slot writes. The slot's next unit of the machine writes over it,
+    // so a run creates at most one piece file per slot and machine rather than
+    // one per partition.
+    static std::string tracePiece(std::string const& identity, std::size_t slot);
 
     // Writes text to path through a temporary name; false when it could not.
     static bool writeAtomically(std::string const& path, std::string const& text);
-    // Joins the pieces that exist, in order, into target through a temporary
-    // name, and removes them. Nothing is written when no piece exists.
-    static void joinPieces(std::vector<std::string> const& pieces, std::string const& target);
+    // What a piece holds, nothing when it does not exist; the piece is left
+    // empty for the slot's next unit.
+    static std::optional<std::string> takePiece(std::string const& piece);
 
 private:
     static std::string _temporaryName(std::string const& path);

@@ -24,12 +24,17 @@ struct PartitionRecord {
     bool interrupted = false;
     std::optional<ActionStop> stop;
     std::optional<double> seconds;
+    // The partition's block of the machine's trace, taken as soon as its
+    // unit ends; none when the unit wrote nothing.
+    std::optional<std::string> trace;
 };
 
 // One machine of the run, its listing and its partitions in listing order.
 struct MachineRecord {
     std::string identity;
     bool listed = false;
+    // The lines the listing unit wrote to the trace.
+    std::optional<std::string> listingTrace;
     std::vector<PartitionRecord> partitions;
 };
 

@@ -21,6 +21,9 @@ namespace Fleet {
 namespace {
 
 constexpr int gc_PollMilliseconds = 50;
+// A child that has closed its result pipe is about to end; its exit is
+// awaited this closely, so that the next unit starts at once.
+constexpr int gc_EndingPollMilliseconds = 1;
 constexpr auto gc_ProgressInterval = std::chrono::milliseconds(200);
 constexpr char gc_RemoteActionTool[] = "runact-api";
 constexpr char gc_FetchAction[] = "getFileFromPartition";
@@ -115,19 +118,39 @@ PartitionRecord& SurveyRun::_record(Scheduler::Unit const& unit) {
     return _machines[unit.machine].partitions[*unit.partition];
 }
 
+std::size_t SurveyRun::_takeSlot() {
+    auto const free = std::find(_slotInUse.begin(), _slotInUse.end(), false);
+    std::size_t const slot = static_cast<std::size_t>(free - _slotInUse.begin());
+    if (free == _slotInUse.end()) {
+        _slotInUse.push_back(true);
+    } else {
+        *free = true;
+    }
+    return slot;
+}
+
+std::string SurveyRun::_tracePiece(Running const& running) const {
+    return RunFiles::tracePiece(_machines[running.unit.machine].identity, running.slot);
+}
+
 void SurveyRun::_startUnit(Scheduler::Unit const& unit) {
-    MachineRecord const& machine = _machines[unit.machine];
-    std::string const identity = machine.identity;
+    Running running{unit, nullptr, Clock::now(), _takeSlot()};
+    std::string const piece = _tracePiece(running);
     ChildProcess::Body body;
     if (unit.partition) {
-        auto const partition = machine.partitions[*unit.partition].partition;
-        std::string const piece = RunFiles::tracePiece(identity, *unit.partition + 1);
+        auto const partition = _record(unit).partition;
         body = [partition, piece] { return WorkUnits::surveyPartition(partition, piece); };
     } else {
-        std::string const piece = RunFiles::tracePiece(identity, 0);
+        std::string const identity = _machines[unit.machine].identity;
         body = [identity, piece] { return WorkUnits::listPartitions(identity, piece); };
     }
-    Running running{unit, std::make_unique<ChildProcess>(body), Clock::now()};
+    // The start time is taken before the fork, so that no action of the
+    // child is older than the unit.
+    running.started = Clock::now();
+    running.child = std::make_unique<ChildProcess>(body);
+    if (!running.child->isStarted()) {
+        _slotInUse[running.slot] = false;
+    }
     if (!running.child->isStarted() && unit.partition) {
         PartitionRecord& record = _record(unit);
         record.outcome = notStartedOutcome();
@@ -145,15 +168,18 @@ void SurveyRun::_startUnit(Scheduler::Unit const& unit) {
 
 void SurveyRun::_waitForEvents() {
     std::vector<pollfd> descriptors;
+    int timeout = gc_PollMilliseconds;
     if (SignalPipe::readDescriptor() >= 0) {
         descriptors.push_back({SignalPipe::readDescriptor(), POLLIN, 0});
     }
     for (auto const& running : _running) {
         if (running.child->resultDescriptor() >= 0) {
             descriptors.push_back({running.child->resultDescriptor(), POLLIN, 0});
+        } else if (!running.child->isReaped()) {
+            timeout = gc_EndingPollMilliseconds;
         }
     }
-    poll(descriptors.data(), descriptors.size(), gc_PollMilliseconds);
+    poll(descriptors.data(), descriptors.size(), timeout);
 }
 
 void SurveyRun::_collectFinished() {
@@ -170,6 +196,7 @@ void SurveyRun::_collectFinished() {
 }
 
 void SurveyRun::_finish(Running& running) {
+    _slotInUse[running.slot] = false;
     if (running.unit.partition) {
         _finishSurvey(running);
     } else {
@@ -179,10 +206,12 @@ void SurveyRun::_finish(Running& running) {
 
 void SurveyRun::_finishListing(Running& running) {
     _scheduler.finish(running.unit);
+    std::optional<std::string> trace = RunFiles::takePiece(_tracePiece(running));
     if (running.listingStopped) {
         return;
     }
     MachineRecord& machine = _machines[running.unit.machine];
+    machine.listingTrace = std::move(trace);
     auto const partitions = WorkUnits::decodePartitions(machine.identity, running.child->result());
     std::vector<std::string> ids;
     for (auto const& partition : partitions.value_or(std::vector<Quorvex::System::Partition>{})) {
@@ -200,6 +229,7 @@ void SurveyRun::_finishSurvey(Running& running) {
     record.outcome =
         WorkUnits::decodeOutcome(running.child->result()).value_or(notStartedOutcome());
     record.seconds = _secondsSince(running.started);
+    record.trace = RunFiles::takePiece(_tracePiece(running));
     record.finished = true;
     if (record.interrupted) {
         record.outcome.returnCode = gc_NotSurveyedCode;
@@ -210,7 +240,7 @@ void SurveyRun::_finishSurvey(Running& running) {
 
 void SurveyRun::_enforceLimits() {
     for (auto& running : _running) {
-        if (running.child->isReaped()) {
+        if (running.child->isReaped() || !_mayHaveActionToStop(running)) {
             continue;
         }
         for (pid_t action : ProcessTree::childrenOf(running.child->pid())) {
@@ -227,6 +257,17 @@ void SurveyRun::_enforceLimits() {
             }
         }
     }
+}
+
+// No action of a unit is older than the unit, so units younger than the time
+// limit are not looked up in /proc: with many in flight that would cost more
+// than the work itself.
+bool SurveyRun::_mayHaveActionToStop(Running const& running) const {
+    if (_signal != 0) {
+        return true;
+    }
+    return _options.timeoutSeconds > 0 &&
+           _secondsSince(running.started) >= static_cast<double>(_options.timeoutSeconds);
 }
 
 bool SurveyRun::_stopAction(Running& running, pid_t action) {
@@ -294,13 +335,9 @@ void SurveyRun::_reportReadyMachines(bool runOver) {
 
 void SurveyRun::_reportMachine(std::size_t index) {
     MachineRecord const& machine = _machines[index];
-    std::vector<std::string> pieces;
-    for (std::size_t piece = 0; piece <= machine.partitions.size(); ++piece) {
-        pieces.push_back(RunFiles::tracePiece(machine.identity, piece));
-    }
+    _removeTracePieces(machine.identity);
     if (!machine.listed) {
         // A listing stopped by an interruption leaves no files and prints nothing.
-        std::remove(pieces.front().c_str());
         return;
     }
     _eraseProgress();
@@ -309,7 +346,15 @@ void SurveyRun::_reportMachine(std::size_t index) {
     _openColumns = std::string(get_OverallCode(MachineReport::returnCodes(machine))).size();
     RunFiles::writeAtomically(RunFiles::statusFile(machine.identity),
                               MachineReport::statusText(machine));
-    RunFiles::joinPieces(pieces, RunFiles::traceFile(machine.identity));
+    if (auto const trace = MachineReport::traceText(machine)) {
+        RunFiles::writeAtomically(RunFiles::traceFile(machine.identity), *trace);
+    }
+}
+
+void SurveyRun::_removeTracePieces(std::string const& identity) const {
+    for (std::size_t slot = 0; slot < _slotInUse.size(); ++slot) {
+        std::remove(RunFiles::tracePiece(identity, slot).c_str());
+    }
 }
 
 double SurveyRun::_secondsSince(Clock::time_point start) const {

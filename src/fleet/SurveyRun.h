@@ -37,11 +37,15 @@ private:
         Scheduler::Unit unit;
         std::unique_ptr<ChildProcess> child;
         Clock::time_point started;
+        // Which of the run's trace pieces the unit writes.
+        std::size_t slot = 0;
         bool listingStopped = false;
     };
 
     void _startUnits();
     void _startUnit(Scheduler::Unit const& unit);
+    std::size_t _takeSlot();
+    std::string _tracePiece(Running const& running) const;
     void _waitForEvents();
     void _takeSignal();
     void _collectFinished();
@@ -49,12 +53,14 @@ private:
     void _finishListing(Running& running);
     void _finishSurvey(Running& running);
     void _enforceLimits();
+    bool _mayHaveActionToStop(Running const& running) const;
     bool _stopAction(Running& running, pid_t action);
     std::string _stopNote(double seconds) const;
     void _markUnfinished();
     // runOver: every machine left is reported, done or not.
     void _reportReadyMachines(bool runOver);
     void _reportMachine(std::size_t index);
+    void _removeTracePieces(std::string const& identity) const;
     void _drawProgress();
     void _eraseProgress();
     PartitionRecord& _record(Scheduler::Unit const& unit);
@@ -64,6 +70,8 @@ private:
     std::vector<MachineRecord> _machines;
     Scheduler _scheduler;
     std::vector<Running> _running;
+    // Slots of units in flight; a unit takes the first free one.
+    std::vector<bool> _slotInUse;
     std::size_t _reported = 0;
     int _signal = 0;
     bool _showProgress = false;
