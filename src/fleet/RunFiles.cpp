@@ -1,5 +1,6 @@
 #include "fleet/RunFiles.h"
 
+#include "report/AtomicFile.h"
 #include "survey/Survey_Files.h"
 
 #include <unistd.h>
@@ -7,6 +8,7 @@
 #include <cstdio>
 #include <fstream>
 #include <sstream>
+#include <stdexcept>
 
 namespace Fleet {
 
@@ -22,30 +24,13 @@ std::string RunFiles::tracePiece(std::string const& identity, std::size_t slot) 
     return traceFile(identity) + ".piece-" + std::to_string(getpid()) + "-" + std::to_string(slot);
 }
 
-std::string RunFiles::_temporaryName(std::string const& path) {
-    return path + ".tmp-" + std::to_string(getpid());
-}
-
 bool RunFiles::writeAtomically(std::string const& path, std::string const& text) {
-    std::string const temporary = _temporaryName(path);
-    {
-        std::ofstream file(temporary, std::ios::binary | std::ios::trunc);
-        if (!file) {
-            return false;
-        }
-        file << text;
-        file.flush();
-        if (!file) {
-            file.close();
-            std::remove(temporary.c_str());
-            return false;
-        }
-    }
-    if (std::rename(temporary.c_str(), path.c_str()) != 0) {
-        std::remove(temporary.c_str());
+    try {
+        report::writeFileAtomically(path, text);
+        return true;
+    } catch (std::runtime_error const&) {
         return false;
     }
-    return true;
 }
 
 std::optional<std::string> RunFiles::takePiece(std::string const& piece) {

@@ -25,9 +25,6 @@ public:
     // What a piece holds, nothing when it does not exist; the piece is left
     // empty for the slot's next unit.
     static std::optional<std::string> takePiece(std::string const& piece);
-
-private:
-    static std::string _temporaryName(std::string const& path);
 };
 
 } // namespace Fleet

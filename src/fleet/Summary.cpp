@@ -5,7 +5,6 @@
 #include "survey/calculate_ReturnCode.h"
 
 #include <algorithm>
-#include <ctime>
 #include <iterator>
 
 namespace Fleet {
@@ -134,20 +133,6 @@ nlohmann::json Summary::build(RunFacts const& facts, std::vector<MachineRecord> 
 
 std::string Summary::text(nlohmann::json const& summary) {
     return summary.dump(2, ' ', false, nlohmann::json::error_handler_t::replace) + "\n";
-}
-
-std::string Summary::localTime(std::time_t time) {
-    std::tm local{};
-    localtime_r(&time, &local);
-    char formatted[64];
-    std::size_t const length =
-        std::strftime(formatted, sizeof formatted, "%Y-%m-%dT%H:%M:%S%z", &local);
-    std::string result(formatted, length);
-    // "+0100" becomes "+01:00".
-    if (result.size() >= 5) {
-        result.insert(result.size() - 2, ":");
-    }
-    return result;
 }
 
 } // namespace Fleet

@@ -33,8 +33,6 @@ public:
     static std::string outcomeName(PartitionRecord const& record);
     // The summary's text; bytes that are not UTF-8 are replaced.
     static std::string text(nlohmann::json const& summary);
-    // Local time in ISO 8601 with the offset, e.g. 2026-11-23T14:05:09+01:00.
-    static std::string localTime(std::time_t time);
 
 private:
     static nlohmann::json _machine(MachineRecord const& machine);

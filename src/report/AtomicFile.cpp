@@ -45,6 +45,12 @@ bool writeAll(int descriptor, std::string const& text) {
     return true;
 }
 
+mode_t newFileMode() {
+    mode_t const mask = ::umask(0);
+    ::umask(mask);
+    return static_cast<mode_t>(0666 & ~mask);
+}
+
 } // namespace
 
 void writeFileAtomically(std::string const& path, std::string const& text) {
@@ -55,9 +61,9 @@ void writeFileAtomically(std::string const& path, std::string const& text) {
     if (descriptor < 0) {
         throw failure(path, errno);
     }
-    // mkstemp makes the file readable by its owner only; a report is for
-    // everyone who may read the folder.
-    ::fchmod(descriptor, S_IRUSR | S_IWUSR | S_IRGRP | S_IROTH);
+    // mkstemp makes the file readable by its owner only; the file gets the
+    // mode any file written in place would get, as the survey tool's files do.
+    ::fchmod(descriptor, newFileMode());
     bool const complete = writeAll(descriptor, text);
     int const error = errno;
     bool const closed = ::close(descriptor) == 0;

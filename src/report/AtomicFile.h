@@ -6,7 +6,8 @@ namespace report {
 
 // Writes text into path through a temporary file in the same folder that is
 // renamed over path once complete, so a reader sees the old file or the new
-// one, never part of it. Throws std::runtime_error naming the path when the
+// one, never part of it. The file has the mode a new file gets under the
+// process's umask. Throws std::runtime_error naming the path when the
 // file cannot be written; the temporary file is removed then.
 void writeFileAtomically(std::string const& path, std::string const& text);
 

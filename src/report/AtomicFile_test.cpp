@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdio>
 #include <filesystem>
 #include <stdexcept>
 #include <sys/stat.h>
@@ -32,12 +33,28 @@ TEST(AtomicFile, ReplacesAnExistingFile) {
     EXPECT_EQ("new", QuorvexTest::readFile(folder.file("out")));
 }
 
-TEST(AtomicFile, FileIsReadableByEveryone) {
+// The permissions, in octal, of a file made by the writer under umask, read
+// in a child process, since umask is the whole process's.
+std::string modeUnderUmask(mode_t mask) {
     QuorvexTest::TemporaryDirectory folder;
-    report::writeFileAtomically(folder.file("out"), "x");
-    struct stat status {};
-    ASSERT_EQ(0, ::stat(folder.file("out").c_str(), &status));
-    EXPECT_EQ(0644U, status.st_mode & 0777U);
+    auto const result = QuorvexTest::runInChild([&folder, mask] {
+        ::umask(mask);
+        report::writeFileAtomically(folder.file("out"), "x");
+        struct stat status {};
+        if (::stat(folder.file("out").c_str(), &status) != 0) {
+            return 1;
+        }
+        std::printf("%o", static_cast<unsigned int>(status.st_mode & 0777U));
+        return 0;
+    });
+    EXPECT_EQ(0, result.exitStatus);
+    return result.stdoutText;
+}
+
+TEST(AtomicFile, FileHasTheModeOfAnyNewFileUnderTheUmask) {
+    EXPECT_EQ("644", modeUnderUmask(022));
+    EXPECT_EQ("640", modeUnderUmask(027));
+    EXPECT_EQ("664", modeUnderUmask(002));
 }
 
 TEST(AtomicFile, MissingFolderThrowsNamingThePath) {
