@@ -180,11 +180,29 @@ void SurveyRun::_waitForEvents() {
         }
     }
     poll(descriptors.data(), descriptors.size(), timeout);
+    _readyDescriptors.clear();
+    for (auto const& descriptor : descriptors) {
+        if (descriptor.revents != 0) {
+            _readyDescriptors.push_back(descriptor.fd);
+        }
+    }
+}
+
+// With many units in flight, only those whose pipe has something to say are
+// read, not every one at every event.
+bool SurveyRun::_mayHaveEnded(Running const& running) const {
+    int const descriptor = running.child->resultDescriptor();
+    return descriptor < 0 || std::find(_readyDescriptors.begin(), _readyDescriptors.end(),
+                                       descriptor) != _readyDescriptors.end();
 }
 
 void SurveyRun::_collectFinished() {
     for (std::size_t i = 0; i < _running.size();) {
         Running& running = _running[i];
+        if (!_mayHaveEnded(running)) {
+            ++i;
+            continue;
+        }
         running.child->readAvailable();
         if (running.child->resultDescriptor() < 0 && running.child->reap()) {
             _finish(running);

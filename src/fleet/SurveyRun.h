@@ -49,6 +49,7 @@ private:
     void _waitForEvents();
     void _takeSignal();
     void _collectFinished();
+    bool _mayHaveEnded(Running const& running) const;
     void _finish(Running& running);
     void _finishListing(Running& running);
     void _finishSurvey(Running& running);
@@ -70,6 +71,8 @@ private:
     std::vector<MachineRecord> _machines;
     Scheduler _scheduler;
     std::vector<Running> _running;
+    // The descriptors the last wait found readable or closed.
+    std::vector<int> _readyDescriptors;
     // Slots of units in flight; a unit takes the first free one.
     std::vector<bool> _slotInUse;
     std::size_t _reported = 0;
