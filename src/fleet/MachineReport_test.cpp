@@ -88,7 +88,8 @@ TEST(MachineReport, TraceJoinsTheListingAndThePartitionBlocksInListingOrder) {
     machine.listingTrace = "listing\n";
     machine.partitions[2].trace = "third\n";
     machine.partitions[0].trace = "first\n";
-    EXPECT_EQ(MachineReport::traceText(machine), std::optional<std::string>("listing\nfirst\nthird\n"));
+    EXPECT_EQ(MachineReport::traceText(machine),
+              std::optional<std::string>("listing\nfirst\nthird\n"));
 }
 
 TEST(MachineReport, TraceOfPartitionsAloneKeepsTheirBlocks) {
