@@ -2,8 +2,7 @@
 
 #include "relay/FileInfo.h"
 #include "relay/RELAY_Utility.h"
-
-#include <sstream>
+#include "utility/StringUtility.h"
 
 namespace Quorvex::RELAY {
 
@@ -28,11 +27,10 @@ std::string GetFileFromPartition::createString_GetFileParameters(std::string con
     FileInfo const remote(remoteFileName, "", "", "");
     FileInfo local(localFileName, "", "", "");
     RELAY_Utility::set_Default_PYLON_FileInfo(local);
-    std::ostringstream parameters;
-    parameters << RELAY_Utility::create_Parameter("RemoteFN", remote.get_FileName())
-               << "::" << RELAY_Utility::create_Parameter("LocalFN", local.get_FileName()) << "::"
-               << RELAY_Utility::create_Parameter("LocalFileInfo", local.get_FileInfoString());
-    return parameters.str();
+    return StringUtility::concatenate(
+        {RELAY_Utility::create_Parameter("RemoteFN", remote.get_FileName()),
+         "::", RELAY_Utility::create_Parameter("LocalFN", local.get_FileName()),
+         "::", RELAY_Utility::create_Parameter("LocalFileInfo", local.get_FileInfoString())});
 }
 
 } // namespace Quorvex::RELAY

@@ -1,8 +1,10 @@
 #include "relay/RELAY_Utility.h"
 
 #include "relay/FileInfo.h"
+#include "utility/StringUtility.h"
 
-#include <sstream>
+#include <charconv>
+#include <iterator>
 
 namespace Quorvex::RELAY {
 
@@ -26,16 +28,14 @@ void _u_set_Default_FileInfo(FileInfo& info, std::string const& group) {
 // Quoted but not escaped. Kept for the remote action tool: see
 // docs/compatibility.md#no-escaping-command-line
 std::string RELAY_Utility::create_Parameter(std::string const& name, std::string const& value) {
-    std::ostringstream parameter;
-    parameter << name << "::"
-              << "\"" << value << "\"";
-    return parameter.str();
+    return StringUtility::concatenate({name, "::\"", value, "\""});
 }
 
 std::string RELAY_Utility::create_Parameter(std::string const& name, long const& value) {
-    std::ostringstream parameter;
-    parameter << name << "::" << value;
-    return parameter.str();
+    // Formatted on the stack: one allocation for the whole parameter.
+    char digits[24];
+    auto const end = std::to_chars(std::begin(digits), std::end(digits), value).ptr;
+    return StringUtility::concatenate({name, "::", std::string_view(digits, end - digits)});
 }
 
 void RELAY_Utility::set_Default_PYLON_FileInfo(FileInfo& info) {

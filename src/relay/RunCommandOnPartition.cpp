@@ -2,8 +2,7 @@
 
 #include "quorvex/Version.h"
 #include "relay/RELAY_Utility.h"
-
-#include <sstream>
+#include "utility/StringUtility.h"
 
 namespace Quorvex::RELAY {
 
@@ -37,14 +36,11 @@ int RunCommandOnPartition::execute_PartitionQuorvex(std::string const& options,
 std::string RunCommandOnPartition::createString_RunCommandParameters(long const& commandID,
                                                                      std::string const& options,
                                                                      FileInfo const& remoteFile) {
-    std::ostringstream parameters;
-    parameters << RELAY_Utility::create_Parameter("CmdID", commandID)
-               << "::" << RELAY_Utility::create_Parameter("CmdOpts", options)
-               << "::" << RELAY_Utility::create_Parameter("RemoteFN", remoteFile.get_FileName())
-               << "::"
-               << RELAY_Utility::create_Parameter("RemoteFileInfo",
-                                                  remoteFile.get_FileInfoString());
-    return parameters.str();
+    return StringUtility::concatenate(
+        {RELAY_Utility::create_Parameter("CmdID", commandID),
+         "::", RELAY_Utility::create_Parameter("CmdOpts", options),
+         "::", RELAY_Utility::create_Parameter("RemoteFN", remoteFile.get_FileName()),
+         "::", RELAY_Utility::create_Parameter("RemoteFileInfo", remoteFile.get_FileInfoString())});
 }
 
 void RunCommandOnPartition::_initialize_ClientQuorvexParameters(std::string& options) {

@@ -25,8 +25,14 @@ public:
     std::string createString_Target() const;
 
 private:
+    std::string _build_Target() const;
+
     Quorvex::System::Partition _Partition;
     bool _UsePartitionArray;
+    // Every command of a survey names the same target: its text is built
+    // once per form, not once per command.
+    mutable std::string _TargetText;
+    mutable bool _TargetTextIsArray{false};
 };
 
 } // namespace Quorvex::RELAY
