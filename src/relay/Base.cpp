@@ -39,7 +39,7 @@ std::string Base::_createString_Command(std::string const& parameters) const {
     // Kept for the remote action tool: see docs/compatibility.md#four-colons
     return StringUtility::concatenate({gc_RemoteActionTool, gc_ServiceEventClass, "::", _Action,
                                        "::", RELAY_Utility::create_Parameter("CallerID", _CallerID),
-                                       "::", _Target.createString_Target(),
+                                       "::", _Target._get_TargetText(),
                                        parameters.empty() ? "" : "::", parameters});
 }
 

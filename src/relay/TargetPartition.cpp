@@ -23,6 +23,10 @@ void TargetPartition::use_PartitionID() {
 }
 
 std::string TargetPartition::createString_Target() const {
+    return _get_TargetText();
+}
+
+std::string const& TargetPartition::_get_TargetText() const {
     if (_TargetText.empty() || _TargetTextIsArray != _UsePartitionArray) {
         _TargetText = _build_Target();
         _TargetTextIsArray = _UsePartitionArray;

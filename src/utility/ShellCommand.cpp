@@ -122,7 +122,8 @@ int ShellCommand::execute() {
     if (_executeOnlyOnce && _executed) {
         return -1;
     }
-    std::string const prefix = _temporaryDirectory + "/" + _temporaryBaseFileName;
+    std::string const prefix =
+        StringUtility::concatenate({_temporaryDirectory, "/", _temporaryBaseFileName});
     TemporaryFile stdoutFile(prefix);
     TemporaryFile stderrFile(prefix);
     if (!stdoutFile.isValid() || !stderrFile.isValid()) {
@@ -131,9 +132,8 @@ int ShellCommand::execute() {
         _returnCode = 0;
         return -1;
     }
-    // Each name is copied once and used for the command line and the read.
-    std::string const stdoutName = stdoutFile.get_ActualFileName();
-    std::string const stderrName = stderrFile.get_ActualFileName();
+    std::string const& stdoutName = stdoutFile._get_ActualFileName();
+    std::string const& stderrName = stderrFile._get_ActualFileName();
     // The command text goes to the shell as given, nothing quoted. Kept for the console's scripts:
     // see docs/compatibility.md#no-escaping-command-line
     std::string const fullCommand =

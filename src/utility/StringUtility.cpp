@@ -1,5 +1,6 @@
 #include "utility/StringUtility.h"
 
+#include <algorithm>
 #include <numeric>
 
 namespace StringUtility {
@@ -54,13 +55,15 @@ int splitString(std::string const& text, std::string const& delimiter,
 }
 
 std::string concatenate(std::initializer_list<std::string_view> pieces) {
-    std::string text;
-    text.reserve(std::accumulate(pieces.begin(), pieces.end(), std::string::size_type{0},
-                                 [](std::string::size_type length, std::string_view piece) {
-                                     return length + piece.size();
-                                 }));
+    // Sized once and filled by plain copies: no capacity check per piece.
+    std::string text(std::accumulate(pieces.begin(), pieces.end(), std::string::size_type{0},
+                                     [](std::string::size_type length, std::string_view piece) {
+                                         return length + piece.size();
+                                     }),
+                     '\0');
+    auto next = text.begin();
     for (std::string_view const piece : pieces) {
-        text.append(piece);
+        next = std::copy(piece.begin(), piece.end(), next);
     }
     return text;
 }

@@ -32,6 +32,10 @@ bool TemporaryFile::isValid() const {
 }
 
 std::string TemporaryFile::get_ActualFileName() const {
+    return _get_ActualFileName();
+}
+
+std::string const& TemporaryFile::_get_ActualFileName() const {
     return _actualFileName;
 }
 
