@@ -4,6 +4,7 @@
 #include "utility/StringUtility.h"
 
 #include <cstddef>
+#include <utility>
 
 namespace Quorvex::PYLON {
 
@@ -38,8 +39,12 @@ void ListOf_Partitions::getPartitions_FromMachine(::Quorvex::PYLON::Machine cons
     // The identity goes to the shell unquoted. Kept for the console's scripts: see
     // docs/compatibility.md#no-escaping-command-line
     std::string const arguments = gc_ListPartitions_MachineOption + std::string(mtms);
-    for (auto const& record :
-         ::Quorvex::PYLON::Listing_Utility::u_run_Listing(gc_ListPartitions_Tool, arguments)) {
+    auto const records =
+        ::Quorvex::PYLON::Listing_Utility::u_run_Listing(gc_ListPartitions_Tool, arguments);
+    // One allocation for the whole listing: growing by doubling would hold
+    // the old and the new copy at once, the run's peak of memory.
+    reserve(size() + records.size());
+    for (auto const& record : records) {
         _insert_Partition(mtms, record);
     }
 }
@@ -58,7 +63,7 @@ void ListOf_Partitions::_insert_Partition(::Quorvex::System::MTMS const& mtms,
     for (std::size_t i = 0; i < fields.size() && i < gc_NumberOf_Fields; ++i) {
         (partition.*gc_Field_Setters[i])(fields[i]);
     }
-    push_back(partition);
+    push_back(std::move(partition));
 }
 
 } // namespace Quorvex::PYLON

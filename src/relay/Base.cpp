@@ -2,8 +2,9 @@
 
 #include "relay/RELAY_Utility.h"
 #include "utility/ShellCommand.h"
+#include "utility/StringUtility.h"
 
-#include <sstream>
+#include <iterator>
 
 namespace Quorvex::RELAY {
 
@@ -29,22 +30,22 @@ TargetPartition& Base::get_TargetPartition() {
 }
 
 std::string Base::createString_Command() const {
+    return _createString_Command("");
+}
+
+std::string Base::_createString_Command(std::string const& parameters) const {
     // The tool expects an empty field between the class name and the action,
-    // hence four colons in a row.
+    // hence four colons in a row. The whole line is built with one allocation.
     // Kept for the remote action tool: see docs/compatibility.md#four-colons
-    std::ostringstream command;
-    command << gc_RemoteActionTool << gc_ServiceEventClass << "::" << _Action
-            << "::" << RELAY_Utility::create_Parameter("CallerID", _CallerID)
-            << "::" << _Target.createString_Target();
-    return command.str();
+    return StringUtility::concatenate({gc_RemoteActionTool, gc_ServiceEventClass, "::", _Action,
+                                       "::", RELAY_Utility::create_Parameter("CallerID", _CallerID),
+                                       "::", _Target._get_TargetText(),
+                                       parameters.empty() ? "" : "::", parameters});
 }
 
 int Base::execute(std::string const& parameters) {
     // A fresh runner per call: a runner executes its command only once.
-    Utility::ShellCommand command(createString_Command());
-    if (!parameters.empty()) {
-        command.append_Command("::" + parameters);
-    }
+    Utility::ShellCommand command(_createString_Command(parameters));
     _Output.clear();
     _ReturnCodes.clear();
     int const exitCode = command.execute();
@@ -52,6 +53,8 @@ int Base::execute(std::string const& parameters) {
         _Output.assign(command.stdout_begin(), command.stdout_end());
     }
     // A failing tool still says why in its output lines.
+    _ReturnCodes.reserve(
+        static_cast<std::size_t>(std::distance(command.stdout_begin(), command.stdout_end())));
     for (auto line = command.stdout_begin(); line != command.stdout_end(); ++line) {
         if (!line->empty()) {
             _ReturnCodes.emplace_back(*line);

@@ -37,6 +37,9 @@ public:
     std::vector<std::string> const& get_Output() const;
 
 private:
+    // The command line, followed by "::" and the parameters when there are any.
+    std::string _createString_Command(std::string const& parameters) const;
+
     std::int64_t _CallerID;
     std::string _Action;
     TargetPartition _Target;

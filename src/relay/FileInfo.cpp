@@ -1,6 +1,6 @@
 #include "relay/FileInfo.h"
 
-#include <sstream>
+#include "utility/StringUtility.h"
 
 namespace Quorvex::RELAY {
 
@@ -39,14 +39,8 @@ void FileInfo::set_FilePermission(std::string const& permission) {
 std::string FileInfo::get_FileInfoString() const {
     // The remote action tool reads the permission first.
     // Kept for the remote action tool: see docs/compatibility.md#file-attributes
-    std::ostringstream text;
-    text << "FILE_PERM"
-         << "=" << _FilePermission << ";"
-         << "FILE_OWNER"
-         << "=" << _FileOwner << ";"
-         << "FILE_GROUP"
-         << "=" << _FileGroup;
-    return text.str();
+    return StringUtility::concatenate(
+        {"FILE_PERM=", _FilePermission, ";FILE_OWNER=", _FileOwner, ";FILE_GROUP=", _FileGroup});
 }
 
 } // namespace Quorvex::RELAY

@@ -3,9 +3,16 @@
 #include "relay/FileInfo.h"
 #include "relay/RELAY_Utility.h"
 
-#include <sstream>
+#include <cstddef>
 
 namespace Quorvex::RELAY {
+
+namespace {
+
+// Room for the parameters' names, quotes and separators.
+constexpr std::size_t gc_ParameterOverhead = 64;
+
+} // namespace
 
 GetFileFromPartition::GetFileFromPartition(TargetPartition const& target) : Base(target) {}
 
@@ -28,11 +35,17 @@ std::string GetFileFromPartition::createString_GetFileParameters(std::string con
     FileInfo const remote(remoteFileName, "", "", "");
     FileInfo local(localFileName, "", "", "");
     RELAY_Utility::set_Default_PYLON_FileInfo(local);
-    std::ostringstream parameters;
-    parameters << RELAY_Utility::create_Parameter("RemoteFN", remote.get_FileName())
-               << "::" << RELAY_Utility::create_Parameter("LocalFN", local.get_FileName()) << "::"
-               << RELAY_Utility::create_Parameter("LocalFileInfo", local.get_FileInfoString());
-    return parameters.str();
+    // Joined in one string that is sized for all of them.
+    std::string const fileInfo = local.get_FileInfoString();
+    std::string parameters;
+    parameters.reserve(gc_ParameterOverhead + remote.get_FileName().size() +
+                       local.get_FileName().size() + fileInfo.size());
+    RELAY_Utility::append_Parameter(parameters, "RemoteFN", remote.get_FileName());
+    parameters.append("::");
+    RELAY_Utility::append_Parameter(parameters, "LocalFN", local.get_FileName());
+    parameters.append("::");
+    RELAY_Utility::append_Parameter(parameters, "LocalFileInfo", fileInfo);
+    return parameters;
 }
 
 } // namespace Quorvex::RELAY

@@ -1,8 +1,7 @@
 #include "relay/RELAY_TargetPartition_Utility.h"
 
 #include "relay/RELAY_Utility.h"
-
-#include <sstream>
+#include "utility/StringUtility.h"
 
 namespace Quorvex::RELAY {
 
@@ -24,11 +23,7 @@ RELAY_TargetPartition_Utility::_u_get_PartitionID(Quorvex::System::Partition con
 std::string
 RELAY_TargetPartition_Utility::_u_get_PartitionArray(Quorvex::System::Partition const& partition) {
     // An array of one identifier: the quoted value sits inside braces.
-    std::ostringstream parameter;
-    parameter << "PartitionArray"
-              << "::"
-              << "{\"" << partition.get_PartitionID() << "\"}";
-    return parameter.str();
+    return StringUtility::concatenate({"PartitionArray::{\"", partition.get_PartitionID(), "\"}"});
 }
 
 } // namespace Quorvex::RELAY

@@ -2,7 +2,8 @@
 
 #include "relay/FileInfo.h"
 
-#include <sstream>
+#include <charconv>
+#include <iterator>
 
 namespace Quorvex::RELAY {
 
@@ -26,16 +27,28 @@ void _u_set_Default_FileInfo(FileInfo& info, std::string const& group) {
 // Quoted but not escaped. Kept for the remote action tool: see
 // docs/compatibility.md#no-escaping-command-line
 std::string RELAY_Utility::create_Parameter(std::string const& name, std::string const& value) {
-    std::ostringstream parameter;
-    parameter << name << "::"
-              << "\"" << value << "\"";
-    return parameter.str();
+    std::string parameter;
+    append_Parameter(parameter, name, value);
+    return parameter;
 }
 
 std::string RELAY_Utility::create_Parameter(std::string const& name, long const& value) {
-    std::ostringstream parameter;
-    parameter << name << "::" << value;
-    return parameter.str();
+    std::string parameter;
+    append_Parameter(parameter, name, value);
+    return parameter;
+}
+
+void RELAY_Utility::append_Parameter(std::string& text, std::string_view name,
+                                     std::string_view value) {
+    text.reserve(text.size() + name.size() + value.size() + 4);
+    text.append(name).append("::\"").append(value).push_back('"');
+}
+
+void RELAY_Utility::append_Parameter(std::string& text, std::string_view name, long value) {
+    // Formatted on the stack: no allocation of its own.
+    char digits[24];
+    auto const end = std::to_chars(std::begin(digits), std::end(digits), value).ptr;
+    text.append(name).append("::").append(digits, static_cast<std::size_t>(end - digits));
 }
 
 void RELAY_Utility::set_Default_PYLON_FileInfo(FileInfo& info) {

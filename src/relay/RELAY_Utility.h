@@ -1,6 +1,7 @@
 #pragma once
 
 #include <string>
+#include <string_view>
 
 namespace Quorvex::RELAY {
 
@@ -14,6 +15,11 @@ public:
     static std::string create_Parameter(std::string const& name, std::string const& value);
     // name::value in decimal, without quotes.
     static std::string create_Parameter(std::string const& name, long const& value);
+
+    // The same texts appended to text: a command's parameters are joined in
+    // one string without a temporary per parameter.
+    static void append_Parameter(std::string& text, std::string_view name, std::string_view value);
+    static void append_Parameter(std::string& text, std::string_view name, long value);
 
     // Attributes of a file that lands on the console; the file name is kept.
     static void set_Default_PYLON_FileInfo(FileInfo& info);

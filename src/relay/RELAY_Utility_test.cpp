@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <climits>
+#include <string>
 
 using Quorvex::RELAY::FileInfo;
 using Quorvex::RELAY::RELAY_Utility;
@@ -38,6 +39,20 @@ TEST(RELAY_Utility, TextParameterIsQuoted) {
 
 TEST(RELAY_Utility, TextWithQuoteAndDoubleColonIsWrittenUnescaped) {
     EXPECT_EQ(RELAY_Utility::create_Parameter("RemoteFN", "a\"b::c"), "RemoteFN::\"a\"b::c\"");
+}
+
+TEST(RELAY_Utility, AppendedParametersFollowTheTextAlreadyThere) {
+    std::string text = "a::";
+    RELAY_Utility::append_Parameter(text, "CmdOpts", "x\"::y");
+    text += "::";
+    RELAY_Utility::append_Parameter(text, "CmdID", LONG_MIN);
+    EXPECT_EQ(text, "a::CmdOpts::\"x\"::y\"::CmdID::-9223372036854775808");
+}
+
+TEST(RELAY_Utility, AppendedParameterIsTheCreatedOne) {
+    std::string text;
+    RELAY_Utility::append_Parameter(text, "LocalFN", "");
+    EXPECT_EQ(text, RELAY_Utility::create_Parameter("LocalFN", ""));
 }
 
 TEST(RELAY_Utility, ConsoleDefaultsAreQuorvexPylon660AndKeepTheFileName) {

@@ -15,8 +15,7 @@ namespace Quorvex::RELAY {
 ReturnCode::ReturnCode() = default;
 
 ReturnCode::ReturnCode(std::string const& line) {
-    std::vector<std::string> tokens;
-    StringUtility::splitString(line, "::", tokens);
+    std::vector<std::string_view> const tokens = StringUtility::splitView(line, "::");
     // The part that starts at "Rc" is added first, so its keys win over the
     // same keys in the leading part.
     // Kept for the remote action tool's replies: see docs/compatibility.md#reply-pairs
@@ -56,9 +55,9 @@ std::map<std::string, std::string> const& ReturnCode::get_Values() const {
 
 void ReturnCode::_convert_Vector_2_Map(Token_Iterator first, Token_Iterator last) {
     while (first != last) {
-        std::string const& key = *first++;
-        std::string const value = first == last ? std::string() : *first++;
-        _Values.emplace(key, value);
+        std::string_view const key = *first++;
+        std::string_view const value = first == last ? std::string_view() : *first++;
+        _Values.try_emplace(std::string(key), value);
     }
 }
 
@@ -66,8 +65,9 @@ int ReturnCode::_get_Number(std::string const& key) const {
     // Read as an unsigned number and narrowed to 32 bits, so "-1" stays -1,
     // text without digits gives 0 and nothing a tool prints can fail.
     // Kept for status-file scripts: see docs/compatibility.md#reply-numbers
-    std::string const text = contains(key) ? get_ValueOf(key) : std::string("-1");
-    unsigned long long const value = std::strtoull(text.c_str(), nullptr, 10);
+    auto const found = _Values.find(key);
+    char const* const text = found == _Values.end() ? "-1" : found->second.c_str();
+    unsigned long long const value = std::strtoull(text, nullptr, 10);
     return static_cast<int>(static_cast<std::uint32_t>(value));
 }
 

@@ -2,6 +2,7 @@
 
 #include <map>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace Quorvex::RELAY {
@@ -30,7 +31,7 @@ public:
     std::map<std::string, std::string> const& get_Values() const;
 
 private:
-    using Token_Iterator = std::vector<std::string>::const_iterator;
+    using Token_Iterator = std::vector<std::string_view>::const_iterator;
 
     // Pairs up the tokens of a range; a key that is the last token gets "".
     // A key already present keeps its first value.

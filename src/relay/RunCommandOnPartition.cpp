@@ -3,7 +3,7 @@
 #include "quorvex/Version.h"
 #include "relay/RELAY_Utility.h"
 
-#include <sstream>
+#include <cstddef>
 
 namespace Quorvex::RELAY {
 
@@ -11,6 +11,8 @@ namespace {
 
 // The client survey is command 0 on the partition.
 constexpr long gc_ClientQuorvex_CommandID = 0;
+// Room for the parameters' names, quotes, separators and the command number.
+constexpr std::size_t gc_ParameterOverhead = 96;
 
 } // namespace
 
@@ -37,14 +39,19 @@ int RunCommandOnPartition::execute_PartitionQuorvex(std::string const& options,
 std::string RunCommandOnPartition::createString_RunCommandParameters(long const& commandID,
                                                                      std::string const& options,
                                                                      FileInfo const& remoteFile) {
-    std::ostringstream parameters;
-    parameters << RELAY_Utility::create_Parameter("CmdID", commandID)
-               << "::" << RELAY_Utility::create_Parameter("CmdOpts", options)
-               << "::" << RELAY_Utility::create_Parameter("RemoteFN", remoteFile.get_FileName())
-               << "::"
-               << RELAY_Utility::create_Parameter("RemoteFileInfo",
-                                                  remoteFile.get_FileInfoString());
-    return parameters.str();
+    // Joined in one string that is sized for all of them.
+    std::string const fileInfo = remoteFile.get_FileInfoString();
+    std::string parameters;
+    parameters.reserve(gc_ParameterOverhead + options.size() + remoteFile.get_FileName().size() +
+                       fileInfo.size());
+    RELAY_Utility::append_Parameter(parameters, "CmdID", commandID);
+    parameters.append("::");
+    RELAY_Utility::append_Parameter(parameters, "CmdOpts", options);
+    parameters.append("::");
+    RELAY_Utility::append_Parameter(parameters, "RemoteFN", remoteFile.get_FileName());
+    parameters.append("::");
+    RELAY_Utility::append_Parameter(parameters, "RemoteFileInfo", fileInfo);
+    return parameters;
 }
 
 void RunCommandOnPartition::_initialize_ClientQuorvexParameters(std::string& options) {
@@ -52,10 +59,11 @@ void RunCommandOnPartition::_initialize_ClientQuorvexParameters(std::string& opt
     // another word, already name the machine. Kept for the partition's
     // client: see docs/compatibility.md#client-options
     if (options.find("-c") == std::string::npos) {
-        options += " -c " + get_TargetPartition().get_Partition().get_MTMS().__StringValue();
+        options.append(" -c ").append(
+            get_TargetPartition().get_Partition().get_MTMS().__StringValue());
     }
     if (options.find("-pylonv") == std::string::npos) {
-        options += " -pylonv " + std::string(::Quorvex::gc_ClientVersion);
+        options.append(" -pylonv ").append(::Quorvex::gc_ClientVersion);
     }
 }
 

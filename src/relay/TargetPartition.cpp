@@ -1,8 +1,7 @@
 #include "relay/TargetPartition.h"
 
 #include "relay/RELAY_TargetPartition_Utility.h"
-
-#include <sstream>
+#include "utility/StringUtility.h"
 
 namespace Quorvex::RELAY {
 
@@ -24,15 +23,24 @@ void TargetPartition::use_PartitionID() {
 }
 
 std::string TargetPartition::createString_Target() const {
-    std::ostringstream target;
-    target << RELAY_TargetPartition_Utility::_u_get_MachineType_Model(_Partition)
-           << "::" << RELAY_TargetPartition_Utility::_u_get_Machine_Serial(_Partition) << "::";
-    if (_UsePartitionArray) {
-        target << RELAY_TargetPartition_Utility::_u_get_PartitionArray(_Partition);
-    } else {
-        target << RELAY_TargetPartition_Utility::_u_get_PartitionID(_Partition);
+    return _get_TargetText();
+}
+
+std::string const& TargetPartition::_get_TargetText() const {
+    if (_TargetText.empty() || _TargetTextIsArray != _UsePartitionArray) {
+        _TargetText = _build_Target();
+        _TargetTextIsArray = _UsePartitionArray;
     }
-    return target.str();
+    return _TargetText;
+}
+
+std::string TargetPartition::_build_Target() const {
+    std::string const partition =
+        _UsePartitionArray ? RELAY_TargetPartition_Utility::_u_get_PartitionArray(_Partition)
+                           : RELAY_TargetPartition_Utility::_u_get_PartitionID(_Partition);
+    return StringUtility::concatenate(
+        {RELAY_TargetPartition_Utility::_u_get_MachineType_Model(_Partition),
+         "::", RELAY_TargetPartition_Utility::_u_get_Machine_Serial(_Partition), "::", partition});
 }
 
 } // namespace Quorvex::RELAY

@@ -25,8 +25,19 @@ public:
     std::string createString_Target() const;
 
 private:
+    // The command line is built around the target's text without a copy of it.
+    friend class Base;
+
+    // createString_Target's text, kept until the form changes.
+    std::string const& _get_TargetText() const;
+    std::string _build_Target() const;
+
     Quorvex::System::Partition _Partition;
     bool _UsePartitionArray;
+    // Every command of a survey names the same target: its text is built
+    // once per form, not once per command.
+    mutable std::string _TargetText;
+    mutable bool _TargetTextIsArray{false};
 };
 
 } // namespace Quorvex::RELAY

@@ -4,6 +4,8 @@
 
 #include <gtest/gtest.h>
 
+#include <string>
+
 using Quorvex::RELAY::TargetPartition;
 using Quorvex::System::MTMS;
 using Quorvex::System::Partition;
@@ -60,4 +62,22 @@ TEST(TargetPartition, ValuesWithQuotesAndDoubleColonsAreWrittenAsTheyAre) {
     target.use_PartitionArray();
     EXPECT_EQ(target.createString_Target(),
               "CecMT::\"12\"34-A\"::CecMS::\"SER::X\"::PartitionArray::{\"3::LocalFN::\"/x\"}");
+}
+
+TEST(TargetPartition, TextAlreadyWrittenFollowsEachLaterChangeOfMode) {
+    TargetPartition target(examplePartition());
+    std::string const byIdentifier = target.createString_Target();
+    target.use_PartitionArray();
+    EXPECT_EQ(target.createString_Target(),
+              "CecMT::\"1234-ABC\"::CecMS::\"10ABCDE\"::PartitionArray::{\"3\"}");
+    target.use_PartitionID();
+    EXPECT_EQ(target.createString_Target(), byIdentifier);
+}
+
+TEST(TargetPartition, AssignedTargetWritesTheNewPartition) {
+    TargetPartition target(examplePartition());
+    static_cast<void>(target.createString_Target());
+    target = TargetPartition();
+    EXPECT_EQ(target.createString_Target(), TargetPartition().createString_Target());
+    EXPECT_EQ(target.createString_Target().find("10ABCDE"), std::string::npos);
 }

@@ -9,8 +9,11 @@
 #include "vpd/Resource.h"
 #include "vpd/ResourceList.h"
 
+#include <algorithm>
+#include <cctype>
+#include <cstdint>
 #include <fstream>
-#include <sstream>
+#include <limits>
 #include <stdexcept>
 
 namespace Quorvex_PYLON_VPD_Survey_ClientPartition_Utility {
@@ -40,12 +43,31 @@ bool _u_build_DefaultDocument(Quorvex::System::Partition const& partition,
 // Unreadable reads 0, not active. Kept for status-file scripts: see
 // docs/compatibility.md#inactive-partition
 unsigned int _u_get_ActiveStatus(Quorvex::System::Partition const& partition) {
-    std::istringstream text(partition.get_ActiveStatus());
-    unsigned int activeStatus = 0;
-    if (!(text >> activeStatus)) {
+    // Read as an unsigned stream would read it, without building one per
+    // partition: leading blanks skipped, an optional sign ("-1" wraps around),
+    // digits up to the first other character; no digits or a value beyond 32
+    // bits reads 0.
+    std::string const& text = partition.get_ActiveStatus();
+    auto next = std::find_if_not(text.begin(), text.end(),
+                                 [](unsigned char c) { return std::isspace(c) != 0; });
+    bool const negative = next != text.end() && *next == '-';
+    if (next != text.end() && (*next == '-' || *next == '+')) {
+        ++next;
+    }
+    auto const digitsEnd =
+        std::find_if_not(next, text.end(), [](unsigned char c) { return std::isdigit(c) != 0; });
+    if (next == digitsEnd) {
         return 0;
     }
-    return activeStatus;
+    std::uint64_t magnitude = 0;
+    for (; next != digitsEnd; ++next) {
+        magnitude = magnitude * 10 + static_cast<std::uint64_t>(*next - '0');
+        if (magnitude > std::numeric_limits<unsigned int>::max()) {
+            return 0;
+        }
+    }
+    auto const value = static_cast<unsigned int>(magnitude);
+    return negative ? 0u - value : value;
 }
 
 void u_create_VPD_ResourceSet_forFailedPartition(Quorvex::System::Partition const& partition,

@@ -85,6 +85,36 @@ TEST(Survey_ClientPartition_Utility, ActiveStatusWithSignsFollowsTheUnsignedStre
     EXPECT_EQ(u_read_ActiveStatus("-1"), 4294967295u);
 }
 
+TEST(Survey_ClientPartition_Utility, ActiveStatusReadsWhatAnUnsignedStreamReads) {
+    std::vector<std::string> const texts = {"0",
+                                            "007",
+                                            " \t\n\v\f\r5",
+                                            "-0",
+                                            "-4294967295",
+                                            "-4294967296",
+                                            "+",
+                                            "-",
+                                            "- 5",
+                                            "+-3",
+                                            "99999999999999999999",
+                                            std::string("3\0"
+                                                        "4",
+                                                        3),
+                                            std::string("\0"
+                                                        "3",
+                                                        2),
+                                            "12345678901",
+                                            "4294967295x"};
+    for (std::string const& text : texts) {
+        std::istringstream stream(text);
+        unsigned int expected = 0;
+        if (!(stream >> expected)) {
+            expected = 0;
+        }
+        EXPECT_EQ(u_read_ActiveStatus(text), expected) << '"' << text << '"';
+    }
+}
+
 TEST(Survey_ClientPartition_Utility, ActiveStatusBeyondThirtyTwoBitsReadsZero) {
     EXPECT_EQ(u_read_ActiveStatus("4294967296"), 0u);
     EXPECT_EQ(u_read_ActiveStatus("4294967295"), 4294967295u);

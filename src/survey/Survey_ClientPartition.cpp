@@ -11,6 +11,7 @@
 #include <optional>
 #include <ostream>
 #include <sstream>
+#include <utility>
 
 namespace Quorvex::PYLON::VPD {
 
@@ -77,15 +78,17 @@ ResultNames u_form_ResultNames(::Quorvex::System::Partition const& partition) {
     return status.str();
 }
 
+// Written in one piece: the banner is the same for every partition.
 void u_trace_Banner() {
-    g_Trace << "\n\n"
-            << ::std::string(80, '+') << "\n"
-            << "PYLON_VPD_Survey_ClientPartition\n\n";
+    static ::std::string const banner =
+        "\n\n" + ::std::string(80, '+') + "\nPYLON_VPD_Survey_ClientPartition\n\n";
+    g_Trace << banner;
 }
 
 void u_trace_Partition(::Quorvex::System::Partition const& partition) {
+    static ::std::string const closingRule = "    " + ::std::string(40, '-') + "\n";
     ::DEBUG::Quorvex::System::print_Partition(g_Trace, partition, 4);
-    g_Trace << "    " << ::std::string(40, '-') << ::std::endl;
+    g_Trace << closingRule << ::std::flush;
 }
 
 bool u_has_ClientFailed(int const& result, ::Quorvex::RELAY::ReturnCode const& returnCode) {
@@ -153,8 +156,7 @@ Outcome u_record_ClientFailure(::Quorvex::System::Partition const& partition,
 }
 
 Outcome u_record_FetchFailure(::Quorvex::System::Partition const& partition,
-                              ResultNames const& names,
-                              ::Quorvex::RELAY::ReturnCode const& clientCode,
+                              ResultNames const& names, ::std::optional<int> const& clientRcCmd,
                               ::Quorvex::RELAY::ReturnCode const& returnCode,
                               StopNote const& stopNote) {
     Outcome outcome;
@@ -166,7 +168,7 @@ Outcome u_record_FetchFailure(::Quorvex::System::Partition const& partition,
     outcome.returnCode = gc_NotSurveyed;
     outcome.kind = OutcomeKind::FetchFailure;
     outcome.rc = u_get_Rc(returnCode);
-    outcome.rcCmd = u_get_RcCmd(clientCode);
+    outcome.rcCmd = clientRcCmd;
     return outcome;
 }
 
@@ -181,17 +183,19 @@ Outcome u_survey_ActivePartition(::Quorvex::System::Partition const& partition,
     g_Trace << "\n\t 1.  > > > VPD Survey Client < < < \n";
     int const clientResult =
         relay.execute_PartitionQuorvex(names.clientArguments, names.clientOutput);
-    // Copies: the next operation replaces the interface's return codes.
-    ::Quorvex::RELAY::ReturnCode const clientCode = relay.get_ReturnCode();
+    // Read only before the next operation, which replaces the interface's
+    // return codes: only the client's RcCmd is kept, not a copy of them.
+    ::Quorvex::RELAY::ReturnCode const& clientCode = relay.get_ReturnCode();
     if (u_has_ClientFailed(clientResult, clientCode)) {
         return u_record_ClientFailure(partition, names, clientResult, clientCode, stopNote);
     }
+    ::std::optional<int> const clientRcCmd = u_get_RcCmd(clientCode);
 
     g_Trace << "\n\n\t 2.  > > > Get VPD Survey Result < < < \n";
     int const fetchResult = relay.getFileFromPartition(names.remoteResult, names.localResult);
-    ::Quorvex::RELAY::ReturnCode const fetchCode = relay.get_ReturnCode();
+    ::Quorvex::RELAY::ReturnCode const& fetchCode = relay.get_ReturnCode();
     if (u_has_ChannelFailed(fetchResult, fetchCode)) {
-        return u_record_FetchFailure(partition, names, clientCode, fetchCode, stopNote);
+        return u_record_FetchFailure(partition, names, clientRcCmd, fetchCode, stopNote);
     }
     Outcome outcome;
     outcome.fileName = names.localResult;
@@ -199,7 +203,7 @@ Outcome u_survey_ActivePartition(::Quorvex::System::Partition const& partition,
     outcome.statusText = gc_Ok;
     outcome.kind = OutcomeKind::Surveyed;
     outcome.rc = u_get_Rc(fetchCode);
-    outcome.rcCmd = u_get_RcCmd(clientCode);
+    outcome.rcCmd = clientRcCmd;
     return outcome;
 }
 
@@ -223,10 +227,10 @@ void Survey_ClientPartition::operator()(::Quorvex::PYLON::ListOf_Partitions cons
                                         ::std::vector<::std::string>& returnCodes,
                                         ::std::vector<::std::string>& statusTexts) const {
     for (::Quorvex::System::Partition const& partition : partitions) {
-        Outcome const outcome = survey_Partition(partition);
-        fileNames.push_back(outcome.fileName);
-        returnCodes.push_back(outcome.returnCode);
-        statusTexts.push_back(outcome.statusText);
+        Outcome outcome = survey_Partition(partition);
+        fileNames.push_back(::std::move(outcome.fileName));
+        returnCodes.push_back(::std::move(outcome.returnCode));
+        statusTexts.push_back(::std::move(outcome.statusText));
     }
 }
 

@@ -1,5 +1,7 @@
 #include "survey/Survey_Files.h"
 
+#include "utility/StringUtility.h"
+
 namespace Quorvex::PYLON::VPD {
 
 namespace {
@@ -40,8 +42,8 @@ std::string get_StatusFileName(std::string const& machineIdentity) {
 // Two listed partitions of one identity share it. Kept for the inventory importers: see
 // docs/compatibility.md#shared-result-file
 std::string get_LocalResultName(std::string const& partitionText) {
-    return std::string(gc_VPD_Folder) + gc_ProgramName + gc_NameSeparator + partitionText +
-           gc_ResultSuffix;
+    return StringUtility::concatenate(
+        {gc_VPD_Folder, gc_ProgramName, gc_NameSeparator, partitionText, gc_ResultSuffix});
 }
 
 std::string get_LocalResultPath(std::string const& localResultName) {
@@ -49,11 +51,11 @@ std::string get_LocalResultPath(std::string const& localResultName) {
 }
 
 std::string get_RemoteResultName(std::string const& partitionText) {
-    return partitionText + gc_ResultSuffix;
+    return StringUtility::concatenate({partitionText, gc_ResultSuffix});
 }
 
 std::string get_ClientOutputName(std::string const& partitionText) {
-    return partitionText + gc_ClientOutputSuffix;
+    return StringUtility::concatenate({partitionText, gc_ClientOutputSuffix});
 }
 
 } // namespace Quorvex::PYLON::VPD

@@ -35,8 +35,9 @@ void u_report_Partitions(Quorvex::PYLON::ListOf_Partitions const& partitions,
         }
         // Host and IP as listed, the status text as recorded. Kept for status-file scripts: see
         // docs/compatibility.md#status-line
+        // The status file is read once the run is over; it is flushed when closed.
         status << partitions[i].get_HostName() << " [" << partitions[i].get_IP()
-               << "] - VPD Survey - " << statusTexts[i] << std::endl;
+               << "] - VPD Survey - " << statusTexts[i] << '\n';
     }
 }
 
@@ -59,6 +60,10 @@ void VPD_Survey_ClientPartition(std::string const& machineIdentity) {
     std::vector<std::string> fileNames;
     std::vector<std::string> returnCodes;
     std::vector<std::string> statusTexts;
+    // The survey adds one entry of each per partition.
+    fileNames.reserve(partitions.size());
+    returnCodes.reserve(partitions.size());
+    statusTexts.reserve(partitions.size());
     survey(partitions, fileNames, returnCodes, statusTexts);
     u_report_Partitions(partitions, fileNames, returnCodes, statusTexts, status);
     calculate_ReturnCode(returnCodes);

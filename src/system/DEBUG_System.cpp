@@ -1,5 +1,7 @@
 #include "system/DEBUG_System.h"
 
+#include "utility/StringUtility.h"
+
 #include <string>
 
 namespace DEBUG::Quorvex::System {
@@ -9,15 +11,16 @@ namespace DEBUG::Quorvex::System {
 void print_Partition(std::ostream& out, ::Quorvex::System::Partition const& partition,
                      unsigned int const& indent) {
     std::string const margin(indent, ' ');
-    std::string const newLine = "\n";
-    std::string text = margin + "Partition    : " + std::string(partition);
-    text += newLine + margin + "MTMS         : " + std::string(partition.get_MTMS());
-    text += newLine + margin + "Partition ID : " + partition.get_PartitionID();
-    text += newLine + margin + "HostName     : " + partition.get_HostName();
-    text += newLine + margin + "IP           : " + partition.get_IP();
-    text += newLine + margin + "ActiveStatus : " + partition.get_ActiveStatus();
-    text += newLine + margin + "OS Name      : " + partition.get_OperatingSystem_Name();
-    text += newLine + margin + "OS Version   : " + partition.get_OperatingSystem_Version();
+    std::string const line = "\n" + margin;
+    std::string const text = ::StringUtility::concatenate(
+        {margin, "Partition    : ", std::string(partition),               //
+         line,   "MTMS         : ", std::string(partition.get_MTMS()),    //
+         line,   "Partition ID : ", partition.get_PartitionID(),          //
+         line,   "HostName     : ", partition.get_HostName(),             //
+         line,   "IP           : ", partition.get_IP(),                   //
+         line,   "ActiveStatus : ", partition.get_ActiveStatus(),         //
+         line,   "OS Name      : ", partition.get_OperatingSystem_Name(), //
+         line,   "OS Version   : ", partition.get_OperatingSystem_Version()});
     out << text << std::endl;
 }
 

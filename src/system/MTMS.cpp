@@ -1,6 +1,7 @@
 #include "system/MTMS.h"
 
 #include "system/MTMS_Utility.h"
+#include "utility/StringUtility.h"
 
 namespace Quorvex::System {
 
@@ -45,7 +46,7 @@ std::string const& MTMS::get_Serial() const {
 }
 
 std::string MTMS::to_String(std::string const& separator) const {
-    return _MachineType_Model + separator + _Serial;
+    return StringUtility::concatenate({_MachineType_Model, separator, _Serial});
 }
 
 std::string MTMS::to_String(std::string const& dashReplacement,

@@ -1,5 +1,7 @@
 #include "system/Partition.h"
 
+#include "utility/StringUtility.h"
+
 namespace Quorvex::System {
 
 namespace {
@@ -79,7 +81,7 @@ void Partition::set_OperatingSystem_Version(std::string const& operatingSystem_V
 }
 
 std::string Partition::__StringValue() const {
-    return std::string(_MTMS) + gc_ID_Delimiter + _PartitionID;
+    return StringUtility::concatenate({std::string(_MTMS), gc_ID_Delimiter, _PartitionID});
 }
 
 Partition::operator std::string() const {

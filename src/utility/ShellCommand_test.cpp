@@ -1,5 +1,6 @@
 #include "utility/ShellCommand.h"
 
+#include "utility/StringUtility.h"
 #include "utility/Trace.h"
 
 #include "QuorvexTest.h"
@@ -11,6 +12,8 @@
 #include <iostream>
 #include <regex>
 #include <string>
+#include <sys/wait.h>
+#include <unistd.h>
 #include <vector>
 
 namespace {
@@ -281,6 +284,68 @@ TEST_F(ShellCommandTest, ReadOutputLinesBeforeLongLineAreUnaffected) {
 TEST_F(ShellCommandTest, ReadOutputLongLastLineWithoutLineEnd) {
     EXPECT_EQ(readBack(std::string(gc_LineLimit + 10, 'y')),
               (Lines{std::string(gc_LineLimit, 'y')}));
+}
+
+// The file is read in blocks; lines do not care where a block ends.
+TEST_F(ShellCommandTest, ReadOutputLinesAcrossReadBlocksAreKeptWhole) {
+    std::string const first(20000, 'a');
+    std::string const second(8191, 'b');
+    EXPECT_EQ(readBack(first + "\n" + second + "\nc"), (Lines{first, second, "c"}));
+}
+
+TEST_F(ShellCommandTest, ReadOutputNulByteInLaterBlockEndsTheLineText) {
+    std::string const text(10000, 'a');
+    EXPECT_EQ(readBack(text + std::string(1, '\0') + std::string(9000, 'b') + "\nc"),
+              (Lines{text, "c"}));
+}
+
+// The limit counts the bytes read, not the text kept before a NUL byte.
+TEST_F(ShellCommandTest, ReadOutputBytesAfterNulByteCountTowardTheLimit) {
+    std::string const line = "a" + std::string(1, '\0') + std::string(gc_LineLimit - 1, 'b');
+    EXPECT_EQ(readBack(line + "\nz\n"), (Lines{"a"}));
+}
+
+TEST_F(ShellCommandTest, ReadOutputLimitReachedInLaterBlockKeepsLimitAndStops) {
+    std::string const line(gc_LineLimit, 'x');
+    EXPECT_EQ(readBack("a\n" + line + "y\nz\n"), (Lines{"a", line}));
+}
+
+// A folder opens but gives nothing to read: the read that meets its end
+// appends the one empty entry.
+TEST_F(ShellCommandTest, ReadOutputOfFolderGivesOneEmptyEntry) {
+    Lines lines;
+    EXPECT_EQ(Utility::ShellCommand::_readOutput(_scratch, lines), 1u);
+    EXPECT_EQ(lines, (Lines{""}));
+}
+
+// A survey may run in many processes at once, each with its own commands in
+// the same /tmp.
+TEST_F(ShellCommandTest, ManyProcessesRunningCommandsAtOnceEachReadTheirOwnOutput) {
+    constexpr int gc_Processes = 8;
+    constexpr int gc_RunsPerProcess = 25;
+    std::vector<pid_t> children;
+    for (int process = 0; process < gc_Processes; ++process) {
+        pid_t const child = ::fork();
+        ASSERT_GE(child, 0);
+        if (child == 0) {
+            int wrong = 0;
+            for (int run = 0; run < gc_RunsPerProcess; ++run) {
+                std::string const word =
+                    "process" + std::to_string(process) + "-run" + std::to_string(run);
+                Utility::ShellCommand command(
+                    StringUtility::concatenate({"sh -c 'echo ", word, "; echo ", word, " >&2'"}));
+                wrong += command.execute() != 0 || command.get_stdout() != Lines{word, ""} ||
+                         command.get_stderr() != Lines{word, ""};
+            }
+            ::_exit(wrong == 0 ? 0 : 1);
+        }
+        children.push_back(child);
+    }
+    for (pid_t const child : children) {
+        int status = -1;
+        ASSERT_EQ(::waitpid(child, &status, 0), child);
+        EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0) << "status " << status;
+    }
 }
 
 } // namespace

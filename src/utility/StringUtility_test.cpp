@@ -11,6 +11,17 @@ namespace {
 
 using Pieces = std::vector<std::string>;
 
+TEST(StringUtility_concatenate, PiecesFollowEachOtherUnchanged) {
+    std::string const middle = "b c";
+    EXPECT_EQ(StringUtility::concatenate({"a::", middle, std::string(2, '\0'), "\n"}),
+              std::string("a::b c\0\0\n", 9));
+}
+
+TEST(StringUtility_concatenate, NoPiecesOrEmptyPiecesGiveEmptyText) {
+    EXPECT_EQ(StringUtility::concatenate({}), "");
+    EXPECT_EQ(StringUtility::concatenate({"", std::string()}), "");
+}
+
 TEST(StringUtility_splitString, TrailingDelimiterGivesNoTrailingEmptyPiece) {
     Pieces pieces;
     EXPECT_EQ(StringUtility::splitString("a;b;", ";", pieces), 2);

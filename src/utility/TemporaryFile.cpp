@@ -3,7 +3,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <unistd.h>
-#include <vector>
+#include <utility>
 
 namespace Utility {
 
@@ -16,16 +16,14 @@ constexpr char gc_UniqueSuffix[] = ".XXXXXX";
 
 TemporaryFile::TemporaryFile(std::string const& baseFileName)
     : _baseFileName(baseFileName), _actualFileName() {
-    std::string const pattern = _baseFileName + gc_UniqueSuffix;
     // mkstemp writes the generated name into its argument.
-    std::vector<char> name(pattern.begin(), pattern.end());
-    name.push_back('\0');
+    std::string name = _baseFileName + gc_UniqueSuffix;
     int const descriptor = ::mkstemp(name.data());
     if (descriptor < 0) {
         return;
     }
     ::close(descriptor);
-    _actualFileName = name.data();
+    _actualFileName = std::move(name);
     _valid = true;
 }
 
@@ -34,6 +32,10 @@ bool TemporaryFile::isValid() const {
 }
 
 std::string TemporaryFile::get_ActualFileName() const {
+    return _get_ActualFileName();
+}
+
+std::string const& TemporaryFile::_get_ActualFileName() const {
     return _actualFileName;
 }
 

@@ -25,6 +25,11 @@ public:
     bool remove();
 
 private:
+    // A command reads its output files by name without copies of the names.
+    friend class ShellCommand;
+
+    std::string const& _get_ActualFileName() const;
+
     std::string _baseFileName;
     std::string _actualFileName;
     bool _valid{false};

@@ -6,6 +6,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <csignal>
 #include <cstdio>
 #include <cstdlib>
@@ -14,6 +15,7 @@
 #include <regex>
 #include <string>
 #include <unistd.h>
+#include <vector>
 
 namespace {
 
@@ -247,6 +249,43 @@ TEST_F(TraceTest, ShellCommandRunWritesExactBlock) {
     EXPECT_NE(names[1].str(), names[2].str());
     EXPECT_FALSE(QuorvexTest::fileExists(names[1].str()));
     EXPECT_FALSE(QuorvexTest::fileExists(names[2].str()));
+}
+
+// Someone watching the trace sees which command runs, also one that hangs.
+TEST_F(TraceTest, ShellCommandLineIsInTheFileWhileTheCommandRuns) {
+    std::string const file = path("main.Trace");
+    std::string const command = "cat " + file;
+    QuorvexTest::runInFreshProcess([&] {
+        Utility::Trace mainTrace(file);
+        mainTrace << "before\n";
+        Utility::ShellCommand shellCommand(command);
+        shellCommand.execute();
+        std::vector<std::string> const expected{
+            "before", "", "****** ShellCommand::execute ******",
+            command + " > /tmp/ShellCommand.XXXXXX 2> /tmp/ShellCommand.XXXXXX", ""};
+        std::vector<std::string> seen(shellCommand.get_stdout().size());
+        std::transform(
+            shellCommand.stdout_begin(), shellCommand.stdout_end(), seen.begin(),
+            [](std::string const& line) { return QuorvexTest::normaliseTemporaryNames(line); });
+        return seen == expected ? 0 : failWith("the command saw another trace");
+    });
+}
+
+// The block is flushed at its end: the whole of it is in the file once
+// execute returns, with the trace still open.
+TEST_F(TraceTest, ShellCommandBlockIsWholeInTheFileWhenExecuteReturns) {
+    std::string const file = path("main.Trace");
+    QuorvexTest::runInFreshProcess([&] {
+        Utility::Trace mainTrace(file);
+        Utility::ShellCommand shellCommand("echo out");
+        shellCommand.execute();
+        std::string const text = QuorvexTest::normaliseTemporaryNames(QuorvexTest::readFile(file));
+        return text == "\n****** ShellCommand::execute ******\n"
+                       "echo out > /tmp/ShellCommand.XXXXXX 2> /tmp/ShellCommand.XXXXXX\n"
+                       "RC = 0\nSTDOUT\nout\n\nSTDERR\n\n\n\n"
+                   ? 0
+                   : failWith("not flushed: " + text);
+    });
 }
 
 TEST_F(TraceTest, RepeatedRunsTraceAllLinesSoFar) {

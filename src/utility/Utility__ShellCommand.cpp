@@ -6,9 +6,10 @@ void Utility__ShellCommand::_u_PrintText(std::ostream& out, std::vector<std::str
                                          std::string const& prefix) {
     for (std::string const& line : lines) {
         if (!prefix.empty()) {
-            out << "|" << prefix << "|";
+            out.put('|').write(prefix.data(), static_cast<std::streamsize>(prefix.size())).put('|');
         }
-        out << line << "\n";
+        // Unformatted writes: the same bytes without a formatting pass per line.
+        out.write(line.data(), static_cast<std::streamsize>(line.size())).put('\n');
     }
     out.flush();
 }
