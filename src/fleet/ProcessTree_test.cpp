@@ -45,6 +45,18 @@ std::vector<pid_t> waitForLiveDescendants(pid_t root, std::size_t count) {
     return live;
 }
 
+// The command line of pid once it holds text: a process just started by
+// system() shows its parent's command line until its exec has run.
+std::string waitForCommandLine(pid_t pid, std::string const& text) {
+    auto const deadline = std::chrono::steady_clock::now() + std::chrono::seconds(20);
+    std::string line = ProcessTree::commandLineOf(pid);
+    while (line.find(text) == std::string::npos && std::chrono::steady_clock::now() < deadline) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(20));
+        line = ProcessTree::commandLineOf(pid);
+    }
+    return line;
+}
+
 std::string readToEnd(ChildProcess& child) {
     while (child.readAvailable()) {
         pollfd descriptor{child.resultDescriptor(), POLLIN, 0};
@@ -95,7 +107,8 @@ TEST(ProcessTree, ChildIsListedWithItsAgeAndCommandLine) {
     // The shell's own process becomes the sleep once it has run exec.
     std::vector<pid_t> const sleeper = waitForLiveDescendants(worker.pid(), 1);
     ASSERT_FALSE(sleeper.empty());
-    EXPECT_NE(ProcessTree::commandLineOf(sleeper.front()).find("sleep 300"), std::string::npos);
+    EXPECT_NE(waitForCommandLine(sleeper.front(), "sleep 300").find("sleep 300"),
+              std::string::npos);
     auto const age = ProcessTree::ageOf(sleeper.front());
     ASSERT_TRUE(age.has_value());
     EXPECT_GE(*age, 0.0);
