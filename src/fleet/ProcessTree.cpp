@@ -58,13 +58,13 @@ std::vector<std::string> threadsOf(pid_t pid) {
     return threads;
 }
 
-double secondsSinceBoot() {
+} // namespace
+
+double ProcessTree::secondsSinceBoot() {
     timespec now{};
     clock_gettime(CLOCK_BOOTTIME, &now);
     return static_cast<double>(now.tv_sec) + static_cast<double>(now.tv_nsec) / 1e9;
 }
-
-} // namespace
 
 std::vector<pid_t> ProcessTree::childrenOf(pid_t pid) {
     std::vector<pid_t> children;

@@ -21,6 +21,8 @@ public:
     static std::string commandLineOf(pid_t pid);
     // Seconds since pid started; nullopt when it is gone.
     static std::optional<double> ageOf(pid_t pid);
+    // The clock ages are measured on: it goes on while the machine sleeps.
+    static double secondsSinceBoot();
     // True for a zombie or a process that is gone.
     static bool hasEnded(pid_t pid);
     // Stops the caller's child with SIGSTOP and waits until it is stopped.

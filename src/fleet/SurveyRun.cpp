@@ -144,10 +144,9 @@ void SurveyRun::_startUnit(Scheduler::Unit const& unit) {
         std::string const identity = _machines[unit.machine].identity;
         body = [identity, piece] { return WorkUnits::listPartitions(identity, piece); };
     }
-    // The start time is taken before the fork, so that no action of the
-    // child is older than the unit.
-    running.started = Clock::now();
+    running.bootSecondsAtStart = ProcessTree::secondsSinceBoot();
     running.child = std::make_unique<ChildProcess>(body);
+    running.started = Clock::now();
     if (!running.child->isStarted()) {
         _slotInUse[running.slot] = false;
     }
@@ -284,8 +283,8 @@ bool SurveyRun::_mayHaveActionToStop(Running const& running) const {
     if (_signal != 0) {
         return true;
     }
-    return _options.timeoutSeconds > 0 &&
-           _secondsSince(running.started) >= static_cast<double>(_options.timeoutSeconds);
+    double const unitAge = ProcessTree::secondsSinceBoot() - running.bootSecondsAtStart;
+    return _options.timeoutSeconds > 0 && unitAge >= static_cast<double>(_options.timeoutSeconds);
 }
 
 bool SurveyRun::_stopAction(Running& running, pid_t action) {

@@ -39,6 +39,9 @@ private:
         Clock::time_point started;
         // Which of the run's trace pieces the unit writes.
         std::size_t slot = 0;
+        // On the clock of action ages, taken before the fork, so that no
+        // action of the unit is older than the unit.
+        double bootSecondsAtStart = 0;
         bool listingStopped = false;
     };
 
