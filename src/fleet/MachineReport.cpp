@@ -16,9 +16,9 @@ constexpr char gc_NoPartitions[] = "No ACTIVE Partition Found.\n";
 
 void MachineReport::print(MachineRecord const& machine) {
     for (auto const& record : machine.partitions) {
-        if (!record.outcome.fileName.empty()) {
-            std::cout << record.outcome.fileName << std::endl;
-            std::cerr << record.outcome.returnCode << std::endl;
+        if (!record.result.fileName.empty()) {
+            std::cout << record.result.fileName << std::endl;
+            std::cerr << record.result.returnCode << std::endl;
         }
     }
     calculate_ReturnCode(returnCodes(machine));
@@ -31,7 +31,7 @@ std::string MachineReport::statusText(MachineRecord const& machine) {
     std::string text;
     for (auto const& record : machine.partitions) {
         text += record.partition.get_HostName() + " [" + record.partition.get_IP() +
-                "] - VPD Survey - " + record.outcome.statusText + "\n";
+                "] - VPD Survey - " + record.result.statusText + "\n";
     }
     return text;
 }
@@ -40,7 +40,7 @@ std::vector<std::string> MachineReport::returnCodes(MachineRecord const& machine
     std::vector<std::string> codes;
     codes.reserve(machine.partitions.size());
     std::transform(machine.partitions.begin(), machine.partitions.end(), std::back_inserter(codes),
-                   [](PartitionRecord const& record) { return record.outcome.returnCode; });
+                   [](PartitionRecord const& record) { return record.result.returnCode; });
     return codes;
 }
 

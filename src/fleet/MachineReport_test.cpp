@@ -36,9 +36,9 @@ PartitionRecord record(std::string const& host, std::string const& fileName,
     PartitionRecord entry;
     entry.partition.set_HostName(host);
     entry.partition.set_IP("10.0.0." + host.substr(0, 1));
-    entry.outcome.fileName = fileName;
-    entry.outcome.returnCode = code;
-    entry.outcome.statusText = status;
+    entry.result.fileName = fileName;
+    entry.result.returnCode = code;
+    entry.result.statusText = status;
     return entry;
 }
 

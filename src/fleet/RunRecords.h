@@ -1,5 +1,6 @@
 #pragma once
 
+#include "report/Outcome.h"
 #include "survey/PartitionOutcome.h"
 #include "system/Partition.h"
 
@@ -9,25 +10,35 @@
 
 namespace Fleet {
 
-// A remote action that the run stopped: which one, and after how long.
+// A remote action that the run stopped: which one, after how long, and
+// whether a signal to the run (rather than the time limit) stopped it.
 struct ActionStop {
     std::string action;
     double seconds = 0;
+    bool bySignal = false;
 };
 
 // One listed partition and what became of it.
 struct PartitionRecord {
     Quorvex::System::Partition partition;
-    Quorvex::PYLON::VPD::PartitionOutcome outcome;
-    bool finished = false;
-    bool timedOut = false;
-    bool interrupted = false;
+    // What the survey of the partition left for the tool's outputs.
+    Quorvex::PYLON::VPD::PartitionOutcome result;
+    // How the partition ended; nullopt while its survey has not ended.
+    std::optional<report::Outcome> outcome;
     std::optional<ActionStop> stop;
     std::optional<double> seconds;
     // The partition's block of the machine's trace, taken as soon as its
     // unit ends; none when the unit wrote nothing.
     std::optional<std::string> trace;
 };
+
+// The one place a partition's outcome is decided: from what its survey left
+// and whether the run stopped one of its actions. A partition an interruption
+// stopped reads "Interrupted - not surveyed" with code 8, whatever its survey
+// left.
+void settlePartition(PartitionRecord& record, Quorvex::PYLON::VPD::PartitionOutcome result);
+// A partition whose survey never ended because the run was interrupted.
+void settleUnfinished(PartitionRecord& record);
 
 // One machine of the run, its listing and its partitions in listing order.
 struct MachineRecord {

@@ -11,12 +11,6 @@ namespace Fleet {
 
 namespace {
 
-using Kind = Quorvex::PYLON::VPD::PartitionOutcomeKind;
-
-constexpr char const* gc_Outcomes[] = {"surveyed",       "inactive",      "channel_failure",
-                                       "client_failure", "fetch_failure", "timed_out",
-                                       "interrupted"};
-
 template <typename T> nlohmann::json orNull(std::optional<T> const& value) {
     return value ? nlohmann::json(*value) : nlohmann::json(nullptr);
 }
@@ -27,8 +21,8 @@ nlohmann::json orNull(std::string const& text) {
 
 nlohmann::json emptyCounts() {
     nlohmann::json counts = {{"partitions", 0}};
-    for (char const* outcome : gc_Outcomes) {
-        counts[outcome] = 0;
+    for (auto const& row : report::outcomeTable()) {
+        counts[row.name] = 0;
     }
     return counts;
 }
@@ -36,30 +30,12 @@ nlohmann::json emptyCounts() {
 } // namespace
 
 std::string Summary::outcomeName(PartitionRecord const& record) {
-    if (record.interrupted) {
-        return "interrupted";
-    }
-    if (record.timedOut) {
-        return "timed_out";
-    }
-    switch (record.outcome.kind) {
-    case Kind::Surveyed:
-        return "surveyed";
-    case Kind::Inactive:
-        return "inactive";
-    case Kind::ChannelFailure:
-        return "channel_failure";
-    case Kind::ClientFailure:
-        return "client_failure";
-    case Kind::FetchFailure:
-        return "fetch_failure";
-    }
-    return "channel_failure";
+    return report::outcomeName(record.outcome.value_or(report::Outcome::Interrupted));
 }
 
 nlohmann::json Summary::_partition(PartitionRecord const& record) {
     auto const& partition = record.partition;
-    auto const& outcome = record.outcome;
+    auto const& outcome = record.result;
     nlohmann::json entry = {
         {"id", partition.get_PartitionID()}, {"host", partition.get_HostName()},
         {"ip", partition.get_IP()},          {"active_status", partition.get_ActiveStatus()},

@@ -22,9 +22,9 @@ PartitionRecord finished(Kind kind, std::string const& code) {
     record.partition.set_HostName("aurora");
     record.partition.set_IP("10.20.30.41");
     record.partition.set_ActiveStatus("3");
-    record.outcome.kind = kind;
-    record.outcome.returnCode = code;
-    record.finished = true;
+    record.result.kind = kind;
+    record.result.returnCode = code;
+    record.outcome = report::outcomeOf(kind);
     return record;
 }
 
@@ -35,24 +35,24 @@ std::vector<MachineRecord> everyOutcome() {
     machine.identity = "9119-MHE_21ABCDE";
     machine.listed = true;
     PartitionRecord surveyed = finished(Kind::Surveyed, "0");
-    surveyed.outcome.fileName = "VPD/x-7.VPD.xml";
-    surveyed.outcome.statusText = "Ok";
-    surveyed.outcome.rc = 0;
-    surveyed.outcome.rcCmd = 0;
+    surveyed.result.fileName = "VPD/x-7.VPD.xml";
+    surveyed.result.statusText = "Ok";
+    surveyed.result.rc = 0;
+    surveyed.result.rcCmd = 0;
     surveyed.seconds = 1.25;
     PartitionRecord inactive = finished(Kind::Inactive, "8");
-    inactive.outcome.statusText = "Failed - Active Status < 3";
+    inactive.result.statusText = "Failed - Active Status < 3";
     inactive.partition.set_HostName("h\xff\xfe");
     PartitionRecord timedOut = finished(Kind::ChannelFailure, "8");
-    timedOut.outcome.fileName = "VPD/x-7.VPD.xml";
-    timedOut.outcome.reason = "Partition not surveyed, reason: \nRELAY Failed.\n\n\n\nStopped.\n";
-    timedOut.timedOut = true;
-    timedOut.stop = Fleet::ActionStop{"runCmdOnPartition", 2.04};
+    timedOut.result.fileName = "VPD/x-7.VPD.xml";
+    timedOut.result.reason = "Partition not surveyed, reason: \nRELAY Failed.\n\n\n\nStopped.\n";
+    timedOut.stop = Fleet::ActionStop{"runCmdOnPartition", 2.04, false};
+    timedOut.outcome = report::Outcome::TimedOut;
     PartitionRecord interrupted;
     interrupted.partition.set_PartitionID("9");
-    interrupted.outcome.returnCode = "8";
-    interrupted.outcome.statusText = "Interrupted - not surveyed";
-    interrupted.interrupted = true;
+    interrupted.result.returnCode = "8";
+    interrupted.result.statusText = "Interrupted - not surveyed";
+    interrupted.outcome = report::Outcome::Interrupted;
     machine.partitions = {surveyed,
                           inactive,
                           finished(Kind::ChannelFailure, "8"),
@@ -79,16 +79,16 @@ RunFacts facts() {
     return run;
 }
 
-TEST(Summary, OutcomeNamesFollowTheKindUnlessStopped) {
+TEST(Summary, OutcomeNamesAreTheRecordsOutcomes) {
     EXPECT_EQ(Summary::outcomeName(finished(Kind::Surveyed, "0")), "surveyed");
     EXPECT_EQ(Summary::outcomeName(finished(Kind::Inactive, "8")), "inactive");
     EXPECT_EQ(Summary::outcomeName(finished(Kind::ChannelFailure, "8")), "channel_failure");
     EXPECT_EQ(Summary::outcomeName(finished(Kind::ClientFailure, "8")), "client_failure");
     EXPECT_EQ(Summary::outcomeName(finished(Kind::FetchFailure, "8")), "fetch_failure");
     PartitionRecord stopped = finished(Kind::FetchFailure, "8");
-    stopped.timedOut = true;
+    stopped.outcome = report::Outcome::TimedOut;
     EXPECT_EQ(Summary::outcomeName(stopped), "timed_out");
-    stopped.interrupted = true;
+    stopped.outcome = report::Outcome::Interrupted;
     EXPECT_EQ(Summary::outcomeName(stopped), "interrupted");
 }
 

@@ -29,7 +29,6 @@ constexpr char gc_RemoteActionTool[] = "runact-api";
 constexpr char gc_FetchAction[] = "getFileFromPartition";
 constexpr char gc_ClientAction[] = "runCmdOnPartition";
 constexpr char gc_NotSurveyedCode[] = "8";
-constexpr char gc_Interrupted[] = "Interrupted - not surveyed";
 constexpr char gc_NotStarted[] = "Failed - not started";
 
 bool contains(std::string const& text, char const* part) {
@@ -151,9 +150,7 @@ void SurveyRun::_startUnit(Scheduler::Unit const& unit) {
         _slotInUse[running.slot] = false;
     }
     if (!running.child->isStarted() && unit.partition) {
-        PartitionRecord& record = _record(unit);
-        record.outcome = notStartedOutcome();
-        record.finished = true;
+        settlePartition(_record(unit), notStartedOutcome());
     }
     if (!running.child->isStarted()) {
         _scheduler.finish(unit);
@@ -243,15 +240,10 @@ void SurveyRun::_finishListing(Running& running) {
 
 void SurveyRun::_finishSurvey(Running& running) {
     PartitionRecord& record = _record(running.unit);
-    record.outcome =
-        WorkUnits::decodeOutcome(running.child->result()).value_or(notStartedOutcome());
     record.seconds = _secondsSince(running.started);
     record.trace = RunFiles::takePiece(_tracePiece(running));
-    record.finished = true;
-    if (record.interrupted) {
-        record.outcome.returnCode = gc_NotSurveyedCode;
-        record.outcome.statusText = gc_Interrupted;
-    }
+    settlePartition(
+        record, WorkUnits::decodeOutcome(running.child->result()).value_or(notStartedOutcome()));
     _scheduler.finish(running.unit);
 }
 
@@ -306,10 +298,9 @@ bool SurveyRun::_stopAction(Running& running, pid_t action) {
     ProcessTree::killDescendants(worker);
     if (running.unit.partition) {
         PartitionRecord& record = _record(running.unit);
-        record.stop = ActionStop{
-            contains(commandLine, gc_FetchAction) ? gc_FetchAction : gc_ClientAction, seconds};
-        record.interrupted = _signal != 0;
-        record.timedOut = _signal == 0;
+        record.stop =
+            ActionStop{contains(commandLine, gc_FetchAction) ? gc_FetchAction : gc_ClientAction,
+                       seconds, _signal != 0};
         running.child->setStopNote(_stopNote(seconds));
     } else if (_signal != 0) {
         running.listingStopped = true;
@@ -333,11 +324,8 @@ std::string SurveyRun::_stopNote(double seconds) const {
 void SurveyRun::_markUnfinished() {
     for (auto& machine : _machines) {
         for (auto& record : machine.partitions) {
-            if (!record.finished) {
-                record.outcome.returnCode = gc_NotSurveyedCode;
-                record.outcome.statusText = gc_Interrupted;
-                record.interrupted = true;
-                record.finished = true;
+            if (!record.outcome) {
+                settleUnfinished(record);
             }
         }
     }
@@ -391,8 +379,8 @@ void SurveyRun::_drawProgress() {
     for (auto const& machine : _machines) {
         figures.partitions += machine.partitions.size();
         for (auto const& record : machine.partitions) {
-            if (record.finished) {
-                ++(record.outcome.returnCode == "0" ? figures.surveyed : figures.failed);
+            if (record.outcome) {
+                ++(record.result.returnCode == "0" ? figures.surveyed : figures.failed);
             }
         }
     }

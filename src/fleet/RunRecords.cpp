@@ -1,0 +1,33 @@
+#include "fleet/RunRecords.h"
+
+namespace Fleet {
+
+namespace {
+
+constexpr char gc_NotSurveyedCode[] = "8";
+constexpr char gc_InterruptedText[] = "Interrupted - not surveyed";
+
+void markInterrupted(PartitionRecord& record) {
+    record.result.returnCode = gc_NotSurveyedCode;
+    record.result.statusText = gc_InterruptedText;
+    record.outcome = report::Outcome::Interrupted;
+}
+
+} // namespace
+
+void settlePartition(PartitionRecord& record, Quorvex::PYLON::VPD::PartitionOutcome result) {
+    record.result = std::move(result);
+    if (record.stop && record.stop->bySignal) {
+        markInterrupted(record);
+    } else if (record.stop) {
+        record.outcome = report::Outcome::TimedOut;
+    } else {
+        record.outcome = report::outcomeOf(record.result.kind);
+    }
+}
+
+void settleUnfinished(PartitionRecord& record) {
+    markInterrupted(record);
+}
+
+} // namespace Fleet

@@ -1,0 +1,57 @@
+#include "fleet/RunRecords.h"
+
+#include <gtest/gtest.h>
+
+using Fleet::ActionStop;
+using Fleet::PartitionRecord;
+using report::Outcome;
+using Kind = Quorvex::PYLON::VPD::PartitionOutcomeKind;
+
+namespace {
+
+Quorvex::PYLON::VPD::PartitionOutcome surveyResult(Kind kind, std::string const& code,
+                                                   std::string const& status) {
+    Quorvex::PYLON::VPD::PartitionOutcome result;
+    result.kind = kind;
+    result.returnCode = code;
+    result.statusText = status;
+    return result;
+}
+
+} // namespace
+
+TEST(RunRecords, UnstoppedPartitionTakesItsSurveysOutcome) {
+    PartitionRecord record;
+    EXPECT_EQ(record.outcome, std::nullopt);
+    Fleet::settlePartition(record,
+                           surveyResult(Kind::FetchFailure, "8", "2et result Failed, rc = "));
+    EXPECT_EQ(record.outcome, Outcome::FetchFailure);
+    EXPECT_EQ(record.result.statusText, "2et result Failed, rc = ");
+}
+
+TEST(RunRecords, PartitionStoppedByTheTimeLimitKeepsItsStatusTextAndIsTimedOut) {
+    PartitionRecord record;
+    record.stop = ActionStop{"runCmdOnPartition", 2.04, false};
+    Fleet::settlePartition(record,
+                           surveyResult(Kind::ClientFailure, "8", "Partition Failed, RcCmd = 9"));
+    EXPECT_EQ(record.outcome, Outcome::TimedOut);
+    EXPECT_EQ(record.result.statusText, "Partition Failed, RcCmd = 9");
+    EXPECT_EQ(record.result.returnCode, "8");
+}
+
+TEST(RunRecords, PartitionStoppedByASignalReadsInterruptedWhateverItsSurveyLeft) {
+    PartitionRecord record;
+    record.stop = ActionStop{"getFileFromPartition", 0.4, true};
+    Fleet::settlePartition(record, surveyResult(Kind::Surveyed, "0", "Ok"));
+    EXPECT_EQ(record.outcome, Outcome::Interrupted);
+    EXPECT_EQ(record.result.statusText, "Interrupted - not surveyed");
+    EXPECT_EQ(record.result.returnCode, "8");
+}
+
+TEST(RunRecords, UnfinishedPartitionIsInterruptedWithCodeEight) {
+    PartitionRecord record;
+    Fleet::settleUnfinished(record);
+    EXPECT_EQ(record.outcome, Outcome::Interrupted);
+    EXPECT_EQ(record.result.statusText, "Interrupted - not surveyed");
+    EXPECT_EQ(record.result.returnCode, "8");
+}
