@@ -23,22 +23,30 @@ std::optional<long long> codeOnLine(std::string const& reason, std::regex const&
     }
 }
 
-void parseStopLine(std::string const& reason, FailureReason& facts) {
+std::optional<StopLine> parseStopLine(std::string const& reason) {
     static std::regex const timeLimit(
         R"((?:^|\n)Stopped by the time limit of [^\n]* s after ([0-9]+(?:\.[0-9]+)?) s\.)");
     static std::regex const signal(
         R"((?:^|\n)Stopped by (SIGINT|SIGTERM) after ([0-9]+(?:\.[0-9]+)?) s\.)");
     std::smatch match;
     if (std::regex_search(reason, match, timeLimit)) {
-        facts.stoppedBy = "time limit";
-        facts.stoppedAfterSeconds = std::stod(match[1].str());
-    } else if (std::regex_search(reason, match, signal)) {
-        facts.stoppedBy = match[1].str();
-        facts.stoppedAfterSeconds = std::stod(match[2].str());
+        return StopLine{Stopper::TimeLimit, "", std::stod(match[1].str())};
     }
+    if (std::regex_search(reason, match, signal)) {
+        return StopLine{Stopper::Signal, match[1].str(), std::stod(match[2].str())};
+    }
+    return std::nullopt;
 }
 
 } // namespace
+
+bool FailureReason::isStoppedByTimeLimit() const {
+    return stop && stop->stopper == Stopper::TimeLimit;
+}
+
+bool FailureReason::isStoppedBySignal() const {
+    return stop && stop->stopper == Stopper::Signal;
+}
 
 bool isFailureReason(std::string const& reason) {
     return startsWith(reason, clientRunReason) || startsWith(reason, fetchReason);
@@ -49,13 +57,13 @@ FailureReason parseFailureReason(std::string const& reason) {
     static std::regex const rcCmdLine(R"((?:^|\n)\[ *RcCmd\] = (-?[0-9]{1,18})\n)");
     FailureReason facts;
     if (startsWith(reason, clientRunReason)) {
-        facts.action = "runCmdOnPartition";
+        facts.action = RemoteAction::RunCommand;
     } else if (startsWith(reason, fetchReason)) {
-        facts.action = "getFileFromPartition";
+        facts.action = RemoteAction::GetFile;
     }
     facts.rc = codeOnLine(reason, rcLine);
     facts.rcCmd = codeOnLine(reason, rcCmdLine);
-    parseStopLine(reason, facts);
+    facts.stop = parseStopLine(reason);
     return facts;
 }
 

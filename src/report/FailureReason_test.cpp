@@ -12,15 +12,17 @@ constexpr char fetchReason[] = "Unable to get File From Partition : \n\n[     Rc
 
 TEST(FailureReason, ClientRunReasonGivesActionAndCodes) {
     report::FailureReason const facts = report::parseFailureReason(channelReason);
-    EXPECT_EQ("runCmdOnPartition", facts.action);
+    EXPECT_EQ(report::RemoteAction::RunCommand, facts.action);
     EXPECT_EQ(4, facts.rc);
     EXPECT_EQ(0, facts.rcCmd);
-    EXPECT_EQ(std::nullopt, facts.stoppedBy);
+    EXPECT_FALSE(facts.stop.has_value());
+    EXPECT_FALSE(facts.isStoppedByTimeLimit());
+    EXPECT_FALSE(facts.isStoppedBySignal());
 }
 
 TEST(FailureReason, FetchReasonGivesItsAction) {
     report::FailureReason const facts = report::parseFailureReason(fetchReason);
-    EXPECT_EQ("getFileFromPartition", facts.action);
+    EXPECT_EQ(report::RemoteAction::GetFile, facts.action);
     EXPECT_EQ(2, facts.rc);
 }
 
@@ -48,15 +50,19 @@ TEST(FailureReason, ReturnStringLookingLikeACodeLineDoesNotCount) {
 TEST(FailureReason, TimeLimitLineGivesTheTimeItStopped) {
     report::FailureReason const facts = report::parseFailureReason(
         std::string(channelReason) + "Stopped by the time limit of 2 s after 2.0 s.\n");
-    EXPECT_EQ("time limit", facts.stoppedBy);
-    EXPECT_DOUBLE_EQ(2.0, facts.stoppedAfterSeconds.value());
+    EXPECT_TRUE(facts.isStoppedByTimeLimit());
+    EXPECT_FALSE(facts.isStoppedBySignal());
+    EXPECT_EQ("", facts.stop.value().signalName);
+    EXPECT_DOUBLE_EQ(2.0, facts.stop.value().afterSeconds);
 }
 
 TEST(FailureReason, SignalLineGivesTheSignalAndTheTime) {
     report::FailureReason const facts =
         report::parseFailureReason(std::string(fetchReason) + "Stopped by SIGTERM after 12.5 s.\n");
-    EXPECT_EQ("SIGTERM", facts.stoppedBy);
-    EXPECT_DOUBLE_EQ(12.5, facts.stoppedAfterSeconds.value());
+    EXPECT_TRUE(facts.isStoppedBySignal());
+    EXPECT_FALSE(facts.isStoppedByTimeLimit());
+    EXPECT_EQ("SIGTERM", facts.stop.value().signalName);
+    EXPECT_DOUBLE_EQ(12.5, facts.stop.value().afterSeconds);
 }
 
 TEST(FailureReason, OnlyTheSurveysFirstLinesMakeAReason) {
@@ -64,7 +70,7 @@ TEST(FailureReason, OnlyTheSurveysFirstLinesMakeAReason) {
     EXPECT_TRUE(report::isFailureReason(fetchReason));
     EXPECT_FALSE(report::isFailureReason("client note"));
     EXPECT_FALSE(report::isFailureReason(""));
-    EXPECT_EQ("", report::parseFailureReason("client note").action);
+    EXPECT_EQ(std::nullopt, report::parseFailureReason("client note").action);
 }
 
 } // namespace

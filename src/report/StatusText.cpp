@@ -10,7 +10,6 @@ namespace {
 
 constexpr char surveyedText[] = "Ok";
 constexpr char inactiveText[] = "Failed - Active Status < 3";
-constexpr char interruptedText[] = "Interrupted - not surveyed";
 constexpr char channelFailedPrefix[] = "RELAY Failed, rc = ";
 constexpr char clientFailedPrefix[] = "Partition Failed, RcCmd = ";
 constexpr char fetchFailedSeed[] = "get result Failed, rc = ";
@@ -35,24 +34,24 @@ bool isFetchFailure(std::string const& text) {
 
 } // namespace
 
-std::optional<std::string> outcomeOfStatusText(std::string const& statusText) {
+std::optional<Outcome> outcomeOfStatusText(std::string const& statusText) {
     if (statusText == surveyedText) {
-        return "surveyed";
+        return Outcome::Surveyed;
     }
     if (statusText == inactiveText) {
-        return "inactive";
+        return Outcome::Inactive;
     }
-    if (statusText == interruptedText) {
-        return "interrupted";
+    if (statusText == gc_InterruptedStatusText) {
+        return Outcome::Interrupted;
     }
     if (isCodeAfter(statusText, channelFailedPrefix)) {
-        return "channel_failure";
+        return Outcome::ChannelFailure;
     }
     if (isCodeAfter(statusText, clientFailedPrefix)) {
-        return "client_failure";
+        return Outcome::ClientFailure;
     }
     if (isFetchFailure(statusText)) {
-        return "fetch_failure";
+        return Outcome::FetchFailure;
     }
     return std::nullopt;
 }
