@@ -8,8 +8,8 @@ namespace report {
 
 namespace {
 
-constexpr char clientRunReason[] = "Partition not surveyed, reason: \n";
-constexpr char fetchReason[] = "Unable to get File From Partition : \n";
+constexpr char gc_ClientRunReason[] = "Partition not surveyed, reason: \n";
+constexpr char gc_FetchReason[] = "Unable to get File From Partition : \n";
 
 std::optional<long long> codeOnLine(std::string const& reason, std::regex const& line) {
     std::smatch match;
@@ -49,16 +49,16 @@ bool FailureReason::isStoppedBySignal() const {
 }
 
 bool isFailureReason(std::string const& reason) {
-    return startsWith(reason, clientRunReason) || startsWith(reason, fetchReason);
+    return startsWith(reason, gc_ClientRunReason) || startsWith(reason, gc_FetchReason);
 }
 
 FailureReason parseFailureReason(std::string const& reason) {
     static std::regex const rcLine(R"((?:^|\n)\[ *Rc\] = (-?[0-9]{1,18})\n)");
     static std::regex const rcCmdLine(R"((?:^|\n)\[ *RcCmd\] = (-?[0-9]{1,18})\n)");
     FailureReason facts;
-    if (startsWith(reason, clientRunReason)) {
+    if (startsWith(reason, gc_ClientRunReason)) {
         facts.action = RemoteAction::RunCommand;
-    } else if (startsWith(reason, fetchReason)) {
+    } else if (startsWith(reason, gc_FetchReason)) {
         facts.action = RemoteAction::GetFile;
     }
     facts.rc = codeOnLine(reason, rcLine);

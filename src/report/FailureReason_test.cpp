@@ -4,14 +4,15 @@
 
 namespace {
 
-constexpr char channelReason[] = "Partition not surveyed, reason: \nRELAY Failed.\n\n"
-                                 "[     Rc] = 4\n[  RcCmd] = 0\n[RetStr1] = no route\n"
-                                 "[RetStr2] = \n\n\n";
-constexpr char fetchReason[] = "Unable to get File From Partition : \n\n[     Rc] = 2\n"
-                               "[  RcCmd] = 0\n[RetStr1] = permission denied\n[RetStr2] = \n\n\n";
+constexpr char gc_ChannelReason[] = "Partition not surveyed, reason: \nRELAY Failed.\n\n"
+                                    "[     Rc] = 4\n[  RcCmd] = 0\n[RetStr1] = no route\n"
+                                    "[RetStr2] = \n\n\n";
+constexpr char gc_FetchReason[] =
+    "Unable to get File From Partition : \n\n[     Rc] = 2\n"
+    "[  RcCmd] = 0\n[RetStr1] = permission denied\n[RetStr2] = \n\n\n";
 
 TEST(FailureReason, ClientRunReasonGivesActionAndCodes) {
-    report::FailureReason const facts = report::parseFailureReason(channelReason);
+    report::FailureReason const facts = report::parseFailureReason(gc_ChannelReason);
     EXPECT_EQ(report::RemoteAction::RunCommand, facts.action);
     EXPECT_EQ(4, facts.rc);
     EXPECT_EQ(0, facts.rcCmd);
@@ -21,7 +22,7 @@ TEST(FailureReason, ClientRunReasonGivesActionAndCodes) {
 }
 
 TEST(FailureReason, FetchReasonGivesItsAction) {
-    report::FailureReason const facts = report::parseFailureReason(fetchReason);
+    report::FailureReason const facts = report::parseFailureReason(gc_FetchReason);
     EXPECT_EQ(report::RemoteAction::GetFile, facts.action);
     EXPECT_EQ(2, facts.rc);
 }
@@ -49,7 +50,7 @@ TEST(FailureReason, ReturnStringLookingLikeACodeLineDoesNotCount) {
 
 TEST(FailureReason, TimeLimitLineGivesTheTimeItStopped) {
     report::FailureReason const facts = report::parseFailureReason(
-        std::string(channelReason) + "Stopped by the time limit of 2 s after 2.0 s.\n");
+        std::string(gc_ChannelReason) + "Stopped by the time limit of 2 s after 2.0 s.\n");
     EXPECT_TRUE(facts.isStoppedByTimeLimit());
     EXPECT_FALSE(facts.isStoppedBySignal());
     EXPECT_EQ("", facts.stop.value().signalName);
@@ -57,8 +58,8 @@ TEST(FailureReason, TimeLimitLineGivesTheTimeItStopped) {
 }
 
 TEST(FailureReason, SignalLineGivesTheSignalAndTheTime) {
-    report::FailureReason const facts =
-        report::parseFailureReason(std::string(fetchReason) + "Stopped by SIGTERM after 12.5 s.\n");
+    report::FailureReason const facts = report::parseFailureReason(
+        std::string(gc_FetchReason) + "Stopped by SIGTERM after 12.5 s.\n");
     EXPECT_TRUE(facts.isStoppedBySignal());
     EXPECT_FALSE(facts.isStoppedByTimeLimit());
     EXPECT_EQ("SIGTERM", facts.stop.value().signalName);
@@ -66,8 +67,8 @@ TEST(FailureReason, SignalLineGivesTheSignalAndTheTime) {
 }
 
 TEST(FailureReason, OnlyTheSurveysFirstLinesMakeAReason) {
-    EXPECT_TRUE(report::isFailureReason(channelReason));
-    EXPECT_TRUE(report::isFailureReason(fetchReason));
+    EXPECT_TRUE(report::isFailureReason(gc_ChannelReason));
+    EXPECT_TRUE(report::isFailureReason(gc_FetchReason));
     EXPECT_FALSE(report::isFailureReason("client note"));
     EXPECT_FALSE(report::isFailureReason(""));
     EXPECT_EQ(std::nullopt, report::parseFailureReason("client note").action);
