@@ -12,6 +12,14 @@
 
 namespace Fleet {
 
+namespace {
+
+// Between a machine's trace name and the process and slot that own a piece.
+constexpr char gc_PieceMark[] = ".piece-";
+constexpr char gc_PieceSeparator[] = "-";
+
+} // namespace
+
 std::string RunFiles::statusFile(std::string const& identity) {
     return Quorvex::PYLON::VPD::get_StatusFileName(identity);
 }
@@ -21,7 +29,8 @@ std::string RunFiles::traceFile(std::string const& identity) {
 }
 
 std::string RunFiles::tracePiece(std::string const& identity, std::size_t slot) {
-    return traceFile(identity) + ".piece-" + std::to_string(getpid()) + "-" + std::to_string(slot);
+    return traceFile(identity) + gc_PieceMark + std::to_string(getpid()) + gc_PieceSeparator +
+           std::to_string(slot);
 }
 
 bool RunFiles::writeAtomically(std::string const& path, std::string const& text) {

@@ -1,15 +1,16 @@
 #include "fleet/RunRecords.h"
 
+#include "report/StatusText.h"
+
 namespace Fleet {
 
 namespace {
 
 constexpr char gc_NotSurveyedCode[] = "8";
-constexpr char gc_InterruptedText[] = "Interrupted - not surveyed";
 
 void markInterrupted(PartitionRecord& record) {
     record.result.returnCode = gc_NotSurveyedCode;
-    record.result.statusText = gc_InterruptedText;
+    record.result.statusText = report::gc_InterruptedStatusText;
     record.outcome = report::Outcome::Interrupted;
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "report/Outcome.h"
+#include "report/RemoteAction.h"
 #include "survey/PartitionOutcome.h"
 #include "system/Partition.h"
 
@@ -13,7 +14,7 @@ namespace Fleet {
 // A remote action that the run stopped: which one, after how long, and
 // whether a signal to the run (rather than the time limit) stopped it.
 struct ActionStop {
-    std::string action;
+    report::RemoteAction action = report::RemoteAction::RunCommand;
     double seconds = 0;
     bool bySignal = false;
 };
@@ -34,8 +35,8 @@ struct PartitionRecord {
 
 // The one place a partition's outcome is decided: from what its survey left
 // and whether the run stopped one of its actions. A partition an interruption
-// stopped reads "Interrupted - not surveyed" with code 8, whatever its survey
-// left.
+// stopped reads report::gc_InterruptedStatusText with code 8, whatever its
+// survey left.
 void settlePartition(PartitionRecord& record, Quorvex::PYLON::VPD::PartitionOutcome result);
 // A partition whose survey never ended because the run was interrupted.
 void settleUnfinished(PartitionRecord& record);

@@ -31,7 +31,7 @@ TEST(RunRecords, UnstoppedPartitionTakesItsSurveysOutcome) {
 
 TEST(RunRecords, PartitionStoppedByTheTimeLimitKeepsItsStatusTextAndIsTimedOut) {
     PartitionRecord record;
-    record.stop = ActionStop{"runCmdOnPartition", 2.04, false};
+    record.stop = ActionStop{report::RemoteAction::RunCommand, 2.04, false};
     Fleet::settlePartition(record,
                            surveyResult(Kind::ClientFailure, "8", "Partition Failed, RcCmd = 9"));
     EXPECT_EQ(record.outcome, Outcome::TimedOut);
@@ -41,7 +41,7 @@ TEST(RunRecords, PartitionStoppedByTheTimeLimitKeepsItsStatusTextAndIsTimedOut) 
 
 TEST(RunRecords, PartitionStoppedByASignalReadsInterruptedWhateverItsSurveyLeft) {
     PartitionRecord record;
-    record.stop = ActionStop{"getFileFromPartition", 0.4, true};
+    record.stop = ActionStop{report::RemoteAction::GetFile, 0.4, true};
     Fleet::settlePartition(record, surveyResult(Kind::Surveyed, "0", "Ok"));
     EXPECT_EQ(record.outcome, Outcome::Interrupted);
     EXPECT_EQ(record.result.statusText, "Interrupted - not surveyed");

@@ -10,7 +10,7 @@ namespace {
 using Fleet::MachineRecord;
 using Fleet::PartitionRecord;
 using Fleet::RunFacts;
-using Fleet::Summary;
+using Json = nlohmann::ordered_json;
 using Kind = Quorvex::PYLON::VPD::PartitionOutcomeKind;
 
 // The interpreter that Debian's python3-jsonschema belongs to.
@@ -46,7 +46,7 @@ std::vector<MachineRecord> everyOutcome() {
     PartitionRecord timedOut = finished(Kind::ChannelFailure, "8");
     timedOut.result.fileName = "VPD/x-7.VPD.xml";
     timedOut.result.reason = "Partition not surveyed, reason: \nRELAY Failed.\n\n\n\nStopped.\n";
-    timedOut.stop = Fleet::ActionStop{"runCmdOnPartition", 2.04, false};
+    timedOut.stop = Fleet::ActionStop{report::RemoteAction::RunCommand, 2.04, false};
     timedOut.outcome = report::Outcome::TimedOut;
     PartitionRecord interrupted;
     interrupted.partition.set_PartitionID("9");
@@ -74,27 +74,48 @@ RunFacts facts() {
     run.ended = report::localTimeText(60);
     run.elapsedSeconds = 60;
     run.interruptedBy = "SIGINT";
-    run.returnCode = "4";
     run.exitStatus = 130;
     return run;
 }
 
-TEST(Summary, OutcomeNamesAreTheRecordsOutcomes) {
-    EXPECT_EQ(Summary::outcomeName(finished(Kind::Surveyed, "0")), "surveyed");
-    EXPECT_EQ(Summary::outcomeName(finished(Kind::Inactive, "8")), "inactive");
-    EXPECT_EQ(Summary::outcomeName(finished(Kind::ChannelFailure, "8")), "channel_failure");
-    EXPECT_EQ(Summary::outcomeName(finished(Kind::ClientFailure, "8")), "client_failure");
-    EXPECT_EQ(Summary::outcomeName(finished(Kind::FetchFailure, "8")), "fetch_failure");
-    PartitionRecord stopped = finished(Kind::FetchFailure, "8");
-    stopped.outcome = report::Outcome::TimedOut;
-    EXPECT_EQ(Summary::outcomeName(stopped), "timed_out");
-    stopped.outcome = report::Outcome::Interrupted;
-    EXPECT_EQ(Summary::outcomeName(stopped), "interrupted");
+Json document(RunFacts const& run, std::vector<MachineRecord> const& machines) {
+    return report::summaryDocument(Fleet::runSummary(run, machines));
+}
+
+TEST(Summary, PartitionOutcomesAreTheRecordsOutcomes) {
+    Json const summary = document(facts(), everyOutcome());
+    std::vector<std::string> outcomes;
+    for (Json const& partition : summary["machines"][0]["partitions"]) {
+        outcomes.push_back(partition["outcome"]);
+    }
+    EXPECT_EQ(outcomes,
+              (std::vector<std::string>{"surveyed", "inactive", "channel_failure", "client_failure",
+                                        "fetch_failure", "timed_out", "interrupted"}));
+}
+
+TEST(Summary, PartitionWhoseSurveyNeverEndedIsInterrupted) {
+    MachineRecord machine;
+    machine.identity = "9119-MHE_21ABCDE";
+    machine.partitions = {PartitionRecord{}};
+    EXPECT_EQ(report::Outcome::Interrupted,
+              Fleet::runSummary(facts(), {machine}).machines[0].partitions[0].outcome);
+}
+
+TEST(Summary, RunFactsAndOptionsAreCarried) {
+    Json const summary = document(facts(), everyOutcome());
+    EXPECT_EQ(summary["tool"], "quorvex-survey");
+    EXPECT_EQ(summary["interrupted"], "SIGINT");
+    EXPECT_EQ(summary["exit_status"], 130);
+    EXPECT_EQ(summary["return_code"], "4");
+    EXPECT_EQ(summary["elapsed_seconds"].dump(), "60.0");
+    EXPECT_EQ(summary["options"].dump(),
+              R"({"jobs":8,"timeout_seconds":1800,"all":false,)"
+              R"("identities":["9119-MHE_21ABCDE","8286-42A_10XYZ99"]})");
 }
 
 TEST(Summary, CountsAddUpPerMachineAndOverAll) {
-    nlohmann::json const summary = Summary::build(facts(), everyOutcome());
-    nlohmann::json const& counts = summary["machines"][0]["counts"];
+    Json const summary = document(facts(), everyOutcome());
+    Json const& counts = summary["machines"][0]["counts"];
     EXPECT_EQ(counts["partitions"], 7);
     for (char const* outcome : {"surveyed", "inactive", "channel_failure", "client_failure",
                                 "fetch_failure", "timed_out", "interrupted"}) {
@@ -104,22 +125,22 @@ TEST(Summary, CountsAddUpPerMachineAndOverAll) {
     EXPECT_EQ(summary["totals"]["partitions"], 7);
     EXPECT_EQ(summary["machines"][0]["return_code"], "4");
     EXPECT_EQ(summary["machines"][1]["return_code"], "8");
-    EXPECT_EQ(summary["machines"][1]["partitions"], nlohmann::json::array());
+    EXPECT_EQ(summary["machines"][1]["partitions"], Json::array());
 }
 
 TEST(Summary, PartitionCarriesItsRecordAndNullsWhereNothingIsKnown) {
-    nlohmann::json const summary = Summary::build(facts(), everyOutcome());
-    nlohmann::json const& surveyed = summary["machines"][0]["partitions"][0];
+    Json const summary = document(facts(), everyOutcome());
+    Json const& surveyed = summary["machines"][0]["partitions"][0];
     EXPECT_EQ(surveyed["document"], "VPD/x-7.VPD.xml");
     EXPECT_EQ(surveyed["rc"], 0);
     EXPECT_EQ(surveyed["seconds"], 1.25);
     EXPECT_TRUE(surveyed["reason"].is_null());
     EXPECT_FALSE(surveyed.contains("time_limit"));
-    nlohmann::json const& inactive = summary["machines"][0]["partitions"][1];
+    Json const& inactive = summary["machines"][0]["partitions"][1];
     EXPECT_TRUE(inactive["document"].is_null());
     EXPECT_TRUE(inactive["rc"].is_null());
     EXPECT_TRUE(inactive["seconds"].is_null());
-    nlohmann::json const& timedOut = summary["machines"][0]["partitions"][5];
+    Json const& timedOut = summary["machines"][0]["partitions"][5];
     EXPECT_EQ(timedOut["time_limit"]["action"], "runCmdOnPartition");
     EXPECT_EQ(timedOut["time_limit"]["stopped_after_seconds"], 2.04);
     EXPECT_EQ(summary["machines"][0]["trace_file"],
@@ -128,7 +149,7 @@ TEST(Summary, PartitionCarriesItsRecordAndNullsWhereNothingIsKnown) {
 }
 
 TEST(Summary, BytesThatAreNotUtf8AreReplaced) {
-    std::string const text = Summary::text(Summary::build(facts(), everyOutcome()));
+    std::string const text = report::summaryText(document(facts(), everyOutcome()));
     EXPECT_NE(text.find("\"h\xef\xbf\xbd\xef\xbf\xbd\""), std::string::npos);
 }
 
@@ -136,13 +157,13 @@ TEST(Summary, BytesThatAreNotUtf8AreReplaced) {
 // validator of Debian's python3-jsonschema.
 TEST(Summary, DocumentIsValidAgainstTheSchema) {
     QuorvexTest::TemporaryDirectory const folder;
-    std::string const document = folder.file("summary.json");
-    QuorvexTest::writeFile(document, Summary::text(Summary::build(facts(), everyOutcome())));
+    std::string const file = folder.file("summary.json");
+    QuorvexTest::writeFile(file, report::summaryText(document(facts(), everyOutcome())));
     RunFacts uninterrupted = facts();
     uninterrupted.interruptedBy.clear();
     uninterrupted.exitStatus = 4;
     std::string const second = folder.file("second.json");
-    QuorvexTest::writeFile(second, Summary::text(Summary::build(uninterrupted, {})));
+    QuorvexTest::writeFile(second, report::summaryText(document(uninterrupted, {})));
     std::string const check =
         "import json, sys, jsonschema\n"
         "schema = json.load(open(sys.argv[1]))\n"
@@ -151,23 +172,23 @@ TEST(Summary, DocumentIsValidAgainstTheSchema) {
         "    jsonschema.Draft202012Validator(schema).validate(json.load(open(name)))\n";
     QuorvexTest::CommandResult const result = QuorvexTest::runCommand(
         {gc_DebianPython, "-c", check, QuorvexTest::sourceRoot() + "/docs/summary.schema.json",
-         document, second});
+         file, second});
     EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
 }
 
 TEST(Summary, SchemaCheckRejectsADocumentWithAnUnknownOutcome) {
     QuorvexTest::TemporaryDirectory const folder;
-    nlohmann::json summary = Summary::build(facts(), everyOutcome());
+    Json summary = document(facts(), everyOutcome());
     summary["machines"][0]["partitions"][0]["outcome"] = "lost";
-    std::string const document = folder.file("summary.json");
-    QuorvexTest::writeFile(document, Summary::text(summary));
+    std::string const file = folder.file("summary.json");
+    QuorvexTest::writeFile(file, report::summaryText(summary));
     std::string const check = "import json, sys, jsonschema\n"
                               "schema = json.load(open(sys.argv[1]))\n"
                               "jsonschema.Draft202012Validator(schema).validate("
                               "json.load(open(sys.argv[2])))\n";
-    QuorvexTest::CommandResult const result = QuorvexTest::runCommand(
-        {gc_DebianPython, "-c", check, QuorvexTest::sourceRoot() + "/docs/summary.schema.json",
-         document});
+    QuorvexTest::CommandResult const result =
+        QuorvexTest::runCommand({gc_DebianPython, "-c", check,
+                                 QuorvexTest::sourceRoot() + "/docs/summary.schema.json", file});
     EXPECT_NE(result.exitStatus, 0);
 }
 

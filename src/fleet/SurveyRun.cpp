@@ -26,8 +26,6 @@ constexpr int gc_PollMilliseconds = 50;
 constexpr int gc_EndingPollMilliseconds = 1;
 constexpr auto gc_ProgressInterval = std::chrono::milliseconds(200);
 constexpr char gc_RemoteActionTool[] = "runact-api";
-constexpr char gc_FetchAction[] = "getFileFromPartition";
-constexpr char gc_ClientAction[] = "runCmdOnPartition";
 constexpr char gc_NotSurveyedCode[] = "8";
 constexpr char gc_NotStarted[] = "Failed - not started";
 
@@ -299,8 +297,7 @@ bool SurveyRun::_stopAction(Running& running, pid_t action) {
     if (running.unit.partition) {
         PartitionRecord& record = _record(running.unit);
         record.stop =
-            ActionStop{contains(commandLine, gc_FetchAction) ? gc_FetchAction : gc_ClientAction,
-                       seconds, _signal != 0};
+            ActionStop{report::remoteActionOfCommandLine(commandLine), seconds, _signal != 0};
         running.child->setStopNote(_stopNote(seconds));
     } else if (_signal != 0) {
         running.listingStopped = true;

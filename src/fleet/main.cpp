@@ -8,6 +8,7 @@
 #include "fleet/WorkUnits.h"
 #include "report/LocalTime.h"
 #include "report/ReportCommand.h"
+#include "report/RunSummary.h"
 #include "utility/Trace.h"
 
 #include <poll.h>
@@ -52,8 +53,8 @@ std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
     return Fleet::WorkUnits::decodeMachines(lister.result());
 }
 
-void writeSummary(Fleet::RunFacts const& facts, nlohmann::json const& summary) {
-    std::string const text = Fleet::Summary::text(summary);
+void writeSummary(Fleet::RunFacts const& facts, nlohmann::ordered_json const& summary) {
+    std::string const text = report::summaryText(summary);
     if (!Fleet::RunFiles::writeAtomically(facts.options.summaryFile, text)) {
         std::cerr << "quorvex-survey: cannot write the summary to " << facts.options.summaryFile
                   << std::endl;
@@ -95,9 +96,9 @@ int main(int argc, char** argv) {
         if (run.interruptingSignal() != 0) {
             facts.interruptedBy = run.interruptingSignal() == SIGTERM ? "SIGTERM" : "SIGINT";
         }
-        facts.returnCode = run.overallCode();
         facts.exitStatus = exitStatus;
-        nlohmann::json const summary = Fleet::Summary::build(facts, run.machines());
+        nlohmann::ordered_json const summary =
+            report::summaryDocument(Fleet::runSummary(facts, run.machines()));
         if (!options.summaryFile.empty()) {
             writeSummary(facts, summary);
         }

@@ -1,22 +1,40 @@
 #pragma once
 
+#include "report/RemoteAction.h"
+
 #include <optional>
 #include <string>
 
 namespace report {
 
+// What stopped a remote action before it ended.
+enum class Stopper {
+    TimeLimit,
+    Signal,
+};
+
+// The line quorvex-survey adds to a stopped action's reason: "Stopped by the
+// time limit of T s after S s." or "Stopped by SIGINT after S s.".
+struct StopLine {
+    Stopper stopper = Stopper::TimeLimit;
+    // "SIGINT" or "SIGTERM" when a signal stopped the action; else empty.
+    std::string signalName;
+    // S: how long the action had run.
+    double afterSeconds = 0;
+};
+
 // What a default document's reason says about a failed partition.
 struct FailureReason {
-    // "runCmdOnPartition" for a failed client run, "getFileFromPartition" for
-    // a failed fetch; empty for a text the survey never writes as a reason.
-    std::string action;
+    // The action that failed; none for a text the survey never writes as a
+    // reason.
+    std::optional<RemoteAction> action;
     // The Rc and RcCmd lines of the printed return codes, when numeric.
     std::optional<long long> rc;
     std::optional<long long> rcCmd;
-    // The line "Stopped by the time limit of T s after S s." or
-    // "Stopped by SIGINT after S s.": who stopped the action, and S.
-    std::optional<std::string> stoppedBy;
-    std::optional<double> stoppedAfterSeconds;
+    std::optional<StopLine> stop;
+
+    bool isStoppedByTimeLimit() const;
+    bool isStoppedBySignal() const;
 };
 
 // The reason as the survey writes it: a fixed first line ("Partition not

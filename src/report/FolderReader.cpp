@@ -2,12 +2,14 @@
 
 #include "report/FailureReason.h"
 #include "report/LocalTime.h"
+#include "report/MachineDocuments.h"
 #include "report/StatusText.h"
-#include "report/SummaryTotals.h"
 #include "report/TextChecks.h"
 #include "report/TextSafety.h"
 #include "report/VpdDocument.h"
 #include "survey/Survey_Files.h"
+
+#include <unistd.h>
 
 #include <algorithm>
 #include <chrono>
@@ -16,52 +18,45 @@
 #include <iterator>
 #include <map>
 #include <sstream>
-#include <unistd.h>
-#include <unordered_map>
 #include <vector>
 
 namespace report {
 
 namespace fs = std::filesystem;
-using Json = nlohmann::ordered_json;
+namespace VPD = Quorvex::PYLON::VPD;
 
 namespace {
 
-constexpr char statusSuffix[] = ".status";
-constexpr char documentSuffix[] = ".VPD.xml";
-constexpr char noPartitionsLine[] = "No ACTIVE Partition Found.";
-constexpr char statusSeparator[] = "] - VPD Survey - ";
-constexpr char documentFolder[] = "VPD/";
-
-// The stem of every file name the survey writes, with the "_" before the
-// machine's identity.
-std::string const& filePrefix() {
-    static std::string const prefix = std::string(Quorvex::PYLON::VPD::gc_ProgramName) + "_";
-    return prefix;
-}
-
-// name without prefix and suffix.
-std::string middleOf(std::string const& name, std::string const& prefix,
-                     std::string const& suffix) {
-    return name.substr(prefix.size(), name.size() - prefix.size() - suffix.size());
-}
-
-struct DocumentFile {
-    std::string name;
-    std::string id;
-    VpdDocument content;
-    // The content's reason read once: a large console has thousands.
-    std::optional<FailureReason> failure;
-    bool used = false;
-};
-
-// A machine's documents by host name, each host's in ID order.
-using DocumentsByHost = std::unordered_map<std::string, std::vector<DocumentFile*>>;
+constexpr char gc_ToolName[] = "quorvex-survey report";
+constexpr char gc_NoPartitionsLine[] = "No ACTIVE Partition Found.";
+constexpr char gc_StatusSeparator[] = "] - VPD Survey - ";
+// Between the machine identity and the partition ID in a partition text.
+constexpr char gc_PartitionIdSeparator[] = "-";
+// The survey's codes of a partition.
+constexpr char gc_SurveyedCode[] = "0";
+constexpr char gc_NotSurveyedCode[] = "8";
 
 struct StatusLine {
     std::string host;
     std::string ip;
     std::string statusText;
+};
+
+// The files of the folder that surveys write: status files by identity, and
+// documents.
+struct FolderFiles {
+    std::map<std::string, fs::path> statusFiles;
+    std::vector<fs::path> documents;
+};
+
+// What reading the files tells about the run besides its machines.
+struct RunTraces {
+    // The modification times of the oldest and the newest file read, in
+    // seconds since the epoch.
+    std::optional<long long> oldest;
+    std::optional<long long> newest;
+    // The signal that stopped a partition's action, if one did.
+    std::optional<std::string> interruptedBy;
 };
 
 std::string readText(fs::path const& path) {
@@ -71,10 +66,24 @@ std::string readText(fs::path const& path) {
     return text.str();
 }
 
+void noteFileTime(fs::path const& path, RunTraces& traces) {
+    std::error_code error;
+    auto const time = fs::last_write_time(path, error);
+    if (error) {
+        return;
+    }
+    long long const seconds = std::chrono::duration_cast<std::chrono::seconds>(
+                                  time - fs::file_time_type::clock::now() +
+                                  std::chrono::system_clock::now().time_since_epoch())
+                                  .count();
+    traces.oldest = std::min(traces.oldest.value_or(seconds), seconds);
+    traces.newest = std::max(traces.newest.value_or(seconds), seconds);
+}
+
 // "<host> [<ip>] - VPD Survey - <status>": the host may hold anything, the
 // status texts never hold the separator, so the last one splits.
 std::optional<StatusLine> parseStatusLine(std::string const& line) {
-    std::string::size_type const separator = line.rfind(statusSeparator);
+    std::string::size_type const separator = line.rfind(gc_StatusSeparator);
     if (separator == std::string::npos) {
         return std::nullopt;
     }
@@ -83,7 +92,7 @@ std::optional<StatusLine> parseStatusLine(std::string const& line) {
         return std::nullopt;
     }
     return StatusLine{line.substr(0, open), line.substr(open + 2, separator - open - 2),
-                      line.substr(separator + std::string(statusSeparator).size())};
+                      line.substr(separator + std::string(gc_StatusSeparator).size())};
 }
 
 std::vector<StatusLine> readStatusLines(fs::path const& path) {
@@ -91,7 +100,7 @@ std::vector<StatusLine> readStatusLines(fs::path const& path) {
     std::vector<StatusLine> lines;
     std::string line;
     while (std::getline(text, line)) {
-        if (line == noPartitionsLine) {
+        if (line == gc_NoPartitionsLine) {
             continue;
         }
         if (auto parsed = parseStatusLine(line)) {
@@ -101,262 +110,191 @@ std::vector<StatusLine> readStatusLines(fs::path const& path) {
     return lines;
 }
 
-// Numeric IDs in numeric order, then the others in text order.
-bool isBeforeInIdOrder(DocumentFile const& a, DocumentFile const& b) {
-    auto const key = [](std::string const& id) {
-        bool const numeric = id.size() < 19 && isDigits(id);
-        return std::make_tuple(!numeric, numeric ? std::stoll(id) : 0LL, id);
-    };
-    return key(a.id) < key(b.id);
+FolderFiles listFolder(fs::path const& folder) {
+    FolderFiles files;
+    std::error_code error;
+    for (fs::directory_iterator entry(folder, error), end; !error && entry != end;
+         entry.increment(error)) {
+        std::string const name = entry->path().filename().string();
+        std::optional<std::string> const identity = VPD::get_IdentityOfStatusFileName(name);
+        bool const document = VPD::get_PartitionTextOfResultName(name).has_value();
+        if ((!identity && !document) || !entry->is_regular_file(error)) {
+            continue;
+        }
+        if (identity) {
+            files.statusFiles.emplace(*identity, entry->path());
+        } else {
+            files.documents.push_back(entry->path());
+        }
+    }
+    return files;
 }
 
-class FolderScan {
-public:
-    explicit FolderScan(fs::path folder) : _folder(std::move(folder)) {}
-
-    Json summary() {
-        std::map<std::string, fs::path> statusFiles;
-        std::vector<fs::path> documents;
-        listFolder(statusFiles, documents);
-        std::map<std::string, std::vector<DocumentFile>> documentsByMachine;
-        for (fs::path const& document : documents) {
-            assignDocument(document, statusFiles, documentsByMachine);
-        }
-        Json machines = Json::array();
-        Json identities = Json::array();
-        for (auto const& [identity, path] : statusFiles) {
-            noteTime(path);
-            machines.push_back(machine(identity, path, documentsByMachine[identity]));
-            identities.push_back(validUtf8(identity));
-        }
-        return runSummary(std::move(machines), std::move(identities));
-    }
-
-private:
-    void listFolder(std::map<std::string, fs::path>& statusFiles,
-                    std::vector<fs::path>& documents) const {
-        std::error_code error;
-        for (fs::directory_iterator entry(_folder, error), end; !error && entry != end;
-             entry.increment(error)) {
-            std::string const name = entry->path().filename().string();
-            if (!startsWith(name, filePrefix()) || !entry->is_regular_file(error)) {
-                continue;
-            }
-            if (endsWith(name, statusSuffix)) {
-                std::string const identity = middleOf(name, filePrefix(), statusSuffix);
-                statusFiles.emplace(identity, entry->path());
-            } else if (endsWith(name, documentSuffix)) {
-                documents.push_back(entry->path());
-            }
+// The machine a partition text belongs to: the one with the longest identity
+// the text starts with, followed by the separator and the partition ID.
+std::string const* ownerOf(std::string const& partitionText,
+                           std::map<std::string, fs::path> const& statusFiles) {
+    std::string const* owner = nullptr;
+    for (auto const& entry : statusFiles) {
+        if (startsWith(partitionText, entry.first + gc_PartitionIdSeparator) &&
+            (owner == nullptr || entry.first.size() > owner->size())) {
+            owner = &entry.first;
         }
     }
+    return owner;
+}
 
-    // A document belongs to the machine with the longest identity its name
-    // starts with, followed by "-" and the partition ID.
-    void assignDocument(fs::path const& path, std::map<std::string, fs::path> const& statusFiles,
-                        std::map<std::string, std::vector<DocumentFile>>& byMachine) {
-        std::string const name = path.filename().string();
-        std::string const stem = middleOf(name, filePrefix(), documentSuffix);
-        std::string const* owner = nullptr;
-        for (auto const& entry : statusFiles) {
-            if (startsWith(stem, entry.first + "-") &&
-                (owner == nullptr || entry.first.size() > owner->size())) {
-                owner = &entry.first;
-            }
-        }
+DocumentFile readDocument(fs::path const& path, std::string partitionText, std::string id) {
+    VpdDocument content = parseVpdDocument(readText(path));
+    std::optional<FailureReason> failure;
+    if (content.reason) {
+        failure = parseFailureReason(*content.reason);
+    }
+    return {std::move(partitionText), std::move(id), std::move(content), std::move(failure)};
+}
+
+// Every document whose machine has a status file, by the machine's identity.
+std::map<std::string, std::vector<DocumentFile>> readDocuments(FolderFiles const& files,
+                                                               RunTraces& traces) {
+    std::map<std::string, std::vector<DocumentFile>> byMachine;
+    for (fs::path const& path : files.documents) {
+        std::string const partitionText =
+            *VPD::get_PartitionTextOfResultName(path.filename().string());
+        std::string const* owner = ownerOf(partitionText, files.statusFiles);
         if (owner == nullptr) {
-            return;
+            continue;
         }
-        VpdDocument content = parseVpdDocument(readText(path));
-        std::optional<FailureReason> failure;
-        if (content.reason) {
-            failure = parseFailureReason(*content.reason);
-        }
-        byMachine[*owner].push_back(
-            {name, stem.substr(owner->size() + 1), std::move(content), std::move(failure), false});
-        noteTime(path);
+        std::string id =
+            partitionText.substr(owner->size() + std::string(gc_PartitionIdSeparator).size());
+        byMachine[*owner].push_back(readDocument(path, partitionText, std::move(id)));
+        noteFileTime(path, traces);
     }
+    return byMachine;
+}
 
-    void noteTime(fs::path const& path) {
-        std::error_code error;
-        auto const time = fs::last_write_time(path, error);
-        if (error) {
-            return;
-        }
-        long long const seconds = std::chrono::duration_cast<std::chrono::seconds>(
-                                      time - fs::file_time_type::clock::now() +
-                                      std::chrono::system_clock::now().time_since_epoch())
-                                      .count();
-        _oldest = std::min(_oldest.value_or(seconds), seconds);
-        _newest = std::max(_newest.value_or(seconds), seconds);
+// The outcome a status line and its document's reason give: a text the
+// survey never writes is a failure of the document's kind; a failure the
+// time limit stopped is timed out.
+Outcome outcomeOf(std::optional<Outcome> statusOutcome, FailureReason const* reason) {
+    Outcome outcome = statusOutcome.value_or(reason && reason->action == RemoteAction::GetFile
+                                                 ? Outcome::FetchFailure
+                                                 : Outcome::ClientFailure);
+    if (reason && reason->isStoppedByTimeLimit() && outcome != Outcome::Interrupted) {
+        outcome = Outcome::TimedOut;
     }
+    return outcome;
+}
 
-    Json machine(std::string const& identity, fs::path const& statusFile,
-                 std::vector<DocumentFile>& documents) {
-        std::sort(documents.begin(), documents.end(), isBeforeInIdOrder);
-        DocumentsByHost byHost;
-        for (DocumentFile& document : documents) {
-            if (document.content.host) {
-                byHost[*document.content.host].push_back(&document);
-            }
-        }
-        std::vector<StatusLine> const lines = readStatusLines(statusFile);
-        Json partitions = Json::array();
-        std::transform(lines.begin(), lines.end(), std::back_inserter(partitions),
-                       [&](StatusLine const& line) { return partition(line, byHost); });
-        Json counts = countOutcomes(partitions);
-        Json entry;
-        entry["identity"] = validUtf8(identity);
-        entry["return_code"] = overallCode(counts);
-        entry["status_file"] = validUtf8(fs::absolute(statusFile).lexically_normal().string());
-        entry["trace_file"] = traceFile(identity);
-        entry["counts"] = std::move(counts);
-        entry["partitions"] = std::move(partitions);
-        return entry;
+// What a partition's default document adds to its summary.
+void addFailure(PartitionSummary& partition, FailureReason const& failure,
+                std::string const& reasonText) {
+    partition.rc = failure.rc;
+    if (failure.action == RemoteAction::RunCommand) {
+        partition.rcCmd = failure.rcCmd;
     }
-
-    // The machine's own trace, as quorvex-survey writes it beside the VPD
-    // folder; the single-machine tool's one trace holds only the last
-    // machine it ran for, so it is named for none.
-    Json traceFile(std::string const& identity) const {
-        fs::path vpd = fs::absolute(_folder).lexically_normal();
-        if (!vpd.has_filename()) {
-            vpd = vpd.parent_path();
-        }
-        fs::path const trace = vpd.parent_path() / "Trace" / (filePrefix() + identity + ".Trace");
-        std::error_code error;
-        if (!fs::is_regular_file(trace, error)) {
-            return nullptr;
-        }
-        return validUtf8(trace.string());
+    partition.reason = validUtf8(reasonText);
+    if (failure.stop && failure.action) {
+        partition.stoppedAction = StoppedAction{*failure.action, failure.stop->afterSeconds};
     }
+}
 
-    Json partition(StatusLine const& line, DocumentsByHost& byHost) {
-        std::optional<std::string> outcome = outcomeOfStatusText(line.statusText);
-        DocumentFile* document = matchDocument(line, outcome, byHost);
-        std::optional<FailureReason> reason;
-        if (document != nullptr) {
-            reason = document->failure;
-        }
-        if (!outcome) {
-            outcome = reason && reason->action == "getFileFromPartition" ? "fetch_failure"
-                                                                         : "client_failure";
-        }
-        if (reason && reason->stoppedBy == "time limit" && *outcome != "interrupted") {
-            outcome = "timed_out";
-        }
-        if (reason && reason->stoppedBy && *reason->stoppedBy != "time limit") {
-            _signal = *reason->stoppedBy;
-        }
-        Json entry;
-        entry["id"] = document ? Json(validUtf8(document->id)) : Json(nullptr);
-        entry["host"] = validUtf8(line.host);
-        entry["ip"] = validUtf8(line.ip);
-        entry["active_status"] = nullptr;
-        entry["outcome"] = *outcome;
-        entry["status_text"] = validUtf8(line.statusText);
-        entry["return_code"] = *outcome == "surveyed" ? "0" : "8";
-        entry["rc"] = reason && reason->rc ? Json(*reason->rc) : Json(nullptr);
-        bool const clientRun = reason && reason->action == "runCmdOnPartition";
-        entry["rc_cmd"] = clientRun && reason->rcCmd ? Json(*reason->rcCmd) : Json(nullptr);
-        entry["document"] =
-            document ? Json(validUtf8(documentFolder + document->name)) : Json(nullptr);
-        entry["reason"] = reason ? Json(validUtf8(*document->content.reason)) : Json(nullptr);
-        entry["seconds"] = nullptr;
-        if (reason && reason->stoppedAfterSeconds && !reason->action.empty()) {
-            entry["time_limit"] = {{"action", reason->action},
-                                   {"stopped_after_seconds", *reason->stoppedAfterSeconds}};
-        }
-        return entry;
+PartitionSummary partitionSummary(StatusLine const& line, MachineDocuments& documents,
+                                  RunTraces& traces) {
+    std::optional<Outcome> const statusOutcome = outcomeOfStatusText(line.statusText);
+    DocumentFile const* document = documents.take(line.host, statusOutcome);
+    FailureReason const* failure =
+        document != nullptr && document->failure ? &*document->failure : nullptr;
+    PartitionSummary partition;
+    partition.host = validUtf8(line.host);
+    partition.ip = validUtf8(line.ip);
+    partition.outcome = outcomeOf(statusOutcome, failure);
+    partition.statusText = validUtf8(line.statusText);
+    partition.returnCode =
+        partition.outcome == Outcome::Surveyed ? gc_SurveyedCode : gc_NotSurveyedCode;
+    if (document != nullptr) {
+        partition.id = validUtf8(document->id);
+        partition.document = validUtf8(VPD::get_LocalResultName(document->partitionText));
     }
-
-    // The first unused document in ID order for the same host whose kind
-    // fits the status: fetched for a surveyed partition, a default one for a
-    // failure, one stopped by a signal for an interrupted partition; none for
-    // an inactive partition, which gets no document.
-    static DocumentFile* matchDocument(StatusLine const& line,
-                                       std::optional<std::string> const& outcome,
-                                       DocumentsByHost& byHost) {
-        auto const sameHost = byHost.find(line.host);
-        if (outcome == "inactive" || sameHost == byHost.end()) {
-            return nullptr;
-        }
-        auto const& candidates = sameHost->second;
-        auto const found =
-            std::find_if(candidates.begin(), candidates.end(), [&](DocumentFile const* document) {
-                return !document->used && fitsOutcome(document->failure, outcome);
-            });
-        if (found == candidates.end()) {
-            return nullptr;
-        }
-        (*found)->used = true;
-        return *found;
+    if (failure != nullptr) {
+        addFailure(partition, *failure, *document->content.reason);
     }
-
-    static bool fitsOutcome(std::optional<FailureReason> const& failure,
-                            std::optional<std::string> const& outcome) {
-        if (outcome == "surveyed") {
-            return !failure;
-        }
-        if (!failure) {
-            return false;
-        }
-        bool const bySignal = failure->stoppedBy && *failure->stoppedBy != "time limit";
-        if (outcome == "interrupted") {
-            return bySignal;
-        }
-        std::string const& action = failure->action;
-        if (outcome == "fetch_failure") {
-            return action == "getFileFromPartition" && !bySignal;
-        }
-        if (outcome == "channel_failure" || outcome == "client_failure") {
-            return action == "runCmdOnPartition" && !bySignal;
-        }
-        return !bySignal;
+    if (failure != nullptr && failure->isStoppedBySignal()) {
+        traces.interruptedBy = failure->stop->signalName;
     }
+    return partition;
+}
 
-    Json runSummary(Json machines, Json identities) const {
-        Json run;
-        run["schema_version"] = 1;
-        run["tool"] = "quorvex-survey report";
-        run["version"] = QUORVEX_VERSION;
-        run["console_host"] = validUtf8(consoleHost());
-        long long const started = _oldest.value_or(0);
-        long long const ended = _newest.value_or(0);
-        run["started"] = localTimeText(started);
-        run["ended"] = localTimeText(ended);
-        run["elapsed_seconds"] = ended - started;
-        run["options"] = {{"jobs", nullptr},
-                          {"timeout_seconds", nullptr},
-                          {"all", false},
-                          {"identities", std::move(identities)}};
-        run["interrupted"] = _signal ? Json(*_signal) : Json(nullptr);
-        Json totals = totalCounts(machines);
-        run["return_code"] = overallCode(totals);
-        run["exit_status"] = nullptr;
-        run["totals"] = std::move(totals);
-        run["machines"] = std::move(machines);
-        return run;
+// The machine's own trace, as quorvex-survey writes it in the Trace folder
+// beside the VPD folder; the single-machine tool's one trace holds only the
+// last machine it ran for, so it is named for none.
+std::optional<std::string> traceFileOf(fs::path const& vpdFolder, std::string const& identity) {
+    fs::path vpd = fs::absolute(vpdFolder).lexically_normal();
+    if (!vpd.has_filename()) {
+        vpd = vpd.parent_path();
     }
-
-    static std::string consoleHost() {
-        char name[256] = {};
-        if (gethostname(name, sizeof name - 1) != 0) {
-            return "";
-        }
-        return name;
+    fs::path const trace = vpd.parent_path() / VPD::get_MachineTraceName(identity);
+    std::error_code error;
+    if (!fs::is_regular_file(trace, error)) {
+        return std::nullopt;
     }
+    return validUtf8(trace.string());
+}
 
-    fs::path _folder;
-    std::optional<long long> _oldest;
-    std::optional<long long> _newest;
-    std::optional<std::string> _signal;
-};
+MachineSummary machineSummary(fs::path const& vpdFolder, std::string const& identity,
+                              fs::path const& statusFile, MachineDocuments documents,
+                              RunTraces& traces) {
+    noteFileTime(statusFile, traces);
+    MachineSummary machine;
+    machine.identity = validUtf8(identity);
+    machine.statusFile = validUtf8(fs::absolute(statusFile).lexically_normal().string());
+    machine.traceFile = traceFileOf(vpdFolder, identity);
+    std::vector<StatusLine> const lines = readStatusLines(statusFile);
+    std::transform(
+        lines.begin(), lines.end(), std::back_inserter(machine.partitions),
+        [&](StatusLine const& line) { return partitionSummary(line, documents, traces); });
+    return machine;
+}
+
+std::string consoleHost() {
+    char name[256] = {};
+    if (gethostname(name, sizeof name - 1) != 0) {
+        return "";
+    }
+    return name;
+}
+
+// The run's facts that the files tell, or that a summary read from files
+// gives as unknown.
+void addRunFacts(RunSummary& run, RunTraces const& traces) {
+    run.tool = gc_ToolName;
+    run.consoleHost = validUtf8(consoleHost());
+    long long const started = traces.oldest.value_or(0);
+    long long const ended = traces.newest.value_or(0);
+    run.started = localTimeText(started);
+    run.ended = localTimeText(ended);
+    run.elapsedSeconds = ended - started;
+    run.interruptedBy = traces.interruptedBy;
+}
 
 } // namespace
 
-Json readSummaryFromFolder(std::string const& vpdFolder) {
-    return FolderScan(vpdFolder).summary();
+RunSummary readRunSummaryFromFolder(std::string const& vpdFolder) {
+    FolderFiles const files = listFolder(vpdFolder);
+    RunTraces traces;
+    auto documentsByMachine = readDocuments(files, traces);
+    RunSummary run;
+    for (auto const& [identity, path] : files.statusFiles) {
+        run.machines.push_back(
+            machineSummary(vpdFolder, identity, path,
+                           MachineDocuments(std::move(documentsByMachine[identity])), traces));
+        run.options.identities.push_back(validUtf8(identity));
+    }
+    addRunFacts(run, traces);
+    return run;
+}
+
+nlohmann::ordered_json readSummaryFromFolder(std::string const& vpdFolder) {
+    return summaryDocument(readRunSummaryFromFolder(vpdFolder));
 }
 
 } // namespace report

@@ -1,25 +1,31 @@
 #pragma once
 
+#include "report/RunSummary.h"
+
 #include <nlohmann/json.hpp>
 
 #include <string>
 
 namespace report {
 
-// The run summary (docs/summary.schema.json) of the survey runs whose files
-// lie in vpdFolder (the console's /var/adm/quorvex/VPD): runs of the
-// single-machine tool as well as of quorvex-survey.
+// The run summary of the survey runs whose files lie in vpdFolder (the
+// console's /var/adm/quorvex/VPD): runs of the single-machine tool as well
+// as of quorvex-survey.
 //
 // Each status file gives a machine and, line by line in listing order, each
 // partition's host, IP and status text. The rest comes from the VPD
 // documents named after the machine, matched to status lines by host name in
-// the order of their partition IDs: a default document gives the partition's
-// ID, the reason, Rc and RcCmd, and whether the time limit or a signal
-// stopped it; a fetched document gives the ID. What the files do not keep is
-// null: active statuses, seconds, the options of the run, and the ID and
-// document of a partition no document matches (an inactive one always).
-// Machines come in the order of their identities; the run's times are those
-// of the oldest and the newest file read.
+// the order of their partition IDs (see MachineDocuments): a default document
+// gives the partition's ID, the reason, Rc and RcCmd, and whether the time
+// limit or a signal stopped it; a fetched document gives the ID. What the
+// files do not keep is unknown: active statuses, seconds, the options of the
+// run, and the ID and document of a partition no document matches (an
+// inactive one always). Machines come in the order of their identities; the
+// run's times are those of the oldest and the newest file read. Texts are
+// made valid UTF-8.
+RunSummary readRunSummaryFromFolder(std::string const& vpdFolder);
+
+// The document of readRunSummaryFromFolder (docs/summary.schema.json).
 nlohmann::ordered_json readSummaryFromFolder(std::string const& vpdFolder);
 
 } // namespace report

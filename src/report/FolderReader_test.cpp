@@ -11,7 +11,7 @@ namespace {
 namespace fs = std::filesystem;
 using Json = nlohmann::ordered_json;
 
-constexpr char prefix[] = "quorvexPYLON_VPD_Survey_ClientPartition_";
+constexpr char gc_Prefix[] = "quorvexPYLON_VPD_Survey_ClientPartition_";
 
 std::string expectedVpd(std::string const& scenario) {
     return QuorvexTest::sourceRoot() + "/tests/e2e/scenarios/" + scenario + "/expected/VPD";
@@ -39,8 +39,8 @@ std::string fetchedDocument(std::string const& host) {
            "</Value>\n</Property>\n";
 }
 
-constexpr char channelReason[] = "Partition not surveyed, reason: \nRELAY Failed.\n\n"
-                                 "[     Rc] = 4294967295\n\n\n";
+constexpr char gc_ChannelReason[] = "Partition not surveyed, reason: \nRELAY Failed.\n\n"
+                                    "[     Rc] = 4294967295\n\n\n";
 
 TEST(FolderReader, RunWithEveryFailureKindGivesEachPartitionItsFacts) {
     QuorvexTest::TemporaryDirectory folder;
@@ -50,7 +50,8 @@ TEST(FolderReader, RunWithEveryFailureKindGivesEachPartitionItsFacts) {
     Json const& machine = summary["machines"][0];
     EXPECT_EQ("1234-ABC_10ABCDE", machine["identity"]);
     EXPECT_EQ("8", machine["return_code"]);
-    EXPECT_EQ(folder.file(std::string(prefix) + "1234-ABC_10ABCDE.status"), machine["status_file"]);
+    EXPECT_EQ(folder.file(std::string(gc_Prefix) + "1234-ABC_10ABCDE.status"),
+              machine["status_file"]);
     EXPECT_EQ(nullptr, machine["trace_file"]);
     Json const& partitions = machine["partitions"];
     ASSERT_EQ(4U, partitions.size());
@@ -128,7 +129,7 @@ TEST(FolderReader, MarkupInHostNamesIsCarriedAsWritten) {
 
 TEST(FolderReader, MachineWithoutActivePartitionsHasNoneListed) {
     QuorvexTest::TemporaryDirectory folder;
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1234-ABC_10ABCDE.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1234-ABC_10ABCDE.status"),
                            "No ACTIVE Partition Found.\n");
     Json const summary = report::readSummaryFromFolder(folder.path());
     Json const& machine = summary["machines"][0];
@@ -138,11 +139,11 @@ TEST(FolderReader, MachineWithoutActivePartitionsHasNoneListed) {
 
 TEST(FolderReader, TimeLimitLineMakesTheFailureTimedOut) {
     QuorvexTest::TemporaryDirectory folder;
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
                            "slow [10.0.0.1] - VPD Survey - RELAY Failed, rc = 4294967295\n");
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S-3.VPD.xml"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S-3.VPD.xml"),
                            defaultDocument("1-A-S", "3", "slow",
-                                           std::string(channelReason) +
+                                           std::string(gc_ChannelReason) +
                                                "Stopped by the time limit of 2 s after 2.0 s.\n"));
     Json const summary = report::readSummaryFromFolder(folder.path());
     Json const& partition = summary["machines"][0]["partitions"][0];
@@ -152,15 +153,39 @@ TEST(FolderReader, TimeLimitLineMakesTheFailureTimedOut) {
               partition["time_limit"].dump());
 }
 
+TEST(FolderReader, SummaryModelCarriesTheOutcomeAndTheStoppedAction) {
+    QuorvexTest::TemporaryDirectory folder;
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
+                           "slow [10.0.0.1] - VPD Survey - 2et result Failed, rc = \n");
+    QuorvexTest::writeFile(
+        folder.file(std::string(gc_Prefix) + "1-A_S-3.VPD.xml"),
+        defaultDocument("1-A-S", "3", "slow",
+                        "Unable to get File From Partition : \n\n[     Rc] = 2\n\n"
+                        "Stopped by the time limit of 5 s after 5.1 s.\n"));
+    report::RunSummary const run = report::readRunSummaryFromFolder(folder.path());
+    ASSERT_EQ(1U, run.machines.size());
+    ASSERT_EQ(1U, run.machines[0].partitions.size());
+    report::PartitionSummary const& partition = run.machines[0].partitions[0];
+    EXPECT_EQ(report::Outcome::TimedOut, partition.outcome);
+    EXPECT_EQ(std::optional<std::string>("3"), partition.id);
+    EXPECT_EQ(std::optional<long long>(2), partition.rc);
+    EXPECT_EQ(std::nullopt, partition.rcCmd);
+    ASSERT_TRUE(partition.stoppedAction.has_value());
+    EXPECT_EQ(report::RemoteAction::GetFile, partition.stoppedAction->action);
+    EXPECT_DOUBLE_EQ(5.1, partition.stoppedAction->afterSeconds);
+    EXPECT_EQ(std::nullopt, run.interruptedBy);
+    EXPECT_EQ("quorvex-survey report", run.tool);
+}
+
 TEST(FolderReader, InterruptedPartitionsWithAndWithoutDocument) {
     QuorvexTest::TemporaryDirectory folder;
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
                            "busy [10.0.0.1] - VPD Survey - Interrupted - not surveyed\n"
                            "later [10.0.0.2] - VPD Survey - Interrupted - not surveyed\n");
     QuorvexTest::writeFile(
-        folder.file(std::string(prefix) + "1-A_S-1.VPD.xml"),
+        folder.file(std::string(gc_Prefix) + "1-A_S-1.VPD.xml"),
         defaultDocument("1-A-S", "1", "busy",
-                        std::string(channelReason) + "Stopped by SIGINT after 0.7 s.\n"));
+                        std::string(gc_ChannelReason) + "Stopped by SIGINT after 0.7 s.\n"));
     Json const summary = report::readSummaryFromFolder(folder.path());
     Json const& partitions = summary["machines"][0]["partitions"];
     EXPECT_EQ("interrupted", partitions[0]["outcome"]);
@@ -174,12 +199,12 @@ TEST(FolderReader, InterruptedPartitionsWithAndWithoutDocument) {
 
 TEST(FolderReader, SameHostTwiceTakesDocumentsInIdOrder) {
     QuorvexTest::TemporaryDirectory folder;
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
                            "twin [10.0.0.1] - VPD Survey - RELAY Failed, rc = 4294967295\n"
                            "twin [10.0.0.2] - VPD Survey - RELAY Failed, rc = 4294967295\n");
     for (std::string const id : {"10", "9"}) {
-        QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S-" + id + ".VPD.xml"),
-                               defaultDocument("1-A-S", id, "twin", channelReason));
+        QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S-" + id + ".VPD.xml"),
+                               defaultDocument("1-A-S", id, "twin", gc_ChannelReason));
     }
     Json const summary = report::readSummaryFromFolder(folder.path());
     Json const& partitions = summary["machines"][0]["partitions"];
@@ -189,10 +214,10 @@ TEST(FolderReader, SameHostTwiceTakesDocumentsInIdOrder) {
 
 TEST(FolderReader, DocumentOfAnotherKindIsNotTaken) {
     QuorvexTest::TemporaryDirectory folder;
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
                            "aurora [10.0.0.1] - VPD Survey - Ok\n");
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S-1.VPD.xml"),
-                           defaultDocument("1-A-S", "1", "aurora", channelReason));
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S-1.VPD.xml"),
+                           defaultDocument("1-A-S", "1", "aurora", gc_ChannelReason));
     Json const summary = report::readSummaryFromFolder(folder.path());
     Json const& partition = summary["machines"][0]["partitions"][0];
     EXPECT_EQ("surveyed", partition["outcome"]);
@@ -202,11 +227,11 @@ TEST(FolderReader, DocumentOfAnotherKindIsNotTaken) {
 
 TEST(FolderReader, DocumentGoesToTheMachineWithTheLongestMatchingIdentity) {
     QuorvexTest::TemporaryDirectory folder;
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
                            "a [1] - VPD Survey - Ok\n");
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S-B.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S-B.status"),
                            "b [2] - VPD Survey - Ok\n");
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S-B-7.VPD.xml"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S-B-7.VPD.xml"),
                            fetchedDocument("b"));
     Json const summary = report::readSummaryFromFolder(folder.path());
     EXPECT_EQ("1-A_S", summary["machines"][0]["identity"]);
@@ -217,7 +242,7 @@ TEST(FolderReader, DocumentGoesToTheMachineWithTheLongestMatchingIdentity) {
 
 TEST(FolderReader, UnknownStatusTextIsListedAsAFailureOfItsDocumentsKind) {
     QuorvexTest::TemporaryDirectory folder;
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
                            "odd [1] - VPD Survey - something else\n");
     Json const summary = report::readSummaryFromFolder(folder.path());
     Json const& partition = summary["machines"][0]["partitions"][0];
@@ -228,7 +253,7 @@ TEST(FolderReader, UnknownStatusTextIsListedAsAFailureOfItsDocumentsKind) {
 
 TEST(FolderReader, HostWithSeparatorsSplitsAtTheLastOnes) {
     QuorvexTest::TemporaryDirectory folder;
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
                            "x [y] - VPD Survey - z [10.0.0.1] - VPD Survey - Ok\n");
     Json const summary = report::readSummaryFromFolder(folder.path());
     Json const& partition = summary["machines"][0]["partitions"][0];
@@ -239,14 +264,14 @@ TEST(FolderReader, HostWithSeparatorsSplitsAtTheLastOnes) {
 
 TEST(FolderReader, LinesThatAreNoStatusLinesAreSkipped) {
     QuorvexTest::TemporaryDirectory folder;
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
                            "garbage\n\na [1] - VPD Survey - Ok\n");
     EXPECT_EQ(1U, report::readSummaryFromFolder(folder.path())["machines"][0]["partitions"].size());
 }
 
 TEST(FolderReader, BytesThatAreNotUtf8BecomeReplacementCharacters) {
     QuorvexTest::TemporaryDirectory folder;
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "1-A_S.status"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
                            "h\xFFst [1] - VPD Survey - Ok\n");
     Json const summary = report::readSummaryFromFolder(folder.path());
     EXPECT_EQ("h\xEF\xBF\xBDst", summary["machines"][0]["partitions"][0]["host"]);
@@ -255,9 +280,9 @@ TEST(FolderReader, BytesThatAreNotUtf8BecomeReplacementCharacters) {
 TEST(FolderReader, OtherFilesAndOrphanDocumentsAreIgnored) {
     QuorvexTest::TemporaryDirectory folder;
     QuorvexTest::writeFile(folder.file("notes.txt"), "x");
-    QuorvexTest::writeFile(folder.file(std::string(prefix) + "9-Z_Q-1.VPD.xml"),
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "9-Z_Q-1.VPD.xml"),
                            fetchedDocument("z"));
-    fs::create_directory(folder.file(std::string(prefix) + "dir.status"));
+    fs::create_directory(folder.file(std::string(gc_Prefix) + "dir.status"));
     Json const summary = report::readSummaryFromFolder(folder.path());
     EXPECT_EQ(0U, summary["machines"].size());
     EXPECT_EQ("8", summary["return_code"]);
@@ -273,7 +298,7 @@ TEST(FolderReader, MissingFolderGivesAnEmptySummary) {
 TEST(FolderReader, MachinesComeInIdentityOrder) {
     QuorvexTest::TemporaryDirectory folder;
     for (std::string const identity : {"9-Z_1", "1-A_2", "5-M_3"}) {
-        QuorvexTest::writeFile(folder.file(std::string(prefix) + identity + ".status"),
+        QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + identity + ".status"),
                                "h [1] - VPD Survey - Ok\n");
     }
     Json const summary = report::readSummaryFromFolder(folder.path());
@@ -285,11 +310,11 @@ TEST(FolderReader, TraceOfTheMachineBesideTheVpdFolderIsNamed) {
     QuorvexTest::TemporaryDirectory root;
     fs::create_directories(root.file("VPD"));
     fs::create_directories(root.file("Trace"));
-    QuorvexTest::writeFile(root.file("VPD/" + std::string(prefix) + "1-A_S.status"),
+    QuorvexTest::writeFile(root.file("VPD/" + std::string(gc_Prefix) + "1-A_S.status"),
                            "h [1] - VPD Survey - Ok\n");
-    QuorvexTest::writeFile(root.file("Trace/" + std::string(prefix) + "1-A_S.Trace"), "t");
+    QuorvexTest::writeFile(root.file("Trace/" + std::string(gc_Prefix) + "1-A_S.Trace"), "t");
     Json const summary = report::readSummaryFromFolder(root.file("VPD"));
-    EXPECT_EQ(root.file("Trace/" + std::string(prefix) + "1-A_S.Trace"),
+    EXPECT_EQ(root.file("Trace/" + std::string(gc_Prefix) + "1-A_S.Trace"),
               summary["machines"][0]["trace_file"]);
 }
 

@@ -3,6 +3,7 @@
 #include "report/AtomicFile.h"
 #include "report/PartitionsCsv.h"
 #include "report/ReportPage.h"
+#include "report/RunSummary.h"
 
 #include <filesystem>
 #include <stdexcept>
@@ -23,10 +24,6 @@ std::string documentFolderFrom(std::string const& vpdFolder, std::string const& 
 }
 
 } // namespace
-
-std::string summaryText(nlohmann::ordered_json const& summary) {
-    return summary.dump(2, ' ', false, nlohmann::ordered_json::error_handler_t::replace) + "\n";
-}
 
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
                  std::string const& folder) {

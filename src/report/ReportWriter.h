@@ -14,8 +14,4 @@ namespace report {
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
                  std::string const& folder);
 
-// summary.json's text: the summary indented by two spaces, bytes that are
-// not UTF-8 replaced by U+FFFD, ending with a line end.
-std::string summaryText(nlohmann::ordered_json const& summary);
-
 } // namespace report

@@ -2,6 +2,7 @@
 
 #include "report/FolderReader.h"
 #include "report/PartitionsCsv.h"
+#include "report/RunSummary.h"
 
 #include "QuorvexTest.h"
 
@@ -42,11 +43,6 @@ TEST(ReportWriter, PageLinksDocumentsRelativeToTheReportFolder) {
     report::writeReport(summary, root.file("VPD"), root.file("out/report"));
     EXPECT_NE(std::string::npos, QuorvexTest::readFile(root.file("out/report/index.html"))
                                      .find("<a href=\"../../VPD/d.VPD.xml\">"));
-}
-
-TEST(ReportWriter, SummaryTextReplacesBytesThatAreNotUtf8) {
-    Json const summary = {{"console_host", "c\xFF"}};
-    EXPECT_EQ("{\n  \"console_host\": \"c\xEF\xBF\xBD\"\n}\n", report::summaryText(summary));
 }
 
 TEST(ReportWriter, FolderThatCannotBeMadeThrows) {

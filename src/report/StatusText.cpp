@@ -8,14 +8,13 @@ namespace report {
 
 namespace {
 
-constexpr char surveyedText[] = "Ok";
-constexpr char inactiveText[] = "Failed - Active Status < 3";
-constexpr char interruptedText[] = "Interrupted - not surveyed";
-constexpr char channelFailedPrefix[] = "RELAY Failed, rc = ";
-constexpr char clientFailedPrefix[] = "Partition Failed, RcCmd = ";
-constexpr char fetchFailedSeed[] = "get result Failed, rc = ";
+constexpr char gc_SurveyedText[] = "Ok";
+constexpr char gc_InactiveText[] = "Failed - Active Status < 3";
+constexpr char gc_ChannelFailedPrefix[] = "RELAY Failed, rc = ";
+constexpr char gc_ClientFailedPrefix[] = "Partition Failed, RcCmd = ";
+constexpr char gc_FetchFailedSeed[] = "get result Failed, rc = ";
 // The code is an unsigned 32-bit number: at most ten digits.
-constexpr std::size_t longestCode = 10;
+constexpr std::size_t gc_LongestCode = 10;
 
 bool isCodeAfter(std::string const& text, std::string const& prefix) {
     return startsWith(text, prefix) && isDigits(text.substr(prefix.size()));
@@ -23,8 +22,8 @@ bool isCodeAfter(std::string const& text, std::string const& prefix) {
 
 // A code of n digits followed by the seed's characters from n on.
 bool isFetchFailure(std::string const& text) {
-    std::string const seed = fetchFailedSeed;
-    std::size_t const digits = std::min(longestCode, text.size());
+    std::string const seed = gc_FetchFailedSeed;
+    std::size_t const digits = std::min(gc_LongestCode, text.size());
     for (std::size_t n = 1; n <= digits; ++n) {
         if (isDigits(text.substr(0, n)) && text.compare(n, std::string::npos, seed, n) == 0) {
             return true;
@@ -35,24 +34,24 @@ bool isFetchFailure(std::string const& text) {
 
 } // namespace
 
-std::optional<std::string> outcomeOfStatusText(std::string const& statusText) {
-    if (statusText == surveyedText) {
-        return "surveyed";
+std::optional<Outcome> outcomeOfStatusText(std::string const& statusText) {
+    if (statusText == gc_SurveyedText) {
+        return Outcome::Surveyed;
     }
-    if (statusText == inactiveText) {
-        return "inactive";
+    if (statusText == gc_InactiveText) {
+        return Outcome::Inactive;
     }
-    if (statusText == interruptedText) {
-        return "interrupted";
+    if (statusText == gc_InterruptedStatusText) {
+        return Outcome::Interrupted;
     }
-    if (isCodeAfter(statusText, channelFailedPrefix)) {
-        return "channel_failure";
+    if (isCodeAfter(statusText, gc_ChannelFailedPrefix)) {
+        return Outcome::ChannelFailure;
     }
-    if (isCodeAfter(statusText, clientFailedPrefix)) {
-        return "client_failure";
+    if (isCodeAfter(statusText, gc_ClientFailedPrefix)) {
+        return Outcome::ClientFailure;
     }
     if (isFetchFailure(statusText)) {
-        return "fetch_failure";
+        return Outcome::FetchFailure;
     }
     return std::nullopt;
 }

@@ -1,12 +1,17 @@
 #pragma once
 
+#include "report/Outcome.h"
+
 #include <optional>
 #include <string>
 
 namespace report {
 
-// The outcome a survey's status text stands for ("surveyed", "inactive",
-// "channel_failure", "client_failure", "fetch_failure", "interrupted"), or
+// The status text of a partition whose survey a signal to quorvex-survey
+// stopped or kept from starting; the survey itself never writes it.
+inline constexpr char gc_InterruptedStatusText[] = "Interrupted - not surveyed";
+
+// The outcome a survey's status text stands for (any but TimedOut), or
 // nothing for a text the survey never writes. A timed-out partition carries
 // the text of the failure it ended as; only its document's reason tells the
 // time limit apart (see FailureReason).
@@ -15,6 +20,6 @@ namespace report {
 // "Partition Failed, RcCmd = <n>" cover theirs whole, while a fetch failure
 // writes only its code over the first characters of
 // "get result Failed, rc = ", giving "2et result Failed, rc = ".
-std::optional<std::string> outcomeOfStatusText(std::string const& statusText);
+std::optional<Outcome> outcomeOfStatusText(std::string const& statusText);
 
 } // namespace report

@@ -4,28 +4,29 @@
 
 namespace {
 
+using report::Outcome;
 using report::outcomeOfStatusText;
 
 TEST(StatusText, FixedTextsOfSurveyedInactiveAndInterrupted) {
-    EXPECT_EQ("surveyed", outcomeOfStatusText("Ok"));
-    EXPECT_EQ("inactive", outcomeOfStatusText("Failed - Active Status < 3"));
-    EXPECT_EQ("interrupted", outcomeOfStatusText("Interrupted - not surveyed"));
+    EXPECT_EQ(Outcome::Surveyed, outcomeOfStatusText("Ok"));
+    EXPECT_EQ(Outcome::Inactive, outcomeOfStatusText("Failed - Active Status < 3"));
+    EXPECT_EQ(Outcome::Interrupted, outcomeOfStatusText("Interrupted - not surveyed"));
 }
 
 TEST(StatusText, ChannelFailureWithItsCode) {
-    EXPECT_EQ("channel_failure", outcomeOfStatusText("RELAY Failed, rc = 4"));
-    EXPECT_EQ("channel_failure", outcomeOfStatusText("RELAY Failed, rc = 4294967295"));
+    EXPECT_EQ(Outcome::ChannelFailure, outcomeOfStatusText("RELAY Failed, rc = 4"));
+    EXPECT_EQ(Outcome::ChannelFailure, outcomeOfStatusText("RELAY Failed, rc = 4294967295"));
 }
 
 TEST(StatusText, ClientFailureWithItsCode) {
-    EXPECT_EQ("client_failure", outcomeOfStatusText("Partition Failed, RcCmd = 9"));
+    EXPECT_EQ(Outcome::ClientFailure, outcomeOfStatusText("Partition Failed, RcCmd = 9"));
 }
 
 TEST(StatusText, FetchFailureCodeWrittenOverTheSeed) {
-    EXPECT_EQ("fetch_failure", outcomeOfStatusText("2et result Failed, rc = "));
-    EXPECT_EQ("fetch_failure", outcomeOfStatusText("0et result Failed, rc = "));
-    EXPECT_EQ("fetch_failure", outcomeOfStatusText("42t result Failed, rc = "));
-    EXPECT_EQ("fetch_failure", outcomeOfStatusText("4294967295 Failed, rc = "));
+    EXPECT_EQ(Outcome::FetchFailure, outcomeOfStatusText("2et result Failed, rc = "));
+    EXPECT_EQ(Outcome::FetchFailure, outcomeOfStatusText("0et result Failed, rc = "));
+    EXPECT_EQ(Outcome::FetchFailure, outcomeOfStatusText("42t result Failed, rc = "));
+    EXPECT_EQ(Outcome::FetchFailure, outcomeOfStatusText("4294967295 Failed, rc = "));
 }
 
 TEST(StatusText, FetchSeedWithoutCodeOrWithWrongRestIsNotRecognised) {

@@ -1,64 +1,66 @@
 #include "report/SummaryTotals.h"
 
-#include <numeric>
+#include "survey/calculate_ReturnCode.h"
+
+#include <algorithm>
+#include <iterator>
 
 namespace report {
 
-using Json = nlohmann::ordered_json;
-
 namespace {
 
-Json zeroCounts() {
-    Json counts;
-    counts["partitions"] = 0;
-    for (std::string const& outcome : outcomeNames()) {
-        counts[outcome] = 0;
-    }
-    return counts;
+void appendReturnCodes(std::vector<PartitionSummary> const& partitions,
+                       std::vector<std::string>& codes) {
+    std::transform(partitions.begin(), partitions.end(), std::back_inserter(codes),
+                   [](PartitionSummary const& partition) { return partition.returnCode; });
 }
 
 } // namespace
 
-std::vector<std::string> const& outcomeNames() {
-    static std::vector<std::string> const names = {
-        "surveyed",      "inactive",  "channel_failure", "client_failure",
-        "fetch_failure", "timed_out", "interrupted"};
-    return names;
+void OutcomeCounts::add(Outcome outcome) {
+    ++partitions;
+    ++byOutcome[static_cast<std::size_t>(outcome)];
 }
 
-Json countOutcomes(Json const& partitions) {
-    Json counts = zeroCounts();
-    for (Json const& partition : partitions) {
-        counts["partitions"] = counts["partitions"].get<long long>() + 1;
-        std::string const outcome = partition.value("outcome", "");
-        if (counts.contains(outcome) && outcome != "partitions") {
-            counts[outcome] = counts[outcome].get<long long>() + 1;
-        }
+void OutcomeCounts::add(OutcomeCounts const& counts) {
+    partitions += counts.partitions;
+    for (std::size_t i = 0; i < byOutcome.size(); ++i) {
+        byOutcome[i] += counts.byOutcome[i];
+    }
+}
+
+long long OutcomeCounts::of(Outcome outcome) const {
+    return byOutcome[static_cast<std::size_t>(outcome)];
+}
+
+OutcomeCounts countOutcomes(std::vector<PartitionSummary> const& partitions) {
+    OutcomeCounts counts;
+    for (PartitionSummary const& partition : partitions) {
+        counts.add(partition.outcome);
     }
     return counts;
 }
 
-Json totalCounts(Json const& machines) {
-    Json totals;
-    totals["machines"] = machines.size();
-    Json const zero = zeroCounts();
-    for (auto const& item : zero.items()) {
-        std::string const& name = item.key();
-        totals[name] =
-            std::accumulate(machines.begin(), machines.end(), item.value().get<long long>(),
-                            [&](long long sum, Json const& machine) {
-                                return sum + machine["counts"].value(name, 0LL);
-                            });
+OutcomeCounts totalCounts(std::vector<MachineSummary> const& machines) {
+    OutcomeCounts totals;
+    for (MachineSummary const& machine : machines) {
+        totals.add(countOutcomes(machine.partitions));
     }
     return totals;
 }
 
-std::string overallCode(Json const& counts) {
-    long long const surveyed = counts.value("surveyed", 0LL);
-    if (surveyed == 0) {
-        return "8";
+std::string overallCode(std::vector<PartitionSummary> const& partitions) {
+    std::vector<std::string> codes;
+    appendReturnCodes(partitions, codes);
+    return get_OverallCode(codes);
+}
+
+std::string overallCode(std::vector<MachineSummary> const& machines) {
+    std::vector<std::string> codes;
+    for (MachineSummary const& machine : machines) {
+        appendReturnCodes(machine.partitions, codes);
     }
-    return surveyed == counts.value("partitions", 0LL) ? "0" : "4";
+    return get_OverallCode(codes);
 }
 
 } // namespace report

@@ -1,24 +1,32 @@
 #pragma once
 
-#include <nlohmann/json.hpp>
+#include "report/Outcome.h"
+#include "report/RunSummary.h"
 
+#include <array>
 #include <string>
 #include <vector>
 
 namespace report {
 
-// The outcomes a partition can have, in the order the report shows them.
-std::vector<std::string> const& outcomeNames();
+// How many partitions a summary lists, and how many ended in each outcome.
+struct OutcomeCounts {
+    long long partitions = 0;
+    // In the order of the outcome table.
+    std::array<long long, gc_OutcomeCount> byOutcome{};
 
-// The counts object of a summary (partitions and one count per outcome) for
-// a machine's partitions.
-nlohmann::ordered_json countOutcomes(nlohmann::ordered_json const& partitions);
+    void add(Outcome outcome);
+    void add(OutcomeCounts const& counts);
+    long long of(Outcome outcome) const;
+};
 
-// The totals of a summary: the machines and the sum of their counts.
-nlohmann::ordered_json totalCounts(nlohmann::ordered_json const& machines);
+OutcomeCounts countOutcomes(std::vector<PartitionSummary> const& partitions);
+// The sum of the machines' counts.
+OutcomeCounts totalCounts(std::vector<MachineSummary> const& machines);
 
-// The survey's overall code for counts: "0" all surveyed, "4" some, "8" none
-// or none listed.
-std::string overallCode(nlohmann::ordered_json const& counts);
+// The survey's overall code of the partitions' codes ("0" all surveyed, "4"
+// some, "8" none or none listed): of one machine, and of a whole run.
+std::string overallCode(std::vector<PartitionSummary> const& partitions);
+std::string overallCode(std::vector<MachineSummary> const& machines);
 
 } // namespace report

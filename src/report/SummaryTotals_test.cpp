@@ -7,49 +7,62 @@
 
 namespace {
 
-using Json = nlohmann::ordered_json;
+using report::MachineSummary;
+using report::Outcome;
+using report::PartitionSummary;
 
-Json partitions(std::vector<std::string> const& outcomes) {
-    Json list = Json::array();
-    std::transform(outcomes.begin(), outcomes.end(), std::back_inserter(list),
-                   [](std::string const& outcome) {
-                       return Json{{"outcome", outcome}};
-                   });
+// Partitions of the outcomes, each with the survey's code of its outcome.
+std::vector<PartitionSummary> partitions(std::vector<Outcome> const& outcomes) {
+    std::vector<PartitionSummary> list;
+    std::transform(outcomes.begin(), outcomes.end(), std::back_inserter(list), [](Outcome outcome) {
+        PartitionSummary partition;
+        partition.outcome = outcome;
+        partition.returnCode = outcome == Outcome::Surveyed ? "0" : "8";
+        return partition;
+    });
     return list;
 }
 
-TEST(SummaryTotals, CountsEveryOutcomeAndThePartitions) {
-    Json const counts =
-        report::countOutcomes(partitions({"surveyed", "surveyed", "timed_out", "inactive"}));
-    EXPECT_EQ(R"({"partitions":4,"surveyed":2,"inactive":1,"channel_failure":0,"client_failure":0,)"
-              R"("fetch_failure":0,"timed_out":1,"interrupted":0})",
-              counts.dump());
+MachineSummary machine(std::vector<Outcome> const& outcomes) {
+    MachineSummary summary;
+    summary.partitions = partitions(outcomes);
+    return summary;
 }
 
-TEST(SummaryTotals, UnknownOutcomeCountsAsPartitionOnly) {
-    Json const counts = report::countOutcomes(partitions({"partitions", "odd"}));
-    EXPECT_EQ(2, counts["partitions"]);
-    EXPECT_EQ(0, counts["surveyed"]);
+TEST(SummaryTotals, CountsEveryOutcomeAndThePartitions) {
+    report::OutcomeCounts const counts = report::countOutcomes(
+        partitions({Outcome::Surveyed, Outcome::Surveyed, Outcome::TimedOut, Outcome::Inactive}));
+    EXPECT_EQ(4, counts.partitions);
+    EXPECT_EQ(2, counts.of(Outcome::Surveyed));
+    EXPECT_EQ(1, counts.of(Outcome::TimedOut));
+    EXPECT_EQ(1, counts.of(Outcome::Inactive));
+    EXPECT_EQ(0, counts.of(Outcome::ChannelFailure));
+    EXPECT_EQ(0, counts.of(Outcome::Interrupted));
 }
 
 TEST(SummaryTotals, TotalsAddTheMachinesCounts) {
-    Json machines = Json::array();
-    machines.push_back({{"counts", report::countOutcomes(partitions({"surveyed"}))}});
-    machines.push_back(
-        {{"counts", report::countOutcomes(partitions({"surveyed", "interrupted"}))}});
-    Json const totals = report::totalCounts(machines);
-    EXPECT_EQ(2, totals["machines"]);
-    EXPECT_EQ(3, totals["partitions"]);
-    EXPECT_EQ(2, totals["surveyed"]);
-    EXPECT_EQ(1, totals["interrupted"]);
+    report::OutcomeCounts const totals =
+        report::totalCounts({machine({Outcome::Surveyed}),
+                             machine({Outcome::Surveyed, Outcome::Interrupted}), machine({})});
+    EXPECT_EQ(3, totals.partitions);
+    EXPECT_EQ(2, totals.of(Outcome::Surveyed));
+    EXPECT_EQ(1, totals.of(Outcome::Interrupted));
+    EXPECT_EQ(0, totals.of(Outcome::FetchFailure));
 }
 
-TEST(SummaryTotals, OverallCodeAllSomeNoneAndNoneListed) {
-    EXPECT_EQ("0", report::overallCode(report::countOutcomes(partitions({"surveyed"}))));
-    EXPECT_EQ("4",
-              report::overallCode(report::countOutcomes(partitions({"surveyed", "inactive"}))));
-    EXPECT_EQ("8", report::overallCode(report::countOutcomes(partitions({"inactive"}))));
-    EXPECT_EQ("8", report::overallCode(report::countOutcomes(partitions({}))));
+TEST(SummaryTotals, MachineCodeIsZeroAllFourSomeEightNoneOrNoneListed) {
+    EXPECT_EQ("0", report::overallCode(partitions({Outcome::Surveyed})));
+    EXPECT_EQ("4", report::overallCode(partitions({Outcome::Surveyed, Outcome::Inactive})));
+    EXPECT_EQ("8", report::overallCode(partitions({Outcome::Inactive})));
+    EXPECT_EQ("8", report::overallCode(partitions({})));
+}
+
+TEST(SummaryTotals, RunCodeTakesEveryMachinesPartitionsTogether) {
+    EXPECT_EQ("4", report::overallCode(std::vector<MachineSummary>{
+                       machine({Outcome::Surveyed}), machine({Outcome::ChannelFailure})}));
+    EXPECT_EQ("0", report::overallCode(
+                       std::vector<MachineSummary>{machine({Outcome::Surveyed}), machine({})}));
+    EXPECT_EQ("8", report::overallCode(std::vector<MachineSummary>{}));
 }
 
 } // namespace

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <optional>
 #include <string>
 
 namespace Quorvex::PYLON::VPD {
@@ -20,15 +21,29 @@ std::string get_TraceFileName();
 // identity before its suffix.
 std::string get_MachineTraceFileName(std::string const& machineIdentity);
 
+// The same trace relative to the console folder (Trace/...), so that a reader
+// of a copy of the console's folders finds it beside the copy's VPD folder.
+std::string get_MachineTraceName(std::string const& machineIdentity);
+
 // The status file of the machine named on the command line, the identity
 // taken as given.
 std::string get_StatusFileName(std::string const& machineIdentity);
+
+// The machine identity of a status file's name as a folder lists it (without
+// the folder): the reverse of get_StatusFileName. Nothing for a name that
+// get_StatusFileName does not build.
+std::optional<std::string> get_IdentityOfStatusFileName(std::string const& fileName);
 
 // The name of a partition's VPD document on the console, relative to the
 // folder that get_LocalResultPath resolves it against; partitionText is the
 // partition's identity text (machine identity, "-", partition ID). It is
 // what standard output shows and what the console's get-file action gets.
 std::string get_LocalResultName(std::string const& partitionText);
+
+// The partition text of a local result's name as a folder lists it (without
+// the folder): the reverse of get_LocalResultName. Nothing for a name that
+// get_LocalResultName does not build.
+std::optional<std::string> get_PartitionTextOfResultName(std::string const& fileName);
 
 // The absolute path of a local result name.
 std::string get_LocalResultPath(std::string const& localResultName);

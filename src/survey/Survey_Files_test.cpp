@@ -41,3 +41,53 @@ TEST(Survey_Files, PartitionSideNamesAreThePartitionTextWithTheirSuffixes) {
     EXPECT_EQ(VPD::get_RemoteResultName("1234-ABC_10ABCDE-3"), "1234-ABC_10ABCDE-3.VPD.xml");
     EXPECT_EQ(VPD::get_ClientOutputName("1234-ABC_10ABCDE-3"), "1234-ABC_10ABCDE-3.QuorvexOutput");
 }
+
+TEST(Survey_Files, MachineTraceNameIsTheMachineTraceRelativeToTheConsoleFolder) {
+    EXPECT_EQ(VPD::get_MachineTraceName("1234-ABC_10ABCDE"),
+              "Trace/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE.Trace");
+    EXPECT_EQ("/var/adm/quorvex/" + VPD::get_MachineTraceName("1234-ABC_10ABCDE"),
+              VPD::get_MachineTraceFileName("1234-ABC_10ABCDE"));
+}
+
+namespace {
+
+// The name as a folder listing gives it: the part after the last "/".
+std::string u_listed_Name(std::string const& path) {
+    return path.substr(path.rfind('/') + 1);
+}
+
+} // namespace
+
+TEST(Survey_Files, IdentityOfAStatusFileNameIsTheIdentityItWasBuiltFrom) {
+    for (std::string const identity : {"1234-ABC_10ABCDE", "a b;c", "", "x.status"}) {
+        EXPECT_EQ(
+            VPD::get_IdentityOfStatusFileName(u_listed_Name(VPD::get_StatusFileName(identity))),
+            identity);
+    }
+}
+
+TEST(Survey_Files, NamesThatNoStatusFileHasGiveNoIdentity) {
+    for (std::string const name :
+         {"notes.txt", "quorvexPYLON_VPD_Survey_ClientPartition_1-A_S.VPD.xml",
+          "quorvexPYLON_VPD_Survey_ClientPartition.status", "other_1-A_S.status",
+          "quorvexPYLON_VPD_Survey_ClientPartition_1-A_S.status.tmp",
+          "/var/adm/quorvex/VPD/quorvexPYLON_VPD_Survey_ClientPartition_1-A_S.status"}) {
+        EXPECT_EQ(VPD::get_IdentityOfStatusFileName(name), std::nullopt) << name;
+    }
+}
+
+TEST(Survey_Files, PartitionTextOfAResultNameIsThePartitionTextItWasBuiltFrom) {
+    for (std::string const text : {"1234-ABC_10ABCDE-3", "a b;c-x", "-"}) {
+        EXPECT_EQ(VPD::get_PartitionTextOfResultName(u_listed_Name(VPD::get_LocalResultName(text))),
+                  text);
+    }
+}
+
+TEST(Survey_Files, NamesThatNoResultHasGiveNoPartitionText) {
+    for (std::string const name :
+         {"notes.txt", "quorvexPYLON_VPD_Survey_ClientPartition_1-A_S.status",
+          "1234-ABC_10ABCDE-3.VPD.xml", "quorvexPYLON_VPD_Survey_ClientPartition_1-A_S-1.VPD.xml~",
+          "VPD/quorvexPYLON_VPD_Survey_ClientPartition_1-A_S-1.VPD.xml"}) {
+        EXPECT_EQ(VPD::get_PartitionTextOfResultName(name), std::nullopt) << name;
+    }
+}
