@@ -68,6 +68,10 @@ def fail(status, message):
     sys.exit(status)
 
 
+def last_error():
+    return os.strerror(ctypes.get_errno())
+
+
 def instruction(code, k, jump_true=0, jump_false=0):
     return struct.pack("HBBI", code, jump_true, jump_false, k)
 
@@ -94,25 +98,28 @@ def filter_program(architecture, calls):
 def install_filter():
     machine = platform.machine()
     if machine not in ARCHITECTURES:
+        known = ", ".join(sorted(ARCHITECTURES))
         fail(EXIT_SETUP_FAILED,
-             "unsupported machine " + machine + " (known: " +
-             ", ".join(sorted(ARCHITECTURES)) + "); use a private mount namespace")
+             f"unsupported machine {machine} (known: {known});"
+             " use a private mount namespace")
     program = filter_program(*ARCHITECTURES[machine])
     code = ctypes.create_string_buffer(b"".join(program))
     fprog = SockFprog(len(program), ctypes.cast(code, ctypes.c_void_p))
     libc = ctypes.CDLL(None, use_errno=True)
     if libc.prctl(PR_SET_NO_NEW_PRIVS, 1, 0, 0, 0) != 0:
         fail(EXIT_SETUP_FAILED,
-             "prctl(PR_SET_NO_NEW_PRIVS): " + os.strerror(ctypes.get_errno()))
-    if libc.prctl(PR_SET_SECCOMP, SECCOMP_MODE_FILTER, ctypes.byref(fprog), 0, 0) != 0:
+             "prctl(PR_SET_NO_NEW_PRIVS): " + last_error())
+    if libc.prctl(PR_SET_SECCOMP, SECCOMP_MODE_FILTER, ctypes.byref(fprog),
+                  0, 0) != 0:
         fail(EXIT_SETUP_FAILED,
-             "installing the seccomp filter: " + os.strerror(ctypes.get_errno()))
+             "installing the seccomp filter: " + last_error())
 
 
 def main(arguments):
     if not arguments:
-        sys.stderr.write("sandbox-seccomp.py: no command given\n"
-                         "sandbox-seccomp.py: try 'tools/sandbox-seccomp.py --help'\n")
+        sys.stderr.write(
+            "sandbox-seccomp.py: no command given\n"
+            "sandbox-seccomp.py: try 'tools/sandbox-seccomp.py --help'\n")
         return EXIT_USAGE
     if arguments[0] in ("-h", "--help"):
         sys.stdout.write(USAGE)
@@ -121,7 +128,8 @@ def main(arguments):
     try:
         os.execvp(arguments[0], arguments)
     except OSError as error:
-        fail(EXIT_SETUP_FAILED, "cannot start " + arguments[0] + ": " + error.strerror)
+        fail(EXIT_SETUP_FAILED,
+             "cannot start " + arguments[0] + ": " + error.strerror)
     return EXIT_SETUP_FAILED
 
 
