@@ -438,7 +438,7 @@ TEST(SimulatedConsole, DemoScenarioAnswersASurveyOfItsMachine) {
 TEST(SimulatedConsole, SeveralMachinesScenarioListsObjectTypesZeroAndTwo) {
     SimulatedConsole console(
         QuorvexTest::ScenarioFile{QuorvexTest::shippedScenario("several-machines.scn")});
-    EXPECT_EQ("0:9119-MHE_21ABCDE;2:7063-CR2_06HMC01;0:8286-42A_10XYZ99;\n",
+    EXPECT_EQ("0:9119-MHE_21ABCDE;2:7063-CR2_06QRV01;0:8286-42A_10XYZ99;\n",
               runShell("/opt/lsvtc/bin/lsvtc -t0").stdoutText);
     EXPECT_EQ("1,10.40.50.61,3,gemini,Linux,5.14;3,10.40.50.63,2,hydra,Zeph,7.1;\n",
               runShell("/opt/vtc/bin/lspartition -ix -c 8286-42A_10XYZ99").stdoutText);

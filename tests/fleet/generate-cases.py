@@ -126,7 +126,7 @@ def fetch_section(rng, partition_id):
 
 def machines_listing(machines, rng):
     entries = [f"0:{m}" for m in machines]
-    entries.insert(rng.randrange(len(entries) + 1), "2:7063-CR2_06HMC01")
+    entries.insert(rng.randrange(len(entries) + 1), "2:7063-CR2_06QRV01")
     return ["[lsvtc]", "stdout " + ";".join(entries) + ";"]
 
 

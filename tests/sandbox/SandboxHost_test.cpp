@@ -86,6 +86,18 @@ private:
     QuorvexTest::TemporaryDirectory _folder;
 };
 
+// The proot sandbox's seccomp helper, which lies beside tools/sandbox.
+std::string _seccompHelperPath() {
+    return QuorvexTest::sourceRoot() + "/tools/sandbox-seccomp.py";
+}
+
+// A path under /opt whose folders the host does not have: the name of a
+// fresh temporary folder makes it unique.
+std::string _pathMissingOnTheHost(QuorvexTest::TemporaryDirectory const& unique,
+                                  std::string const& rest) {
+    return "/opt/" + std::filesystem::path(unique.path()).filename().string() + rest;
+}
+
 bool _startsWith(std::string const& text, std::string const& head) {
     return text.rfind(head, 0) == 0;
 }
@@ -315,8 +327,8 @@ TEST(SandboxHost, ProotRefusesTmpSizeWithItsReason) {
 }
 
 // A checkout in a folder only its owner may enter (a home folder) is out of
-// the unprivileged user's reach: the sandbox and the simulator are copied
-// into a folder that user may read.
+// the unprivileged user's reach: the sandbox, its seccomp helper and the
+// simulator are copied into a folder that user may read.
 TEST(SandboxHost, UnprivilegedCallerGetsASandboxEvenFromAPrivateCheckout) {
     if (::geteuid() != 0 || !fileExists("/usr/bin/setpriv")) {
         GTEST_SKIP() << "needs root and setpriv to become an unprivileged user";
@@ -326,6 +338,7 @@ TEST(SandboxHost, UnprivilegedCallerGetsASandboxEvenFromAPrivateCheckout) {
     std::string const sandbox = readable.file("sandbox");
     std::string const simulator = readable.file("pylon-sim");
     std::filesystem::copy_file(QuorvexTest::sandboxPath(), sandbox);
+    std::filesystem::copy_file(_seccompHelperPath(), readable.file("sandbox-seccomp.py"));
     std::filesystem::copy_file(QuorvexTest::simulatorPath(), simulator);
     _makeExecutable(sandbox);
     _makeExecutable(simulator);
@@ -379,4 +392,132 @@ TEST(SandboxHost, HelpDocumentsEveryOption) {
           "QUORVEX_SANDBOX_FAIL_MOUNT=PATH", "QUORVEX_SANDBOX_KIND"}) {
         EXPECT_NE(std::string::npos, run.stdoutText.find(option)) << option;
     }
+}
+
+// sim/README.md shows the simulated console answering at its real path with
+// this command line, run from the checkout's root: the tool's folder exists
+// only inside the sandbox, and the simulator is named by a relative path.
+TEST(SandboxHost, SimulatorReadmeExamplePrintsTheDemoListing) {
+    std::string const simulator =
+        std::filesystem::relative(QuorvexTest::simulatorPath(), QuorvexTest::sourceRoot()).string();
+    CommandResult const run = runCommand(
+        {"/usr/bin/env", "-C", QuorvexTest::sourceRoot(),
+         "PYLON_SIM_SCENARIO=" + QuorvexTest::shippedScenario("demo.scn"), "tools/sandbox", "--sim",
+         simulator, "--", "/opt/vtc/bin/lspartition", "-ix", "-c", "9119-MHE_21ABCDE"});
+    if (run.exitStatus == gc_ExitSkip) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ("1,10.20.30.41,3,aurora,Zeph,7.2;2,10.20.30.42,3,boreas,Zeph,7.3;"
+              "3,10.20.30.43,1,cirrus,Zeph,7.1;4,10.20.30.44,3,delta,Zeph,7.2;"
+              "5,10.20.30.45,3,eos,Linux,5.14;6,10.20.30.46,3,fjord,Zeph,7.3;"
+              "7,10.20.30.47,3,,Zeph,7.2;\n",
+              run.stdoutText);
+    EXPECT_EQ("", run.stderrText);
+}
+
+TEST(SandboxHost, CommandInAFolderThatOnlyTheSandboxHasRuns) {
+    QuorvexTest::TemporaryDirectory folder;
+    QuorvexTest::writeFile(folder.file("hello"), "#!/bin/sh\necho hello\n");
+    _makeExecutable(folder.file("hello"));
+    std::string const inside = _pathMissingOnTheHost(folder, "/bin/hello");
+    CommandResult const run =
+        runInSandbox({"--bind", folder.file("hello") + ":" + inside}, {inside});
+    if (run.exitStatus == gc_ExitSkip) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ("hello\n", run.stdoutText);
+    EXPECT_FALSE(fileExists(_pathMissingOnTheHost(folder, "")));
+}
+
+TEST(SandboxHost, MissingSimulatorIsNamedInTheMessage) {
+    CommandResult const run = _sandbox({"--sim", "/nonexistent/pylon-sim", "--", "true"});
+    EXPECT_EQ(gc_ExitUsage, run.exitStatus);
+    EXPECT_EQ("sandbox: simulator '/nonexistent/pylon-sim' is not an executable file\n"
+              "sandbox: try 'tools/sandbox --help'\n",
+              run.stderrText);
+}
+
+TEST(SandboxHost, CommandMissingInTheNamespaceGives127AndSaysSo) {
+    QuorvexTest::TemporaryDirectory unique;
+    std::string const missing = _pathMissingOnTheHost(unique, "/bin/missing");
+    CommandResult const run = _sandboxWith({"QUORVEX_SANDBOX=namespace"}, {"--", missing});
+    if (run.exitStatus == gc_ExitSkip) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(127, run.exitStatus);
+    EXPECT_EQ("sandbox: command not found in the sandbox: " + missing + "\n", run.stderrText);
+}
+
+TEST(SandboxHost, CommandMissingUnderProotFailsNamingIt) {
+    QuorvexTest::TemporaryDirectory unique;
+    std::string const missing = _pathMissingOnTheHost(unique, "/bin/missing");
+    CommandResult const run = _sandboxWith({"QUORVEX_SANDBOX=proot"}, {"--", missing});
+    if (run.exitStatus == gc_ExitSkip) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_NE(0, run.exitStatus);
+    EXPECT_NE(std::string::npos, run.stderrText.find(missing)) << run.stderrText;
+}
+
+TEST(SandboxHost, MissingSeccompHelperUnderProotFailsNamingIt) {
+    QuorvexTest::TemporaryDirectory folder;
+    std::string const sandbox = folder.file("sandbox");
+    std::filesystem::copy_file(QuorvexTest::sandboxPath(), sandbox);
+    _makeExecutable(sandbox);
+    CommandResult const run =
+        runCommand({"/usr/bin/env", "QUORVEX_SANDBOX=proot", sandbox, "--", "true"});
+    if (run.exitStatus == gc_ExitSkip) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
+    EXPECT_EQ("sandbox: the proot sandbox needs " + folder.file("sandbox-seccomp.py") +
+                  ", which is missing: keep sandbox-seccomp.py in the folder of tools/sandbox\n",
+              run.stderrText);
+}
+
+// A step of the script that fails where no check of its own names it would
+// otherwise end the run silently under set -e: here dirname, replaced by one
+// that fails, is the first step.
+TEST(SandboxHost, StepThatFailsUnexpectedlyIsNamedInTheMessage) {
+    QuorvexTest::TemporaryDirectory folder;
+    QuorvexTest::writeFile(folder.file("dirname"), "#!/bin/sh\nexit 3\n");
+    _makeExecutable(folder.file("dirname"));
+    char const* path = std::getenv("PATH");
+    CommandResult const run = runCommand(
+        {"/usr/bin/env", "PATH=" + folder.path() + ":" + (path != nullptr ? path : "/usr/bin:/bin"),
+         QuorvexTest::sandboxPath(), "--", "true"});
+    EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
+    EXPECT_TRUE(_startsWith(
+        run.stderrText, "sandbox: 'dirname -- \"$0\"' failed with status 3 (tools/sandbox, line "))
+        << run.stderrText;
+    EXPECT_TRUE(
+        _endsWith(run.stderrText, "run 'bash -x tools/sandbox ...' to see the step that failed\n"))
+        << run.stderrText;
+}
+
+TEST(SandboxHost, SeccompHelperAnswersHelpAndRefusesAMissingCommand) {
+    CommandResult const help = runCommand({_seccompHelperPath(), "--help"});
+    EXPECT_EQ(0, help.exitStatus);
+    EXPECT_TRUE(_startsWith(help.stdoutText, "Usage: tools/sandbox-seccomp.py COMMAND [ARGS...]\n"))
+        << help.stdoutText;
+    CommandResult const bare = runCommand({_seccompHelperPath()});
+    EXPECT_EQ(gc_ExitUsage, bare.exitStatus);
+    EXPECT_EQ("sandbox-seccomp.py: no command given\n"
+              "sandbox-seccomp.py: try 'tools/sandbox-seccomp.py --help'\n",
+              bare.stderrText);
+}
+
+TEST(SandboxHost, SeccompHelperRefusesStatxWithEnosys) {
+    CommandResult const run = runCommand(
+        {_seccompHelperPath(), "python3", "-c",
+         "import ctypes, os\n"
+         "libc = ctypes.CDLL(None, use_errno=True)\n"
+         "buffer = ctypes.create_string_buffer(256)\n"
+         "result = libc.syscall(332 if os.uname().machine == 'x86_64' else 291, -100, b'/', 0, 0,"
+         " buffer)\n"
+         "print(result, os.strerror(ctypes.get_errno()))\n"});
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ("-1 Function not implemented\n", run.stdoutText);
 }
