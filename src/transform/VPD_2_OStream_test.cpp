@@ -184,7 +184,7 @@ TEST(Transform_VPD_2_OStream, ResourcesNestedThreeLevelsDeep) {
     port.insert_Property(Property("LO", "P1-C1-T1"));
     Resource card = u_leaf("card1");
     card.insert_Resource("Ports", port);
-    Resource partition = u_leaf("lpar1");
+    Resource partition = u_leaf("part1");
     partition.insert_Resource("Adapters", card);
     Resource machine = u_leaf("m");
     machine.insert_Resource("Partitions", partition);
@@ -194,8 +194,8 @@ TEST(Transform_VPD_2_OStream, ResourcesNestedThreeLevelsDeep) {
       <Resource displayName="m" uniqueId="m">
          m
          <ResourceList displayName="Partitions">
-            <Resource displayName="lpar1" uniqueId="lpar1">
-               lpar1
+            <Resource displayName="part1" uniqueId="part1">
+               part1
                <ResourceList displayName="Adapters">
                   <Resource displayName="card1" uniqueId="card1">
                      card1

@@ -29,12 +29,12 @@ Resource u_resource(std::string const& id, std::vector<Property> const& properti
     return resource;
 }
 
-// machine > Partitions > lpar1 > Adapters > card1 > Ports > port1
+// machine > Partitions > part1 > Adapters > card1 > Ports > port1
 Resource u_threeLevelTree() {
     Resource port = u_resource("port1", {Property("LO", "P1-C1-T1")});
     Resource card = u_resource("card1", {Property("FN", "00E1234")});
     card.insert_Resource("Ports", port);
-    Resource partition = u_resource("lpar1", {Property("HN", "host1")});
+    Resource partition = u_resource("part1", {Property("HN", "host1")});
     partition.insert_Resource("Adapters", card);
     Resource machine = u_resource("machine", {Property("TM", "1234-ABC")});
     machine.insert_Resource("Partitions", partition);
@@ -42,7 +42,7 @@ Resource u_threeLevelTree() {
 }
 
 std::string const gc_ThreeLevelTree = "(name-machine|machine|){TM=1234-ABC;}[Partitions/Partitions:"
-                                      "(name-lpar1|lpar1|){HN=host1;}[Adapters/Adapters:"
+                                      "(name-part1|part1|){HN=host1;}[Adapters/Adapters:"
                                       "(name-card1|card1|){FN=00E1234;}[Ports/Ports:"
                                       "(name-port1|port1|){LO=P1-C1-T1;}]]]";
 
@@ -129,12 +129,12 @@ TEST(VPD_Resource, MergeJoinsNestedTreesRecursively) {
     Resource port2 = u_resource("port2", {});
     Resource card = u_resource("card1", {Property("FN", "other"), Property("SN", "Y1")});
     card.insert_Resource("Ports", port2);
-    Resource partition = u_resource("lpar1", {Property("HN", "other")});
+    Resource partition = u_resource("part1", {Property("HN", "other")});
     partition.insert_Resource("Adapters", card);
     partition.insert_Resource("Disks", u_resource("disk1", {}));
     Resource other = u_resource("machine", {Property("SE", "10ABCDE")});
     other.insert_Resource("Partitions", partition);
-    other.insert_Resource("Partitions", u_resource("lpar2", {}));
+    other.insert_Resource("Partitions", u_resource("part2", {}));
     other.insert_Resource("Enclosures", u_resource("enc1", {}));
 
     machine += other;
@@ -142,11 +142,11 @@ TEST(VPD_Resource, MergeJoinsNestedTreesRecursively) {
               "(name-machine|machine|){SE=10ABCDE;TM=1234-ABC;}"
               "[Enclosures/Enclosures:(name-enc1|enc1|){}]"
               "[Partitions/Partitions:"
-              "(name-lpar1|lpar1|){HN=host1;}"
+              "(name-part1|part1|){HN=host1;}"
               "[Adapters/Adapters:(name-card1|card1|){FN=00E1234;SN=Y1;}"
               "[Ports/Ports:(name-port1|port1|){LO=P1-C1-T1;}(name-port2|port2|){}]]"
               "[Disks/Disks:(name-disk1|disk1|){}]"
-              "(name-lpar2|lpar2|){}]");
+              "(name-part2|part2|){}]");
 }
 
 TEST(VPD_Resource, MergeJoinsPropertyGroupsOfTheSameName) {
@@ -174,7 +174,7 @@ TEST(VPD_Resource, CopiedResourceNestedListsAreIndependent) {
     Resource const source = u_threeLevelTree();
     Resource copy(source);
     Resource& partition =
-        copy.get_ListOf_ResourceLists().find_orCreate("Partitions").find_orCreate("lpar1");
+        copy.get_ListOf_ResourceLists().find_orCreate("Partitions").find_orCreate("part1");
     Resource& card =
         partition.get_ListOf_ResourceLists().find_orCreate("Adapters").find_orCreate("card1");
     card.insert_Resource("Ports", Resource("port2", "port2"));
@@ -191,7 +191,7 @@ TEST(VPD_Resource, ChangingTheSourceLeavesTheCopyUnchanged) {
     Resource const copy(source);
     source.get_ListOf_ResourceLists()
         .find_orCreate("Partitions")
-        .find_orCreate("lpar1")
+        .find_orCreate("part1")
         .insert_Resource("Adapters", Resource("card2", "card2"));
     EXPECT_EQ(resourceText(copy), gc_ThreeLevelTree);
 }
@@ -204,7 +204,7 @@ TEST(VPD_Resource, AssignedResourceIsADeepIndependentCopy) {
     EXPECT_EQ(resourceText(target), gc_ThreeLevelTree);
     target.get_ListOf_ResourceLists()
         .find_orCreate("Partitions")
-        .find_orCreate("lpar1")
+        .find_orCreate("part1")
         .insert_Property(Property("OS", "changed"));
     EXPECT_EQ(resourceText(source), gc_ThreeLevelTree);
 }
@@ -218,8 +218,8 @@ TEST(VPD_Resource, SelfAssignmentKeepsTheTree) {
 
 TEST(VPD_Resource, AssigningANestedResourceToItsOwnAncestorIsSafe) {
     Resource machine = u_threeLevelTree();
-    machine = machine.get_ListOf_ResourceLists().find("Partitions").find("lpar1");
-    EXPECT_EQ(resourceText(machine), "(name-lpar1|lpar1|){HN=host1;}[Adapters/Adapters:"
+    machine = machine.get_ListOf_ResourceLists().find("Partitions").find("part1");
+    EXPECT_EQ(resourceText(machine), "(name-part1|part1|){HN=host1;}[Adapters/Adapters:"
                                      "(name-card1|card1|){FN=00E1234;}[Ports/Ports:"
                                      "(name-port1|port1|){LO=P1-C1-T1;}]]");
 }
