@@ -138,11 +138,14 @@ TEST(Transform_VPD_Resource_2_XML_Element, ListsComePartitionsEnclosuresThenOthe
 
 TEST(Transform_VPD_Resource_2_XML_Element, ListDisplayNameIsWrittenNotItsKey) {
     Resource resource("m", "");
-    resource.get_ListOf_ResourceLists().find_orCreate("Partitions").set_DisplayName("Partitions");
-    EXPECT_EQ(u_resourceText(resource), "<Resource displayName=\"m\">\n"
-                                        "   m\n"
-                                        "   <ResourceList displayName=\"Partitions\"></ResourceList>\n"
-                                        "</Resource>");
+    resource.get_ListOf_ResourceLists()
+        .find_orCreate("Partitions")
+        .set_DisplayName("Client partitions");
+    EXPECT_EQ(u_resourceText(resource),
+              "<Resource displayName=\"m\">\n"
+              "   m\n"
+              "   <ResourceList displayName=\"Client partitions\"></ResourceList>\n"
+              "</Resource>");
 }
 
 } // namespace
