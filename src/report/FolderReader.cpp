@@ -1,18 +1,19 @@
 #include "report/FolderReader.h"
 
 #include "report/FailureReason.h"
-#include "report/LocalTime.h"
 #include "report/StatusText.h"
 #include "report/SummaryTotals.h"
-#include "report/TextChecks.h"
-#include "report/TextSafety.h"
 #include "report/VpdDocument.h"
 #include "survey/Survey_Files.h"
+#include "utility/FileText.h"
+#include "utility/LocalTime.h"
+#include "utility/SystemError.h"
+#include "utility/TextChecks.h"
+#include "utility/TextSafety.h"
 
 #include <algorithm>
 #include <chrono>
 #include <filesystem>
-#include <fstream>
 #include <iterator>
 #include <map>
 #include <sstream>
@@ -21,6 +22,12 @@
 #include <vector>
 
 namespace report {
+
+using util::endsWith;
+using util::isDigits;
+using util::localTimeText;
+using util::startsWith;
+using util::validUtf8;
 
 namespace fs = std::filesystem;
 using Json = nlohmann::ordered_json;
@@ -64,11 +71,14 @@ struct StatusLine {
     std::string statusText;
 };
 
+// A file that is gone or unreadable since the folder was listed reads as
+// empty: a run may still be writing there, and the rest is still reported.
 std::string readText(fs::path const& path) {
-    std::ifstream file(path, std::ios::binary);
-    std::ostringstream text;
-    text << file.rdbuf();
-    return text.str();
+    try {
+        return util::readWholeFile(path.string());
+    } catch (util::SystemError const&) {
+        return "";
+    }
 }
 
 // "<host> [<ip>] - VPD Survey - <status>": the host may hold anything, the

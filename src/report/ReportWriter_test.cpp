@@ -2,13 +2,14 @@
 
 #include "report/FolderReader.h"
 #include "report/PartitionsCsv.h"
+#include "utility/SystemError.h"
 
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
+#include <cerrno>
 #include <filesystem>
-#include <stdexcept>
 
 namespace {
 
@@ -49,11 +50,17 @@ TEST(ReportWriter, SummaryTextReplacesBytesThatAreNotUtf8) {
     EXPECT_EQ("{\n  \"console_host\": \"c\xEF\xBF\xBD\"\n}\n", report::summaryText(summary));
 }
 
-TEST(ReportWriter, FolderThatCannotBeMadeThrows) {
+TEST(ReportWriter, FolderUnderARegularFileThrowsCreateWithThePathAndEnotdir) {
     QuorvexTest::TemporaryDirectory root;
     QuorvexTest::writeFile(root.file("file"), "x");
-    EXPECT_THROW(report::writeReport(Json::object(), root.path(), root.file("file/report")),
-                 std::runtime_error);
+    std::string const folder = root.file("file/report");
+    try {
+        report::writeReport(Json::object(), root.path(), folder);
+        FAIL() << "no exception";
+    } catch (util::SystemError const& error) {
+        EXPECT_EQ(ENOTDIR, error.errorNumber());
+        EXPECT_EQ("cannot create " + folder + ": Not a directory", std::string(error.what()));
+    }
 }
 
 } // namespace
