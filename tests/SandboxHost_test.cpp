@@ -2,6 +2,7 @@
 // leaves behind (nothing) and how it reports its own failures.
 
 #include "QuorvexTest.h"
+#include "utility/TextChecks.h"
 
 #include <gtest/gtest.h>
 
@@ -85,15 +86,6 @@ public:
 private:
     QuorvexTest::TemporaryDirectory _folder;
 };
-
-bool _startsWith(std::string const& text, std::string const& head) {
-    return text.rfind(head, 0) == 0;
-}
-
-bool _endsWith(std::string const& text, std::string const& tail) {
-    return text.size() >= tail.size() &&
-           text.compare(text.size() - tail.size(), tail.size(), tail) == 0;
-}
 
 } // namespace
 
@@ -252,11 +244,11 @@ TEST(SandboxHost, InducedBindFailureUnderProotFailsNamingTheBindAndLeavesNothing
     }
     EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
     EXPECT_TRUE(
-        _startsWith(run.stderrText, "sandbox: setting up the proot sandbox failed: proot -b " +
-                                        scratchBase.path() + "/quorvex-sandbox."))
+        util::startsWith(run.stderrText, "sandbox: setting up the proot sandbox failed: proot -b " +
+                                             scratchBase.path() + "/quorvex-sandbox."))
         << run.stderrText;
-    EXPECT_TRUE(_endsWith(run.stderrText, "/quorvex:/var/adm/quorvex: failure induced by "
-                                          "QUORVEX_SANDBOX_FAIL_MOUNT\n"))
+    EXPECT_TRUE(util::endsWith(run.stderrText, "/quorvex:/var/adm/quorvex: failure induced by "
+                                               "QUORVEX_SANDBOX_FAIL_MOUNT\n"))
         << run.stderrText;
     EXPECT_EQ("", QuorvexTest::runShell("ls -A '" + scratchBase.path() + "'").stdoutText);
 }

@@ -54,13 +54,11 @@ TEST(ReportWriter, FolderUnderARegularFileThrowsCreateWithThePathAndEnotdir) {
     QuorvexTest::TemporaryDirectory root;
     QuorvexTest::writeFile(root.file("file"), "x");
     std::string const folder = root.file("file/report");
-    try {
-        report::writeReport(Json::object(), root.path(), folder);
-        FAIL() << "no exception";
-    } catch (util::SystemError const& error) {
-        EXPECT_EQ(ENOTDIR, error.errorNumber());
-        EXPECT_EQ("cannot create " + folder + ": Not a directory", std::string(error.what()));
-    }
+    auto const error = QuorvexTest::thrownBy<util::SystemError>(
+        [&] { report::writeReport(Json::object(), root.path(), folder); });
+    ASSERT_TRUE(error);
+    EXPECT_EQ(ENOTDIR, error->errorNumber());
+    EXPECT_EQ("cannot create " + folder + ": Not a directory", std::string(error->what()));
 }
 
 } // namespace

@@ -10,6 +10,7 @@
 #include <csignal>
 #include <cstdio>
 #include <filesystem>
+#include <optional>
 #include <sys/resource.h>
 #include <sys/stat.h>
 
@@ -61,26 +62,21 @@ TEST(AtomicFile, FileHasTheModeOfAnyNewFileUnderTheUmask) {
     EXPECT_EQ("664", modeUnderUmask(002));
 }
 
-// The failure writeFileAtomically reports for path; a default error when it
-// writes.
-util::SystemError failureWriting(std::string const& path) {
-    try {
-        util::writeFileAtomically(path, "x");
-    } catch (util::SystemError const& error) {
-        return error;
-    }
-    ADD_FAILURE() << "no exception writing " << path;
-    return util::SystemError("", "", 0);
+// What writeFileAtomically throws for path, if anything.
+std::optional<util::SystemError> failureWriting(std::string const& path) {
+    return QuorvexTest::thrownBy<util::SystemError>(
+        [&path] { util::writeFileAtomically(path, "x"); });
 }
 
 TEST(AtomicFile, MissingFolderThrowsWriteWithThePathAndEnoent) {
     QuorvexTest::TemporaryDirectory folder;
     std::string const path = folder.file("missing/out");
-    util::SystemError const error = failureWriting(path);
-    EXPECT_EQ("write", error.operation());
-    EXPECT_EQ(path, error.object());
-    EXPECT_EQ(ENOENT, error.errorNumber());
-    EXPECT_EQ("cannot write " + path + ": No such file or directory", std::string(error.what()));
+    auto const error = failureWriting(path);
+    ASSERT_TRUE(error);
+    EXPECT_EQ("write", error->operation());
+    EXPECT_EQ(path, error->object());
+    EXPECT_EQ(ENOENT, error->errorNumber());
+    EXPECT_EQ("cannot write " + path + ": No such file or directory", std::string(error->what()));
 }
 
 // Root bypasses a read-only folder, but not a regular file in the folder's place.
@@ -88,26 +84,29 @@ TEST(AtomicFile, RegularFileAsFolderThrowsEnotdirWithTheExactMessage) {
     QuorvexTest::TemporaryDirectory folder;
     QuorvexTest::writeFile(folder.file("plain"), "");
     std::string const path = folder.file("plain/out");
-    util::SystemError const error = failureWriting(path);
-    EXPECT_EQ(ENOTDIR, error.errorNumber());
-    EXPECT_EQ("cannot write " + path + ": Not a directory", std::string(error.what()));
+    auto const error = failureWriting(path);
+    ASSERT_TRUE(error);
+    EXPECT_EQ(ENOTDIR, error->errorNumber());
+    EXPECT_EQ("cannot write " + path + ": Not a directory", std::string(error->what()));
     EXPECT_EQ(1U, entriesIn(folder.path()));
 }
 
 TEST(AtomicFile, NameTooLongThrowsEnametoolong) {
     QuorvexTest::TemporaryDirectory folder;
     std::string const path = folder.file(std::string(300, 'n'));
-    util::SystemError const error = failureWriting(path);
-    EXPECT_EQ(ENAMETOOLONG, error.errorNumber());
-    EXPECT_EQ("cannot write " + path + ": File name too long", std::string(error.what()));
+    auto const error = failureWriting(path);
+    ASSERT_TRUE(error);
+    EXPECT_EQ(ENAMETOOLONG, error->errorNumber());
+    EXPECT_EQ("cannot write " + path + ": File name too long", std::string(error->what()));
     EXPECT_EQ(0U, entriesIn(folder.path()));
 }
 
 TEST(AtomicFile, FolderInTheWayOfTheFileThrowsEisdirAndLeavesNoTemporaryFile) {
     QuorvexTest::TemporaryDirectory folder;
     fs::create_directories(folder.file("out/inside"));
-    util::SystemError const error = failureWriting(folder.file("out"));
-    EXPECT_EQ(EISDIR, error.errorNumber());
+    auto const error = failureWriting(folder.file("out"));
+    ASSERT_TRUE(error);
+    EXPECT_EQ(EISDIR, error->errorNumber());
     EXPECT_EQ(1U, entriesIn(folder.path()));
 }
 
@@ -122,9 +121,10 @@ TEST(AtomicFile, FailedWriteThrowsItsErrnoAndRemovesTheTemporaryFile) {
         std::signal(SIGXFSZ, SIG_IGN);
         rlimit const limit{0, 0};
         ::setrlimit(RLIMIT_FSIZE, &limit);
-        util::SystemError const error = failureWriting(path);
-        bool const exact = std::string(error.what()) == "cannot write " + path + ": File too large";
-        return exact ? error.errorNumber() : 1;
+        auto const error = failureWriting(path);
+        bool const exact =
+            error && std::string(error->what()) == "cannot write " + path + ": File too large";
+        return exact ? error->errorNumber() : 1;
     });
     EXPECT_EQ(EFBIG, result.exitStatus);
     EXPECT_EQ(0U, entriesIn(folder.path()));

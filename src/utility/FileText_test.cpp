@@ -8,20 +8,15 @@
 
 #include <cerrno>
 #include <fcntl.h>
+#include <optional>
 #include <thread>
 #include <unistd.h>
 
 namespace {
 
-// The errno text readWholeFile reports for path.
-util::SystemError failureReading(std::string const& path) {
-    try {
-        util::readWholeFile(path);
-    } catch (util::SystemError const& error) {
-        return error;
-    }
-    ADD_FAILURE() << "no exception reading " << path;
-    return util::SystemError("", "", 0);
+// What readWholeFile throws for path, if anything.
+std::optional<util::SystemError> failureReading(std::string const& path) {
+    return QuorvexTest::thrownBy<util::SystemError>([&path] { util::readWholeFile(path); });
 }
 
 TEST(FileText, WriteAllDeliversMoreThanAPipeHoldsAtOnce) {
@@ -78,19 +73,21 @@ TEST(FileText, ReadWholeFileReadsProcFilesWhoseSizeIsUnknown) {
 TEST(FileText, ReadingAMissingFileThrowsReadWithThePathAndEnoent) {
     QuorvexTest::TemporaryDirectory folder;
     std::string const path = folder.file("missing");
-    util::SystemError const error = failureReading(path);
-    EXPECT_EQ("read", error.operation());
-    EXPECT_EQ(path, error.object());
-    EXPECT_EQ(ENOENT, error.errorNumber());
-    EXPECT_EQ("cannot read " + path + ": No such file or directory", std::string(error.what()));
+    auto const error = failureReading(path);
+    ASSERT_TRUE(error);
+    EXPECT_EQ("read", error->operation());
+    EXPECT_EQ(path, error->object());
+    EXPECT_EQ(ENOENT, error->errorNumber());
+    EXPECT_EQ("cannot read " + path + ": No such file or directory", std::string(error->what()));
 }
 
 // A folder opens for reading; the read itself fails.
 TEST(FileText, ReadingAFolderThrowsTheErrnoOfTheRead) {
     QuorvexTest::TemporaryDirectory folder;
-    util::SystemError const error = failureReading(folder.path());
-    EXPECT_EQ(EISDIR, error.errorNumber());
-    EXPECT_EQ("cannot read " + folder.path() + ": Is a directory", std::string(error.what()));
+    auto const error = failureReading(folder.path());
+    ASSERT_TRUE(error);
+    EXPECT_EQ(EISDIR, error->errorNumber());
+    EXPECT_EQ("cannot read " + folder.path() + ": Is a directory", std::string(error->what()));
 }
 
 } // namespace

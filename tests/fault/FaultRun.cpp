@@ -6,7 +6,6 @@
 #include <cstdlib>
 #include <ctime>
 #include <filesystem>
-#include <sstream>
 
 namespace {
 
@@ -32,15 +31,6 @@ constexpr char gc_CommandTail[] = "\n\"$@\" 3>&- 4>&-\n"
 
 bool u_contains(std::vector<std::string> const& texts, std::string const& text) {
     return std::find(texts.begin(), texts.end(), text) != texts.end();
-}
-
-std::vector<std::string> u_lines(std::string const& text) {
-    std::vector<std::string> lines;
-    std::istringstream stream(text);
-    for (std::string line; std::getline(stream, line);) {
-        lines.push_back(line);
-    }
-    return lines;
 }
 
 void u_skip(std::string const& reason) {
@@ -152,7 +142,8 @@ std::vector<std::string> FaultRun::quorvexFolders() const {
 }
 
 long FaultRun::peakMemoryKiB() const {
-    std::vector<std::string> const lines = u_lines(QuorvexTest::readFile(file(gc_PeakMemory)));
+    std::vector<std::string> const lines =
+        QuorvexTest::linesOf(QuorvexTest::readFile(file(gc_PeakMemory)));
     return lines.empty() ? -1 : std::stol(lines.back());
 }
 
@@ -219,6 +210,7 @@ std::string FaultRun::_toolPath() const {
 }
 
 std::vector<std::string> FaultRun::_readListing(std::string const& name) const {
-    return QuorvexTest::fileExists(file(name)) ? u_lines(QuorvexTest::readFile(file(name)))
-                                               : std::vector<std::string>{};
+    return QuorvexTest::fileExists(file(name))
+               ? QuorvexTest::linesOf(QuorvexTest::readFile(file(name)))
+               : std::vector<std::string>{};
 }
