@@ -22,7 +22,6 @@ using QuorvexTest::runInSandbox;
 
 namespace {
 
-constexpr int gc_ExitSkip = 77;
 constexpr int gc_ExitSetupFailed = 120;
 constexpr int gc_ExitUsage = 125;
 
@@ -112,7 +111,7 @@ TEST(SandboxHost, NothingAppearsOnTheHost) {
         runInSandbox({}, {"sh", "-c",
                           "touch /var/adm/quorvex/VPD/x /var/adm/quorvex/Trace/y /opt/vtc/bin/z && "
                           "/usr/bin/runact-api -c x >/dev/null; /opt/lsvtc/bin/lsvtc -t0"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     ASSERT_EQ(0, run.exitStatus) << run.stderrText;
@@ -164,7 +163,7 @@ TEST(SandboxHost, TmpInsideIsNotTheHostTmp) {
     CommandResult const run =
         runInSandbox({}, {"sh", "-c", R"(test ! -e "$0" && mkdir "$1" && touch "$1/file")",
                           hostFolder.path(), insideName});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(0, run.exitStatus) << run.stderrText;
@@ -176,7 +175,7 @@ TEST(SandboxHost, NoScratchFolderIsMadeOnTheHost) {
     CommandResult const run = runCommand(
         {"/usr/bin/env", "TMPDIR=" + scratchBase.path(), QuorvexTest::sandboxPath(), "--sim",
          QuorvexTest::simulatorPath(), "--", "sh", "-c", "ls -A /tmp /dev/shm"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     std::string expected = "/dev/shm:\n\n/tmp:\n";
@@ -189,7 +188,7 @@ TEST(SandboxHost, NoScratchFolderIsMadeOnTheHost) {
 
 TEST(SandboxHost, NoNamespaceToolGivesSkipStatusWithReason) {
     CommandResult const run = _sandboxWithEmptyPath("namespace");
-    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ(QuorvexTest::gc_SandboxUnavailable, run.exitStatus);
     EXPECT_EQ(
         "sandbox: cannot make a private mount namespace: the unshare command is not installed\n",
         run.stderrText);
@@ -197,7 +196,7 @@ TEST(SandboxHost, NoNamespaceToolGivesSkipStatusWithReason) {
 
 TEST(SandboxHost, NeitherNamespaceNorProotGivesSkipStatusNamingWhatToInstall) {
     CommandResult const run = _sandboxWithEmptyPath("");
-    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ(QuorvexTest::gc_SandboxUnavailable, run.exitStatus);
     EXPECT_EQ(std::string("sandbox: cannot make a private mount namespace: the unshare command is "
                           "not installed; cannot use proot either: proot is not installed; ") +
                   gc_Remedy + "\n",
@@ -206,7 +205,7 @@ TEST(SandboxHost, NeitherNamespaceNorProotGivesSkipStatusNamingWhatToInstall) {
 
 TEST(SandboxHost, ForcedProotWithoutProotGivesSkipStatusNamingWhatToInstall) {
     CommandResult const run = _sandboxWithEmptyPath("proot");
-    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ(QuorvexTest::gc_SandboxUnavailable, run.exitStatus);
     EXPECT_EQ(std::string("sandbox: cannot use proot: proot is not installed; ") + gc_Remedy + "\n",
               run.stderrText);
 }
@@ -223,7 +222,7 @@ TEST(SandboxHost, InducedMountFailureInTheNamespaceFailsNamingTheMount) {
     CommandResult const run =
         _sandboxWith({"QUORVEX_SANDBOX=namespace", "QUORVEX_SANDBOX_FAIL_MOUNT=/var/adm/quorvex"},
                      {"--", "true"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
@@ -239,7 +238,7 @@ TEST(SandboxHost, InducedBindFailureUnderProotFailsNamingTheBindAndLeavesNothing
         _sandboxWith({"QUORVEX_SANDBOX=proot", "QUORVEX_SANDBOX_FAIL_MOUNT=/var/adm/quorvex",
                       "TMPDIR=" + scratchBase.path()},
                      {"--", "true"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
@@ -261,7 +260,7 @@ TEST(SandboxHost, InducedMountFailureFailsASandboxedTestInsteadOfSkippingIt) {
             runCommand({"/usr/bin/env", std::string("QUORVEX_SANDBOX=") + kind,
                         "QUORVEX_SANDBOX_FAIL_MOUNT=/var/adm/quorvex", QUORVEX_SANDBOXED_TEST,
                         "--gtest_filter=Sandbox.TestMainRunsTestsInsideTheSandbox"});
-        if (run.exitStatus == gc_ExitSkip) {
+        if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
             GTEST_SKIP() << run.stderrText;
         }
         EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus) << kind;
@@ -283,7 +282,7 @@ TEST(SandboxHost, WithoutNamespaceProotShowsTheConsoleAtTheFixedPaths) {
     CommandResult const run = _sandboxWith(
         {noNamespace.path(), "QUORVEX_SANDBOX="},
         {"--bind", console.directory() + ":" + console.directory(), "--", "sh", "-c", commandLine});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(0, run.exitStatus) << run.stderrText;
@@ -300,7 +299,7 @@ TEST(SandboxHost, WithoutNamespaceProotShowsTheConsoleAtTheFixedPaths) {
 TEST(SandboxHost, ProotRefusesTmpSizeWithItsReason) {
     CommandResult const run =
         _sandboxWith({"QUORVEX_SANDBOX=proot"}, {"--tmp-size", "16k", "--", "true"});
-    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ(QuorvexTest::gc_SandboxUnavailable, run.exitStatus);
     EXPECT_EQ("sandbox: --tmp-size needs a private mount namespace, which cannot be made here: "
               "proot cannot limit the size of /tmp\n",
               run.stderrText);
@@ -325,7 +324,7 @@ TEST(SandboxHost, UnprivilegedCallerGetsASandboxEvenFromAPrivateCheckout) {
         runCommand({"/usr/bin/setpriv", "--reuid=65534", "--regid=65534", "--clear-groups",
                     "/usr/bin/env", "-C", "/", sandbox, "--sim", simulator, "--", "sh", "-c",
                     "test -d /var/adm/quorvex/VPD && test -x /usr/bin/runact-api"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(0, run.exitStatus) << run.stderrText;

@@ -40,7 +40,7 @@ void u_skip(std::string const& reason) {
 } // namespace
 
 bool FaultRun::ranInSandbox(QuorvexTest::CommandResult const& result) {
-    if (result.exitStatus != gc_SandboxUnavailable) {
+    if (result.exitStatus != QuorvexTest::gc_SandboxUnavailable) {
         return true;
     }
     u_skip(result.stderrText);
