@@ -3,6 +3,7 @@
 // anything else (no build, no package installation, no sandbox).
 
 #include "QuorvexTest.h"
+#include "utility/TextChecks.h"
 
 #include <gtest/gtest.h>
 
@@ -38,10 +39,6 @@ std::vector<Script> const& _scripts() {
 
 CommandResult _run(Script const& script, std::string const& argument) {
     return runCommand({QuorvexTest::sourceRoot() + "/" + script.path, argument});
-}
-
-bool _startsWith(std::string const& text, std::string const& head) {
-    return text.rfind(head, 0) == 0;
 }
 
 // A folder, put first in PATH, whose cmake does nothing and whose ctest
@@ -87,7 +84,7 @@ TEST(Scripts, HelpPrintsTheUsageAndSucceeds) {
         for (char const* option : {"--help", "-h"}) {
             CommandResult const run = _run(script, option);
             EXPECT_EQ(0, run.exitStatus) << script.path << " " << option;
-            EXPECT_TRUE(_startsWith(run.stdoutText, script.usage))
+            EXPECT_TRUE(util::startsWith(run.stdoutText, script.usage))
                 << script.path << " " << option << ":\n"
                 << run.stdoutText;
             EXPECT_EQ("", run.stderrText) << script.path << " " << option;
@@ -114,7 +111,7 @@ TEST(Scripts, DemoHelpIsNotTakenForAScenarioFile) {
 TEST(Scripts, TestHelpIsNotHandedToCmake) {
     CommandResult const run = runCommand({QuorvexTest::sourceRoot() + "/tools/test", "--help"});
     EXPECT_EQ(0, run.exitStatus);
-    EXPECT_TRUE(_startsWith(run.stdoutText, "Usage: tools/test [PRESET]\n")) << run.stdoutText;
+    EXPECT_TRUE(util::startsWith(run.stdoutText, "Usage: tools/test [PRESET]\n")) << run.stdoutText;
     EXPECT_EQ(std::string::npos, run.stdoutText.find("Preset CMake variables")) << run.stdoutText;
 }
 

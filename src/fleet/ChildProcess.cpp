@@ -1,6 +1,7 @@
 #include "fleet/ChildProcess.h"
 
 #include "fleet/ProcessTree.h"
+#include "utility/FileText.h"
 
 #include <fcntl.h>
 #include <sys/mman.h>
@@ -20,20 +21,6 @@ namespace Fleet {
 ChildProcess::Slot* ChildProcess::ms_ownSlot = nullptr;
 
 namespace {
-
-void writeAll(int descriptor, std::string const& text) {
-    std::size_t written = 0;
-    while (written < text.size()) {
-        ssize_t const n = write(descriptor, text.data() + written, text.size() - written);
-        if (n < 0 && errno == EINTR) {
-            continue;
-        }
-        if (n <= 0) {
-            return;
-        }
-        written += static_cast<std::size_t>(n);
-    }
-}
 
 // The child starts with the signal dispositions a plain program has.
 void restoreDefaultSignals() {
@@ -80,8 +67,9 @@ void ChildProcess::_runChild(Body const& body, int writeEnd) {
     setpgid(0, 0);
     prctl(PR_SET_CHILD_SUBREAPER, 1);
     ms_ownSlot = _slot;
+    bool delivered = false;
     try {
-        writeAll(writeEnd, body());
+        delivered = util::writeAll(writeEnd, body());
     } catch (...) {
         _exit(1);
     }
@@ -89,7 +77,8 @@ void ChildProcess::_runChild(Body const& body, int writeEnd) {
     // Adopted orphans of a stopped action are reaped before the child goes.
     while (waitpid(-1, nullptr, WNOHANG) > 0) {
     }
-    _exit(0);
+    // The parent reads a result cut short as it is; the status says so.
+    _exit(delivered ? 0 : 1);
 }
 
 ChildProcess::~ChildProcess() {

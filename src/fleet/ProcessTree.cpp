@@ -1,6 +1,8 @@
 #include "fleet/ProcessTree.h"
 
-#include <fcntl.h>
+#include "utility/FileText.h"
+#include "utility/SystemError.h"
+
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -21,27 +23,14 @@ namespace {
 constexpr int gc_KillRounds = 1000;
 constexpr auto gc_PauseBetweenRounds = std::chrono::milliseconds(1);
 
-// Read with plain read(): a /proc file of a process that ends while it is read
-// fails with an error, which then only ends the text.
-std::string readWholeFile(std::string const& path) {
-    std::string text;
-    int const descriptor = open(path.c_str(), O_RDONLY | O_CLOEXEC);
-    if (descriptor < 0) {
-        return text;
+// A /proc file of a process that has ended, or ends while it is read, reads
+// as empty: the process then has no children, command line or age to report.
+std::string readProcFile(std::string const& path) {
+    try {
+        return util::readWholeFile(path);
+    } catch (util::SystemError const&) {
+        return "";
     }
-    char buffer[4096];
-    while (true) {
-        ssize_t const n = read(descriptor, buffer, sizeof buffer);
-        if (n < 0 && errno == EINTR) {
-            continue;
-        }
-        if (n <= 0) {
-            break;
-        }
-        text.append(buffer, static_cast<std::size_t>(n));
-    }
-    close(descriptor);
-    return text;
 }
 
 std::string procPath(pid_t pid, char const* name) {
@@ -69,7 +58,7 @@ double ProcessTree::secondsSinceBoot() {
 std::vector<pid_t> ProcessTree::childrenOf(pid_t pid) {
     std::vector<pid_t> children;
     for (auto const& thread : threadsOf(pid)) {
-        std::istringstream list(readWholeFile(procPath(pid, "task/") + thread + "/children"));
+        std::istringstream list(readProcFile(procPath(pid, "task/") + thread + "/children"));
         pid_t child = 0;
         while (list >> child) {
             children.push_back(child);
@@ -88,13 +77,13 @@ std::vector<pid_t> ProcessTree::descendantsOf(pid_t pid) {
 }
 
 std::string ProcessTree::commandLineOf(pid_t pid) {
-    std::string text = readWholeFile(procPath(pid, "cmdline"));
+    std::string text = readProcFile(procPath(pid, "cmdline"));
     std::replace(text.begin(), text.end(), '\0', ' ');
     return text;
 }
 
 std::optional<std::string> ProcessTree::_statFields(pid_t pid) {
-    std::string const stat = readWholeFile(procPath(pid, "stat"));
+    std::string const stat = readProcFile(procPath(pid, "stat"));
     // The command name in parentheses may hold blanks and parentheses itself.
     std::size_t const end = stat.rfind(')');
     if (end == std::string::npos || end + 2 > stat.size()) {

@@ -1,7 +1,8 @@
 #include "fleet/RunFiles.h"
 
-#include "report/AtomicFile.h"
 #include "survey/Survey_Files.h"
+#include "utility/AtomicFile.h"
+#include "utility/SystemError.h"
 
 #include <unistd.h>
 
@@ -35,9 +36,9 @@ std::string RunFiles::tracePiece(std::string const& identity, std::size_t slot) 
 
 bool RunFiles::writeAtomically(std::string const& path, std::string const& text) {
     try {
-        report::writeFileAtomically(path, text);
+        util::writeFileAtomically(path, text);
         return true;
-    } catch (std::runtime_error const&) {
+    } catch (util::SystemError const&) {
         return false;
     }
 }

@@ -1,7 +1,7 @@
 #include "fleet/Summary.h"
 
 #include "QuorvexTest.h"
-#include "report/LocalTime.h"
+#include "utility/LocalTime.h"
 
 #include <gtest/gtest.h>
 
@@ -70,8 +70,8 @@ RunFacts facts() {
     RunFacts run;
     run.options.identities = {"9119-MHE_21ABCDE", "8286-42A_10XYZ99"};
     run.consoleHost = "console";
-    run.started = report::localTimeText(0);
-    run.ended = report::localTimeText(60);
+    run.started = util::localTimeText(0);
+    run.ended = util::localTimeText(60);
     run.elapsedSeconds = 60;
     run.interruptedBy = "SIGINT";
     run.exitStatus = 130;

@@ -6,9 +6,9 @@
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
 #include "fleet/WorkUnits.h"
-#include "report/LocalTime.h"
 #include "report/ReportCommand.h"
 #include "report/RunSummary.h"
+#include "utility/LocalTime.h"
 #include "utility/Trace.h"
 
 #include <poll.h>
@@ -89,8 +89,8 @@ int main(int argc, char** argv) {
         facts.options = options;
         // Every unit of work has ended: the host name command may trace here.
         facts.consoleHost = Utility::get_HostName();
-        facts.started = report::localTimeText(started);
-        facts.ended = report::localTimeText(std::time(nullptr));
+        facts.started = util::localTimeText(started);
+        facts.ended = util::localTimeText(std::time(nullptr));
         facts.elapsedSeconds =
             std::chrono::duration<double>(std::chrono::steady_clock::now() - startedAt).count();
         if (run.interruptingSignal() != 0) {

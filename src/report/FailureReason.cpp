@@ -1,10 +1,12 @@
 #include "report/FailureReason.h"
 
-#include "report/TextChecks.h"
+#include "utility/TextChecks.h"
 
 #include <regex>
 
 namespace report {
+
+using util::startsWith;
 
 namespace {
 

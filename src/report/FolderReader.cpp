@@ -1,26 +1,33 @@
 #include "report/FolderReader.h"
 
 #include "report/FailureReason.h"
-#include "report/LocalTime.h"
 #include "report/MachineDocuments.h"
 #include "report/StatusText.h"
-#include "report/TextChecks.h"
-#include "report/TextSafety.h"
 #include "report/VpdDocument.h"
 #include "survey/Survey_Files.h"
+#include "utility/FileText.h"
+#include "utility/LocalTime.h"
+#include "utility/SystemError.h"
+#include "utility/TextChecks.h"
+#include "utility/TextSafety.h"
 
 #include <unistd.h>
 
 #include <algorithm>
 #include <chrono>
 #include <filesystem>
-#include <fstream>
 #include <iterator>
 #include <map>
 #include <sstream>
 #include <vector>
 
 namespace report {
+
+using util::endsWith;
+using util::isDigits;
+using util::localTimeText;
+using util::startsWith;
+using util::validUtf8;
 
 namespace fs = std::filesystem;
 namespace VPD = Quorvex::PYLON::VPD;
@@ -59,11 +66,14 @@ struct RunTraces {
     std::optional<std::string> interruptedBy;
 };
 
+// A file that is gone or unreadable since the folder was listed reads as
+// empty: a run may still be writing there, and the rest is still reported.
 std::string readText(fs::path const& path) {
-    std::ifstream file(path, std::ios::binary);
-    std::ostringstream text;
-    text << file.rdbuf();
-    return text.str();
+    try {
+        return util::readWholeFile(path.string());
+    } catch (util::SystemError const&) {
+        return "";
+    }
 }
 
 void noteFileTime(fs::path const& path, RunTraces& traces) {

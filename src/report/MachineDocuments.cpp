@@ -1,6 +1,6 @@
 #include "report/MachineDocuments.h"
 
-#include "report/TextChecks.h"
+#include "utility/TextChecks.h"
 
 #include <algorithm>
 #include <tuple>
@@ -16,7 +16,7 @@ constexpr std::size_t gc_LongestNumericId = 18;
 // Numeric IDs in numeric order, then the others in text order.
 bool isBeforeInIdOrder(DocumentFile const& a, DocumentFile const& b) {
     auto const key = [](std::string const& id) {
-        bool const numeric = id.size() <= gc_LongestNumericId && isDigits(id);
+        bool const numeric = id.size() <= gc_LongestNumericId && util::isDigits(id);
         return std::make_tuple(!numeric, numeric ? std::stoll(id) : 0LL, id);
     };
     return key(a.id) < key(b.id);

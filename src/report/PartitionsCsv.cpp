@@ -1,13 +1,15 @@
 #include "report/PartitionsCsv.h"
 
 #include "report/JsonMember.h"
-#include "report/TextSafety.h"
+#include "utility/TextSafety.h"
 
 #include <algorithm>
 #include <iterator>
 #include <vector>
 
 namespace report {
+
+using util::validUtf8;
 
 using Json = nlohmann::ordered_json;
 

@@ -3,13 +3,15 @@
 #include "report/JsonMember.h"
 #include "report/PageAssets.h"
 #include "report/SummaryTotals.h"
-#include "report/TextSafety.h"
+#include "utility/TextSafety.h"
 
 #include <algorithm>
 #include <cstdio>
 #include <vector>
 
 namespace report {
+
+using util::escapeHtml;
 
 using Json = nlohmann::ordered_json;
 

@@ -1,14 +1,16 @@
 #include "report/ReportWriter.h"
 
-#include "report/AtomicFile.h"
 #include "report/PartitionsCsv.h"
 #include "report/ReportPage.h"
 #include "report/RunSummary.h"
+#include "utility/AtomicFile.h"
+#include "utility/SystemError.h"
 
 #include <filesystem>
-#include <stdexcept>
 
 namespace report {
+
+using util::writeFileAtomically;
 
 namespace fs = std::filesystem;
 
@@ -30,7 +32,7 @@ void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFo
     std::error_code error;
     fs::create_directories(folder, error);
     if (error) {
-        throw std::runtime_error("cannot create " + folder + ": " + error.message());
+        throw util::SystemError("create", folder, error.value());
     }
     std::string const base = fs::path(folder).string() + "/";
     writeFileAtomically(base + "summary.json", summaryText(summary));

@@ -9,8 +9,8 @@ namespace report {
 // Writes the report of a summary into folder (made when missing):
 // index.html, partitions.csv and summary.json, each through a temporary
 // name renamed when complete. vpdFolder is where the summary's documents
-// lie; the page links to them relative to folder. Throws
-// std::runtime_error when a file cannot be written.
+// lie; the page links to them relative to folder. Throws util::SystemError
+// when the folder cannot be made or a file cannot be written.
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
                  std::string const& folder);
 

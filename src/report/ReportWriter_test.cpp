@@ -3,13 +3,14 @@
 #include "report/FolderReader.h"
 #include "report/PartitionsCsv.h"
 #include "report/RunSummary.h"
+#include "utility/SystemError.h"
 
 #include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
+#include <cerrno>
 #include <filesystem>
-#include <stdexcept>
 
 namespace {
 
@@ -45,11 +46,15 @@ TEST(ReportWriter, PageLinksDocumentsRelativeToTheReportFolder) {
                                      .find("<a href=\"../../VPD/d.VPD.xml\">"));
 }
 
-TEST(ReportWriter, FolderThatCannotBeMadeThrows) {
+TEST(ReportWriter, FolderUnderARegularFileThrowsCreateWithThePathAndEnotdir) {
     QuorvexTest::TemporaryDirectory root;
     QuorvexTest::writeFile(root.file("file"), "x");
-    EXPECT_THROW(report::writeReport(Json::object(), root.path(), root.file("file/report")),
-                 std::runtime_error);
+    std::string const folder = root.file("file/report");
+    auto const error = QuorvexTest::thrownBy<util::SystemError>(
+        [&] { report::writeReport(Json::object(), root.path(), folder); });
+    ASSERT_TRUE(error);
+    EXPECT_EQ(ENOTDIR, error->errorNumber());
+    EXPECT_EQ("cannot create " + folder + ": Not a directory", std::string(error->what()));
 }
 
 } // namespace

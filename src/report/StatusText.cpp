@@ -1,10 +1,13 @@
 #include "report/StatusText.h"
 
-#include "report/TextChecks.h"
+#include "utility/TextChecks.h"
 
 #include <algorithm>
 
 namespace report {
+
+using util::isDigits;
+using util::startsWith;
 
 namespace {
 

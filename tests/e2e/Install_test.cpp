@@ -16,7 +16,6 @@ namespace fs = std::filesystem;
 
 constexpr char gc_Tool[] = "quorvexPYLON_VPD_Survey_ClientPartition";
 constexpr char gc_FleetProgram[] = "quorvex-survey";
-constexpr int gc_SandboxUnavailable = 77;
 
 // Installs the build tree with DESTDIR set to destDir and the given extra
 // arguments of "cmake --install".
@@ -101,7 +100,7 @@ TEST(SurveyInstallation, InstalledToolSurveysAMachineInTheSandbox) {
     QuorvexTest::CommandResult const run = QuorvexTest::runInSandbox(
         {"--vpd", vpdFolder.path(), "--trace", traceFolder.path()},
         {destDir + "/opt/quorvex/bin/" + gc_Tool, "-c", "1234-ABC_10ABCDE"});
-    if (run.exitStatus == gc_SandboxUnavailable) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(run.exitStatus, 2);

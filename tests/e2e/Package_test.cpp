@@ -28,7 +28,6 @@ constexpr char gc_Tool[] = "quorvexPYLON_VPD_Survey_ClientPartition";
 // The console-wide survey that the package carries beside the tool.
 constexpr char gc_FleetProgram[] = "quorvex-survey";
 constexpr char gc_PackageName[] = "quorvex-pylon-vpd-survey";
-constexpr int gc_SandboxUnavailable = 77;
 
 std::string u_trim_LineEnd(std::string text) {
     while (!text.empty() && text.back() == '\n') {
@@ -170,7 +169,7 @@ TEST(SurveyPackage,
 
     EndToEndScenario demo("shipped-demo");
     QuorvexTest::CommandResult const run = demo.run({root + "/usr/bin/" + gc_Tool});
-    if (run.exitStatus == gc_SandboxUnavailable) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     demo.expectExpectedOutcome(run);

@@ -13,7 +13,6 @@
 
 namespace {
 
-constexpr int gc_SandboxUnavailable = 77;
 constexpr int gc_Skipped = 77;
 // Neither of the tool's own exit statuses (2 and 255).
 constexpr int gc_MemcheckFound = 99;
@@ -48,7 +47,7 @@ TEST_P(SurveyEndToEndUnderMemcheck, RunHasNoMemoryErrorNorLeakAndTheExpectedOutc
     EndToEndScenario scenario(GetParam());
     std::string const reportPath = scenario.probeFile(gc_Report);
     QuorvexTest::CommandResult const result = scenario.run(u_tool_UnderMemcheck(reportPath));
-    if (result.exitStatus == gc_SandboxUnavailable) {
+    if (result.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << result.stderrText;
     }
     ASSERT_TRUE(QuorvexTest::fileExists(reportPath)) << result.stderrText;

@@ -8,14 +8,12 @@
 
 namespace {
 
-constexpr int gc_SandboxUnavailable = 77;
-
 class SurveyEndToEnd : public ::testing::TestWithParam<std::string> {};
 
 TEST_P(SurveyEndToEnd, RunLeavesExactlyTheExpectedOutputsAndFiles) {
     EndToEndScenario scenario(GetParam());
     QuorvexTest::CommandResult const result = scenario.run({QUORVEX_SURVEY_TOOL});
-    if (result.exitStatus == gc_SandboxUnavailable) {
+    if (result.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << result.stderrText;
     }
     scenario.expectExpectedOutcome(result);

@@ -6,7 +6,6 @@
 #include <cstdlib>
 #include <ctime>
 #include <filesystem>
-#include <sstream>
 
 namespace {
 
@@ -34,15 +33,6 @@ bool u_contains(std::vector<std::string> const& texts, std::string const& text) 
     return std::find(texts.begin(), texts.end(), text) != texts.end();
 }
 
-std::vector<std::string> u_lines(std::string const& text) {
-    std::vector<std::string> lines;
-    std::istringstream stream(text);
-    for (std::string line; std::getline(stream, line);) {
-        lines.push_back(line);
-    }
-    return lines;
-}
-
 void u_skip(std::string const& reason) {
     GTEST_SKIP() << reason;
 }
@@ -50,7 +40,7 @@ void u_skip(std::string const& reason) {
 } // namespace
 
 bool FaultRun::ranInSandbox(QuorvexTest::CommandResult const& result) {
-    if (result.exitStatus != gc_SandboxUnavailable) {
+    if (result.exitStatus != QuorvexTest::gc_SandboxUnavailable) {
         return true;
     }
     u_skip(result.stderrText);
@@ -152,7 +142,8 @@ std::vector<std::string> FaultRun::quorvexFolders() const {
 }
 
 long FaultRun::peakMemoryKiB() const {
-    std::vector<std::string> const lines = u_lines(QuorvexTest::readFile(file(gc_PeakMemory)));
+    std::vector<std::string> const lines =
+        QuorvexTest::linesOf(QuorvexTest::readFile(file(gc_PeakMemory)));
     return lines.empty() ? -1 : std::stol(lines.back());
 }
 
@@ -219,6 +210,7 @@ std::string FaultRun::_toolPath() const {
 }
 
 std::vector<std::string> FaultRun::_readListing(std::string const& name) const {
-    return QuorvexTest::fileExists(file(name)) ? u_lines(QuorvexTest::readFile(file(name)))
-                                               : std::vector<std::string>{};
+    return QuorvexTest::fileExists(file(name))
+               ? QuorvexTest::linesOf(QuorvexTest::readFile(file(name)))
+               : std::vector<std::string>{};
 }

@@ -19,7 +19,6 @@ class FaultRun {
 public:
     static constexpr int gc_TimeLimit = 120;
     static constexpr int gc_TimedOut = 124;
-    static constexpr int gc_SandboxUnavailable = 77;
 
     // True when the run had its sandbox; otherwise the current test is
     // marked skipped with the reason.

@@ -3,6 +3,7 @@
 #include "Lines.h"
 #include "QuorvexTest.h"
 #include "TextDifference.h"
+#include "utility/TextChecks.h"
 
 #include <gtest/gtest.h>
 
@@ -21,13 +22,8 @@ constexpr char gc_NoPartitionLine[] = "No ACTIVE Partition Found.";
 constexpr char gc_SurveyedEnding[] = " - VPD Survey - Ok";
 constexpr char gc_MachineListingCall[] = "lsvtc\t-t0\n";
 
-bool endsWith(std::string const& text, std::string const& ending) {
-    return text.size() >= ending.size() &&
-           text.compare(text.size() - ending.size(), ending.size(), ending) == 0;
-}
-
 std::string sortedLines(std::string const& text) {
-    std::vector<std::string> all = linesOf(text);
+    std::vector<std::string> all = QuorvexTest::linesOf(text);
     std::sort(all.begin(), all.end());
     std::string joined;
     for (std::string const& line : all) {
@@ -82,7 +78,7 @@ std::string DifferentialCase::_file(std::string const& run, std::string const& n
 }
 
 std::vector<std::string> DifferentialCase::_identities() const {
-    return linesOf(QuorvexTest::readFile(_folder + "/identities"));
+    return QuorvexTest::linesOf(QuorvexTest::readFile(_folder + "/identities"));
 }
 
 bool DifferentialCase::_surveysAll() const {
@@ -118,12 +114,13 @@ int DifferentialCase::_expectedExitStatus() const {
     std::size_t surveyed = 0;
     std::string const vpd = _folder + "/" + gc_Reference + "/VPD";
     for (std::string const& fileName : QuorvexTest::listFolder(vpd)) {
-        if (!endsWith(fileName, gc_StatusSuffix)) {
+        if (!util::endsWith(fileName, gc_StatusSuffix)) {
             continue;
         }
-        for (std::string const& line : linesOf(QuorvexTest::readFile(pathIn(vpd, fileName)))) {
+        for (std::string const& line :
+             QuorvexTest::linesOf(QuorvexTest::readFile(pathIn(vpd, fileName)))) {
             listed += line == gc_NoPartitionLine ? 0 : 1;
-            surveyed += endsWith(line, gc_SurveyedEnding) ? 1 : 0;
+            surveyed += util::endsWith(line, gc_SurveyedEnding) ? 1 : 0;
         }
     }
     if (surveyed == 0) {
@@ -163,7 +160,7 @@ std::string DifferentialCase::_normalised(std::string const& folder,
 
 void DifferentialCase::_expectEqual(std::string const& run, std::string const& what,
                                     std::string const& expected, std::string const& actual) const {
-    std::string const difference = firstDifference(expected, actual);
+    std::string const difference = QuorvexTest::firstDifference(expected, actual);
     if (!difference.empty()) {
         ADD_FAILURE() << name() << " " << run << ": " << what << ": " << difference;
     }

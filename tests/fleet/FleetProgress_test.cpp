@@ -63,7 +63,7 @@ CommandResult onTerminal(std::string const& commandLine) {
 
 // The lines of a text as a screen shows them: blanks at their end cannot be seen.
 std::vector<std::string> shownLines(std::string const& text) {
-    std::vector<std::string> lines = FleetTest::linesOf(text);
+    std::vector<std::string> lines = QuorvexTest::linesOf(text);
     for (std::string& line : lines) {
         line.erase(line.find_last_not_of(' ') + 1);
     }

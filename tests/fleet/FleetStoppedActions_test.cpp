@@ -66,7 +66,7 @@ void clearResultFolders() {
 // The lines matching the pattern.
 std::vector<std::string> matching(std::string const& text, std::regex const& pattern) {
     std::vector<std::string> found;
-    for (std::string const& line : FleetTest::linesOf(text)) {
+    for (std::string const& line : QuorvexTest::linesOf(text)) {
         if (std::regex_match(line, pattern)) {
             found.push_back(line);
         }

@@ -1,7 +1,10 @@
 #include "LeftProcesses.h"
 
+#include "utility/FileText.h"
+#include "utility/SystemError.h"
+#include "utility/TextChecks.h"
+
 #include <algorithm>
-#include <fcntl.h>
 #include <filesystem>
 #include <sstream>
 #include <unistd.h>
@@ -10,21 +13,14 @@ namespace FleetTest {
 
 namespace {
 
-// The bytes of a /proc file; what could be read when the process ends while
-// it is read (read() then fails, which a file stream would throw for).
+// The bytes of a /proc file; none when the process is gone or ends while
+// it is read.
 std::string readProcFile(std::filesystem::path const& file) {
-    std::string text;
-    int const descriptor = ::open(file.c_str(), O_RDONLY);
-    if (descriptor < 0) {
-        return text;
+    try {
+        return util::readWholeFile(file.string());
+    } catch (util::SystemError const&) {
+        return "";
     }
-    char buffer[4096];
-    ssize_t count = 0;
-    while ((count = ::read(descriptor, buffer, sizeof buffer)) > 0) {
-        text.append(buffer, static_cast<std::size_t>(count));
-    }
-    ::close(descriptor);
-    return text;
 }
 
 // The NUL-separated entries of /proc/<pid>/environ or cmdline; none when the
@@ -48,11 +44,6 @@ std::string commandLineOf(std::filesystem::path const& process) {
     return line;
 }
 
-bool isNumber(std::string const& name) {
-    return !name.empty() &&
-           std::all_of(name.begin(), name.end(), [](char c) { return c >= '0' && c <= '9'; });
-}
-
 } // namespace
 
 std::vector<std::string> processesOfConsole(std::string const& logPath) {
@@ -62,7 +53,7 @@ std::vector<std::string> processesOfConsole(std::string const& logPath) {
     std::error_code ignored;
     for (auto const& entry : std::filesystem::directory_iterator("/proc", ignored)) {
         std::string const pid = entry.path().filename().string();
-        if (!isNumber(pid) || pid == self) {
+        if (!util::isDigits(pid) || pid == self) {
             continue;
         }
         std::vector<std::string> const environment = entriesOf(entry.path() / "environ");

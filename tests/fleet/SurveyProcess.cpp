@@ -1,10 +1,10 @@
 #include "SurveyProcess.h"
 
-#include <algorithm>
+#include "ChildProcess.h"
+
 #include <chrono>
 #include <csignal>
 #include <fcntl.h>
-#include <iterator>
 #include <stdexcept>
 #include <sys/wait.h>
 #include <thread>
@@ -29,11 +29,7 @@ int statusOf(int waitStatus) {
         ::dup2(error, 2) < 0) {
         ::_exit(126);
     }
-    std::vector<char*> arguments;
-    arguments.reserve(argv.size() + 1);
-    std::transform(argv.begin(), argv.end(), std::back_inserter(arguments),
-                   [](std::string const& argument) { return const_cast<char*>(argument.c_str()); });
-    arguments.push_back(nullptr);
+    std::vector<char*> arguments = QuorvexTest::argumentPointers(argv);
     ::execv(arguments[0], arguments.data());
     ::_exit(127);
 }

@@ -1,7 +1,6 @@
 // The terminal model the progress tests read the final screen with.
 
 #include "TerminalScreen.h"
-#include "TextDifference.h"
 
 #include <gtest/gtest.h>
 
@@ -47,16 +46,6 @@ TEST(TerminalScreen, OtherEscapeSequencesAreReported) {
     TerminalScreen screen(20);
     screen.write("a\033[1mb");
     EXPECT_EQ(screen.unknownSequences(), std::vector<std::string>{"\033[1m"});
-}
-
-TEST(TextDifference, NamesOffsetLineColumnAndBothTexts) {
-    EXPECT_EQ(
-        FleetTest::firstDifference("ab\ncd\n", "ab\ncx\n"),
-        "first differing byte at offset 4 (line 2, column 2): expected \"d\\n\", got \"x\\n\"");
-    EXPECT_EQ(FleetTest::firstDifference("ab", "ab\t"),
-              "first differing byte at offset 2 (line 1, column 3): expected (end of text), got "
-              "\"\\t\"");
-    EXPECT_EQ(FleetTest::firstDifference("same", "same"), "");
 }
 
 } // namespace

@@ -2,6 +2,7 @@
 // leaves behind (nothing) and how it reports its own failures.
 
 #include "QuorvexTest.h"
+#include "utility/TextChecks.h"
 
 #include <gtest/gtest.h>
 
@@ -21,7 +22,6 @@ using QuorvexTest::runInSandbox;
 
 namespace {
 
-constexpr int gc_ExitSkip = 77;
 constexpr int gc_ExitSetupFailed = 120;
 constexpr int gc_ExitUsage = 125;
 
@@ -98,15 +98,6 @@ std::string _pathMissingOnTheHost(QuorvexTest::TemporaryDirectory const& unique,
     return "/opt/" + std::filesystem::path(unique.path()).filename().string() + rest;
 }
 
-bool _startsWith(std::string const& text, std::string const& head) {
-    return text.rfind(head, 0) == 0;
-}
-
-bool _endsWith(std::string const& text, std::string const& tail) {
-    return text.size() >= tail.size() &&
-           text.compare(text.size() - tail.size(), tail.size(), tail) == 0;
-}
-
 } // namespace
 
 TEST(SandboxHost, ExitStatusOfTheCommandPassesThrough) {
@@ -132,7 +123,7 @@ TEST(SandboxHost, NothingAppearsOnTheHost) {
         runInSandbox({}, {"sh", "-c",
                           "touch /var/adm/quorvex/VPD/x /var/adm/quorvex/Trace/y /opt/vtc/bin/z && "
                           "/usr/bin/runact-api -c x >/dev/null; /opt/lsvtc/bin/lsvtc -t0"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     ASSERT_EQ(0, run.exitStatus) << run.stderrText;
@@ -184,7 +175,7 @@ TEST(SandboxHost, TmpInsideIsNotTheHostTmp) {
     CommandResult const run =
         runInSandbox({}, {"sh", "-c", R"(test ! -e "$0" && mkdir "$1" && touch "$1/file")",
                           hostFolder.path(), insideName});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(0, run.exitStatus) << run.stderrText;
@@ -196,7 +187,7 @@ TEST(SandboxHost, NoScratchFolderIsMadeOnTheHost) {
     CommandResult const run = runCommand(
         {"/usr/bin/env", "TMPDIR=" + scratchBase.path(), QuorvexTest::sandboxPath(), "--sim",
          QuorvexTest::simulatorPath(), "--", "sh", "-c", "ls -A /tmp /dev/shm"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     std::string expected = "/dev/shm:\n\n/tmp:\n";
@@ -209,7 +200,7 @@ TEST(SandboxHost, NoScratchFolderIsMadeOnTheHost) {
 
 TEST(SandboxHost, NoNamespaceToolGivesSkipStatusWithReason) {
     CommandResult const run = _sandboxWithEmptyPath("namespace");
-    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ(QuorvexTest::gc_SandboxUnavailable, run.exitStatus);
     EXPECT_EQ(
         "sandbox: cannot make a private mount namespace: the unshare command is not installed\n",
         run.stderrText);
@@ -217,7 +208,7 @@ TEST(SandboxHost, NoNamespaceToolGivesSkipStatusWithReason) {
 
 TEST(SandboxHost, NeitherNamespaceNorProotGivesSkipStatusNamingWhatToInstall) {
     CommandResult const run = _sandboxWithEmptyPath("");
-    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ(QuorvexTest::gc_SandboxUnavailable, run.exitStatus);
     EXPECT_EQ(std::string("sandbox: cannot make a private mount namespace: the unshare command is "
                           "not installed; cannot use proot either: proot is not installed; ") +
                   gc_Remedy + "\n",
@@ -226,7 +217,7 @@ TEST(SandboxHost, NeitherNamespaceNorProotGivesSkipStatusNamingWhatToInstall) {
 
 TEST(SandboxHost, ForcedProotWithoutProotGivesSkipStatusNamingWhatToInstall) {
     CommandResult const run = _sandboxWithEmptyPath("proot");
-    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ(QuorvexTest::gc_SandboxUnavailable, run.exitStatus);
     EXPECT_EQ(std::string("sandbox: cannot use proot: proot is not installed; ") + gc_Remedy + "\n",
               run.stderrText);
 }
@@ -243,7 +234,7 @@ TEST(SandboxHost, InducedMountFailureInTheNamespaceFailsNamingTheMount) {
     CommandResult const run =
         _sandboxWith({"QUORVEX_SANDBOX=namespace", "QUORVEX_SANDBOX_FAIL_MOUNT=/var/adm/quorvex"},
                      {"--", "true"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
@@ -259,16 +250,16 @@ TEST(SandboxHost, InducedBindFailureUnderProotFailsNamingTheBindAndLeavesNothing
         _sandboxWith({"QUORVEX_SANDBOX=proot", "QUORVEX_SANDBOX_FAIL_MOUNT=/var/adm/quorvex",
                       "TMPDIR=" + scratchBase.path()},
                      {"--", "true"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
     EXPECT_TRUE(
-        _startsWith(run.stderrText, "sandbox: setting up the proot sandbox failed: proot -b " +
-                                        scratchBase.path() + "/quorvex-sandbox."))
+        util::startsWith(run.stderrText, "sandbox: setting up the proot sandbox failed: proot -b " +
+                                             scratchBase.path() + "/quorvex-sandbox."))
         << run.stderrText;
-    EXPECT_TRUE(_endsWith(run.stderrText, "/quorvex:/var/adm/quorvex: failure induced by "
-                                          "QUORVEX_SANDBOX_FAIL_MOUNT\n"))
+    EXPECT_TRUE(util::endsWith(run.stderrText, "/quorvex:/var/adm/quorvex: failure induced by "
+                                               "QUORVEX_SANDBOX_FAIL_MOUNT\n"))
         << run.stderrText;
     EXPECT_EQ("", QuorvexTest::runShell("ls -A '" + scratchBase.path() + "'").stdoutText);
 }
@@ -281,7 +272,7 @@ TEST(SandboxHost, InducedMountFailureFailsASandboxedTestInsteadOfSkippingIt) {
             runCommand({"/usr/bin/env", std::string("QUORVEX_SANDBOX=") + kind,
                         "QUORVEX_SANDBOX_FAIL_MOUNT=/var/adm/quorvex", QUORVEX_SANDBOXED_TEST,
                         "--gtest_filter=Sandbox.TestMainRunsTestsInsideTheSandbox"});
-        if (run.exitStatus == gc_ExitSkip) {
+        if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
             GTEST_SKIP() << run.stderrText;
         }
         EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus) << kind;
@@ -303,7 +294,7 @@ TEST(SandboxHost, WithoutNamespaceProotShowsTheConsoleAtTheFixedPaths) {
     CommandResult const run = _sandboxWith(
         {noNamespace.path(), "QUORVEX_SANDBOX="},
         {"--bind", console.directory() + ":" + console.directory(), "--", "sh", "-c", commandLine});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(0, run.exitStatus) << run.stderrText;
@@ -320,7 +311,7 @@ TEST(SandboxHost, WithoutNamespaceProotShowsTheConsoleAtTheFixedPaths) {
 TEST(SandboxHost, ProotRefusesTmpSizeWithItsReason) {
     CommandResult const run =
         _sandboxWith({"QUORVEX_SANDBOX=proot"}, {"--tmp-size", "16k", "--", "true"});
-    EXPECT_EQ(gc_ExitSkip, run.exitStatus);
+    EXPECT_EQ(QuorvexTest::gc_SandboxUnavailable, run.exitStatus);
     EXPECT_EQ("sandbox: --tmp-size needs a private mount namespace, which cannot be made here: "
               "proot cannot limit the size of /tmp\n",
               run.stderrText);
@@ -346,7 +337,7 @@ TEST(SandboxHost, UnprivilegedCallerGetsASandboxEvenFromAPrivateCheckout) {
         runCommand({"/usr/bin/setpriv", "--reuid=65534", "--regid=65534", "--clear-groups",
                     "/usr/bin/env", "-C", "/", sandbox, "--sim", simulator, "--", "sh", "-c",
                     "test -d /var/adm/quorvex/VPD && test -x /usr/bin/runact-api"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(0, run.exitStatus) << run.stderrText;
@@ -404,7 +395,7 @@ TEST(SandboxHost, SimulatorReadmeExamplePrintsTheDemoListing) {
         {"/usr/bin/env", "-C", QuorvexTest::sourceRoot(),
          "PYLON_SIM_SCENARIO=" + QuorvexTest::shippedScenario("demo.scn"), "tools/sandbox", "--sim",
          simulator, "--", "/opt/vtc/bin/lspartition", "-ix", "-c", "9119-MHE_21ABCDE"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(0, run.exitStatus) << run.stderrText;
@@ -423,7 +414,7 @@ TEST(SandboxHost, CommandInAFolderThatOnlyTheSandboxHasRuns) {
     std::string const inside = _pathMissingOnTheHost(folder, "/bin/hello");
     CommandResult const run =
         runInSandbox({"--bind", folder.file("hello") + ":" + inside}, {inside});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(0, run.exitStatus) << run.stderrText;
@@ -443,7 +434,7 @@ TEST(SandboxHost, CommandMissingInTheNamespaceGives127AndSaysSo) {
     QuorvexTest::TemporaryDirectory unique;
     std::string const missing = _pathMissingOnTheHost(unique, "/bin/missing");
     CommandResult const run = _sandboxWith({"QUORVEX_SANDBOX=namespace"}, {"--", missing});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(127, run.exitStatus);
@@ -454,7 +445,7 @@ TEST(SandboxHost, CommandMissingUnderProotFailsNamingIt) {
     QuorvexTest::TemporaryDirectory unique;
     std::string const missing = _pathMissingOnTheHost(unique, "/bin/missing");
     CommandResult const run = _sandboxWith({"QUORVEX_SANDBOX=proot"}, {"--", missing});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_NE(0, run.exitStatus);
@@ -468,7 +459,7 @@ TEST(SandboxHost, MissingSeccompHelperUnderProotFailsNamingIt) {
     _makeExecutable(sandbox);
     CommandResult const run =
         runCommand({"/usr/bin/env", "QUORVEX_SANDBOX=proot", sandbox, "--", "true"});
-    if (run.exitStatus == gc_ExitSkip) {
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
     EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
@@ -489,18 +480,19 @@ TEST(SandboxHost, StepThatFailsUnexpectedlyIsNamedInTheMessage) {
         {"/usr/bin/env", "PATH=" + folder.path() + ":" + (path != nullptr ? path : "/usr/bin:/bin"),
          QuorvexTest::sandboxPath(), "--", "true"});
     EXPECT_EQ(gc_ExitSetupFailed, run.exitStatus);
-    EXPECT_TRUE(_startsWith(
+    EXPECT_TRUE(util::startsWith(
         run.stderrText, "sandbox: 'dirname -- \"$0\"' failed with status 3 (tools/sandbox, line "))
         << run.stderrText;
-    EXPECT_TRUE(
-        _endsWith(run.stderrText, "run 'bash -x tools/sandbox ...' to see the step that failed\n"))
+    EXPECT_TRUE(util::endsWith(run.stderrText,
+                               "run 'bash -x tools/sandbox ...' to see the step that failed\n"))
         << run.stderrText;
 }
 
 TEST(SandboxHost, SeccompHelperAnswersHelpAndRefusesAMissingCommand) {
     CommandResult const help = runCommand({_seccompHelperPath(), "--help"});
     EXPECT_EQ(0, help.exitStatus);
-    EXPECT_TRUE(_startsWith(help.stdoutText, "Usage: tools/sandbox-seccomp.py COMMAND [ARGS...]\n"))
+    EXPECT_TRUE(
+        util::startsWith(help.stdoutText, "Usage: tools/sandbox-seccomp.py COMMAND [ARGS...]\n"))
         << help.stdoutText;
     CommandResult const bare = runCommand({_seccompHelperPath()});
     EXPECT_EQ(gc_ExitUsage, bare.exitStatus);

@@ -37,11 +37,7 @@ void _redirectOutput(int fd, std::string const& path) {
 
 [[noreturn]] void _execChild(std::vector<std::string> const& argv) {
     _redirect(STDIN_FILENO, "/dev/null", O_RDONLY);
-    std::vector<char*> args;
-    args.reserve(argv.size() + 1);
-    std::transform(argv.begin(), argv.end(), std::back_inserter(args),
-                   [](std::string const& arg) { return const_cast<char*>(arg.c_str()); });
-    args.push_back(nullptr);
+    std::vector<char*> args = argumentPointers(argv);
     ::execvp(args[0], args.data());
     std::string const message = "cannot run " + argv[0] + ": " + std::strerror(errno) + "\n";
     ssize_t const ignored = ::write(STDERR_FILENO, message.data(), message.size());
@@ -89,6 +85,15 @@ CommandResult _runCaptured(std::function<void()> const& inChild) {
 }
 
 } // namespace
+
+std::vector<char*> argumentPointers(std::vector<std::string> const& argv) {
+    std::vector<char*> pointers;
+    pointers.reserve(argv.size() + 1);
+    std::transform(argv.begin(), argv.end(), std::back_inserter(pointers),
+                   [](std::string const& argument) { return const_cast<char*>(argument.c_str()); });
+    pointers.push_back(nullptr);
+    return pointers;
+}
 
 CommandResult runCommand(std::vector<std::string> const& argv) {
     if (argv.empty()) {

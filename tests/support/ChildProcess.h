@@ -13,6 +13,10 @@ struct CommandResult {
     std::string stderrText; // exact bytes
 };
 
+// argv as the null-ended array of the exec functions; the pointers point
+// into argv, which must outlive the array.
+std::vector<char*> argumentPointers(std::vector<std::string> const& argv);
+
 // Runs argv[0] (searched in PATH when it has no "/") with the given
 // arguments, stdin from /dev/null, and waits for it.
 CommandResult runCommand(std::vector<std::string> const& argv);

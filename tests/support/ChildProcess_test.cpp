@@ -54,4 +54,13 @@ TEST(RunInFreshProcess, WorkRunsInAnotherProcessWhoseChangesStayThere) {
     EXPECT_EQ(std::getenv("QUORVEX_FRESH_MARK"), nullptr);
 }
 
+TEST(ArgumentPointers, PointIntoTheArgumentsAndEndWithNull) {
+    std::vector<std::string> const argv{"/bin/echo", "a b"};
+    std::vector<char*> const pointers = QuorvexTest::argumentPointers(argv);
+    ASSERT_EQ(3U, pointers.size());
+    EXPECT_EQ(argv[0].c_str(), pointers[0]);
+    EXPECT_EQ(argv[1].c_str(), pointers[1]);
+    EXPECT_EQ(nullptr, pointers[2]);
+}
+
 } // namespace

@@ -1,14 +1,11 @@
 #include "ExpectedOutput.h"
 
 #include "TemporaryFiles.h"
+#include "TextDifference.h"
 
-#include <algorithm>
-#include <cerrno>
-#include <cstdio>
+#include "utility/AtomicFile.h"
+
 #include <cstdlib>
-#include <cstring>
-#include <stdexcept>
-#include <unistd.h>
 
 namespace QuorvexTest {
 
@@ -27,31 +24,11 @@ bool _updateAsked() {
     return value != nullptr && std::string(value) == "1";
 }
 
-// Writes under a temporary name beside the file, then renames it, so that a
-// reader never sees half a file.
-void _replaceFile(std::string const& path, std::string const& text) {
-    std::string const temporary = path + ".new." + std::to_string(::getpid());
-    writeFile(temporary, text);
-    if (std::rename(temporary.c_str(), path.c_str()) != 0) {
-        std::remove(temporary.c_str());
-        throw std::runtime_error("cannot rename " + temporary + " to " + path + ": " +
-                                 std::strerror(errno));
-    }
-}
-
-// Where two texts first differ, as "line N" of the expected text.
-std::string _firstDifference(std::string const& expected, std::string const& actual) {
-    auto const differ =
-        std::mismatch(expected.begin(), expected.end(), actual.begin(), actual.end());
-    auto const lineEnds = std::count(expected.begin(), differ.first, '\n');
-    return "line " + std::to_string(lineEnds + 1);
-}
-
 ::testing::AssertionResult _mismatch(std::string const& expected, std::string const& actual,
                                      std::string const& expectedPath) {
     return ::testing::AssertionFailure()
-           << "the output differs from " << expectedPath << " from "
-           << _firstDifference(expected, actual) << " on (set " << gc_UpdateVariable
+           << "the output differs from " << expectedPath << ": "
+           << firstDifference(expected, actual) << " (set " << gc_UpdateVariable
            << "=1 to rewrite the file from this run)\n--- expected\n"
            << expected << "\n--- actual\n"
            << actual;
@@ -79,7 +56,7 @@ std::string _firstDifference(std::string const& expected, std::string const& act
         }
         return _mismatch(expected, actual, expectedPath);
     }
-    _replaceFile(expectedPath, actual);
+    util::writeFileAtomically(expectedPath, actual);
     return ::testing::AssertionFailure()
            << "rewrote " << expectedPath << " from this run because " << gc_UpdateVariable
            << "=1; review the change and run again without it";

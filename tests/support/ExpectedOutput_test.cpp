@@ -56,8 +56,11 @@ TEST_F(ExpectedOutputFile, DifferentBytesFailNamingTheFileAndTheFirstDifferentLi
     QuorvexTest::CommandResult const result =
         u_compareWith(nullptr, nullptr, "line 1\nline two\n", _expected);
     EXPECT_EQ(result.exitStatus, 1);
-    EXPECT_EQ(
-        result.stderrText.rfind("the output differs from " + _expected + " from line 2 on", 0), 0u)
+    EXPECT_EQ(result.stderrText.rfind("the output differs from " + _expected +
+                                          ": first differing byte at offset 12 (line 2, column 6): "
+                                          "expected \"2\\n\", got \"two\\n\" (set ",
+                                      0),
+              0u)
         << result.stderrText;
     EXPECT_EQ(QuorvexTest::readFile(_expected), "line 1\nline 2\n");
 }

@@ -7,6 +7,9 @@
 //   SimulatedConsole.h   the simulated console and its invocation log
 //   Normalise.h          temporary file names and time stamps made fixed
 //   ExpectedOutput.h     comparison with (and rewriting of) expected-output files
+//   Lines.h              a text cut into its lines
+//   TextDifference.h     where two texts part, for failure messages
+//   Thrown.h             the exception a piece of code throws
 //   TraceCapture.h       what the shared trace records
 //   TracedTest.h         a test fixture whose trace is open before it runs
 //   ModelText.h          one-line texts of model objects
@@ -15,11 +18,14 @@
 #include "ChildProcess.h"
 #include "ExpectedOutput.h"
 #include "FlushCountingBuffer.h"
+#include "Lines.h"
 #include "ModelText.h"
 #include "Normalise.h"
 #include "Sandbox.h"
 #include "SimulatedConsole.h"
 #include "TemporaryFiles.h"
 #include "TestConstants.h"
+#include "TextDifference.h"
+#include "Thrown.h"
 #include "TraceCapture.h"
 #include "TracedTest.h"

@@ -1,12 +1,13 @@
 #include "TemporaryFiles.h"
 
+#include "utility/FileText.h"
+
 #include <algorithm>
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
-#include <sstream>
 #include <stdexcept>
 #include <sys/stat.h>
 
@@ -71,13 +72,7 @@ void removeScratchDirectory() {
 }
 
 std::string readFile(std::string const& path) {
-    std::ifstream in(path, std::ios::binary);
-    if (!in) {
-        throw std::runtime_error("cannot read " + path);
-    }
-    std::ostringstream content;
-    content << in.rdbuf();
-    return content.str();
+    return util::readWholeFile(path);
 }
 
 void writeFile(std::string const& path, std::string const& text) {

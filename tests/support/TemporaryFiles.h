@@ -30,7 +30,8 @@ private:
 std::string scratchDirectory();
 void removeScratchDirectory();
 
-// The exact bytes of a file; throws std::runtime_error when it cannot be read.
+// The exact bytes of a file; throws util::SystemError (a std::runtime_error)
+// when it cannot be read.
 std::string readFile(std::string const& path);
 // Creates or truncates the file and writes the text as it is; throws
 // std::runtime_error on failure.

@@ -26,6 +26,10 @@ inline constexpr char gc_ExampleIdentity[] = "1234-ABC_10ABCDE";
 // "p<id>.example".
 Quorvex::System::Partition examplePartition(std::string const& partitionID = "3");
 
+// The exit status of tools/sandbox, and of a sandboxed test, when no sandbox
+// can be made here; ctest counts it as skipped.
+inline constexpr int gc_SandboxUnavailable = 77;
+
 // Absolute path of the source tree.
 std::string sourceRoot();
 

@@ -5,9 +5,9 @@
 
 #include <string>
 
-namespace FleetTest {
+namespace QuorvexTest {
 
 // Empty when the texts are equal.
 std::string firstDifference(std::string const& expected, std::string const& actual);
 
-} // namespace FleetTest
+} // namespace QuorvexTest

@@ -1,17 +1,22 @@
-#include "report/AtomicFile.h"
+#include "utility/AtomicFile.h"
+
+#include "utility/FileText.h"
+#include "utility/SystemError.h"
 
 #include <cerrno>
 #include <cstdio>
-#include <cstring>
 #include <fcntl.h>
-#include <stdexcept>
 #include <sys/stat.h>
 #include <unistd.h>
 #include <vector>
 
-namespace report {
+namespace util {
 
 namespace {
+
+// The temporary file is the writer's own affair: whichever step fails, what
+// failed is writing path.
+constexpr char gc_Operation[] = "write";
 
 std::string folderOf(std::string const& path) {
     std::string::size_type const slash = path.rfind('/');
@@ -24,25 +29,6 @@ std::string folderOf(std::string const& path) {
 std::string baseNameOf(std::string const& path) {
     std::string::size_type const slash = path.rfind('/');
     return slash == std::string::npos ? path : path.substr(slash + 1);
-}
-
-std::runtime_error failure(std::string const& path, int error) {
-    return std::runtime_error("cannot write " + path + ": " + std::strerror(error));
-}
-
-bool writeAll(int descriptor, std::string const& text) {
-    std::size_t written = 0;
-    while (written < text.size()) {
-        ssize_t const result = ::write(descriptor, text.data() + written, text.size() - written);
-        if (result < 0 && errno == EINTR) {
-            continue;
-        }
-        if (result <= 0) {
-            return false;
-        }
-        written += static_cast<std::size_t>(result);
-    }
-    return true;
 }
 
 mode_t newFileMode() {
@@ -59,7 +45,7 @@ void writeFileAtomically(std::string const& path, std::string const& text) {
     temporary.push_back('\0');
     int const descriptor = ::mkstemp(temporary.data());
     if (descriptor < 0) {
-        throw failure(path, errno);
+        throw SystemError(gc_Operation, path, errno);
     }
     // mkstemp makes the file readable by its owner only; the file gets the
     // mode any file written in place would get, as the survey tool's files do.
@@ -68,10 +54,10 @@ void writeFileAtomically(std::string const& path, std::string const& text) {
     int const error = errno;
     bool const closed = ::close(descriptor) == 0;
     if (!complete || !closed || std::rename(temporary.data(), path.c_str()) != 0) {
-        int const reported = complete && closed ? errno : error;
+        int const reported = complete ? errno : error;
         ::unlink(temporary.data());
-        throw failure(path, reported);
+        throw SystemError(gc_Operation, path, reported);
     }
 }
 
-} // namespace report
+} // namespace util

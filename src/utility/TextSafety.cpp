@@ -1,8 +1,8 @@
-#include "report/TextSafety.h"
+#include "utility/TextSafety.h"
 
 #include <cstddef>
 
-namespace report {
+namespace util {
 
 namespace {
 
@@ -95,4 +95,4 @@ std::string escapeHtml(std::string const& text) {
     return escaped;
 }
 
-} // namespace report
+} // namespace util

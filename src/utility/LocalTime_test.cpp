@@ -1,4 +1,4 @@
-#include "report/LocalTime.h"
+#include "utility/LocalTime.h"
 
 #include <gtest/gtest.h>
 
@@ -10,8 +10,8 @@ namespace {
 
 TEST(LocalTime, Iso8601WithColonInTheOffset) {
     std::regex const form(R"(\d{4}-\d\d-\d\dT\d\d:\d\d:\d\d[+-]\d\d:\d\d)");
-    EXPECT_TRUE(std::regex_match(report::localTimeText(1700000000), form));
-    EXPECT_TRUE(std::regex_match(report::localTimeText(0), form));
+    EXPECT_TRUE(std::regex_match(util::localTimeText(1700000000), form));
+    EXPECT_TRUE(std::regex_match(util::localTimeText(0), form));
 }
 
 // The time zone is process-wide state: set it in a child process.
@@ -20,7 +20,7 @@ TEST(LocalTime, OffsetOfTheLocalZone) {
         {
             ::setenv("TZ", "UTC-1", 1);
             ::tzset();
-            std::exit(report::localTimeText(1700000000) == "2023-11-14T23:13:20+01:00" ? 0 : 1);
+            std::exit(util::localTimeText(1700000000) == "2023-11-14T23:13:20+01:00" ? 0 : 1);
         },
         ::testing::ExitedWithCode(0), "");
 }

@@ -2,10 +2,10 @@
 
 #include <string>
 
-namespace report {
+namespace util {
 
 // The local time of a moment in ISO 8601 with its offset
 // ("2026-11-23T14:05:09+01:00"); empty when it cannot be formed.
 std::string localTimeText(long long secondsSinceEpoch);
 
-} // namespace report
+} // namespace util

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cstdio>
 
-namespace FleetTest {
+namespace QuorvexTest {
 
 namespace {
 
@@ -58,4 +58,4 @@ std::string firstDifference(std::string const& expected, std::string const& actu
            excerpt(expected, offset) + ", got " + excerpt(actual, offset);
 }
 
-} // namespace FleetTest
+} // namespace QuorvexTest

@@ -1,8 +1,8 @@
-#include "report/TextChecks.h"
+#include "utility/TextChecks.h"
 
 #include <algorithm>
 
-namespace report {
+namespace util {
 
 bool startsWith(std::string const& text, std::string const& prefix) {
     return text.compare(0, prefix.size(), prefix) == 0;
@@ -18,4 +18,4 @@ bool isDigits(std::string const& text) {
            std::all_of(text.begin(), text.end(), [](char c) { return c >= '0' && c <= '9'; });
 }
 
-} // namespace report
+} // namespace util

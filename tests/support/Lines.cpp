@@ -2,7 +2,7 @@
 
 #include <sstream>
 
-namespace FleetTest {
+namespace QuorvexTest {
 
 std::vector<std::string> linesOf(std::string const& text) {
     std::vector<std::string> lines;
@@ -14,4 +14,4 @@ std::vector<std::string> linesOf(std::string const& text) {
     return lines;
 }
 
-} // namespace FleetTest
+} // namespace QuorvexTest

@@ -1,8 +1,8 @@
-#include "report/LocalTime.h"
+#include "utility/LocalTime.h"
 
 #include <ctime>
 
-namespace report {
+namespace util {
 
 std::string localTimeText(long long secondsSinceEpoch) {
     auto const time = static_cast<std::time_t>(secondsSinceEpoch);
@@ -20,4 +20,4 @@ std::string localTimeText(long long secondsSinceEpoch) {
     return iso;
 }
 
-} // namespace report
+} // namespace util

@@ -2,11 +2,13 @@
 
 #include <string>
 
-namespace report {
+namespace util {
+
+// Checks on plain byte texts: names of files, fields of status lines.
 
 bool startsWith(std::string const& text, std::string const& prefix);
 bool endsWith(std::string const& text, std::string const& suffix);
 // True for a non-empty text of ASCII digits only.
 bool isDigits(std::string const& text);
 
-} // namespace report
+} // namespace util

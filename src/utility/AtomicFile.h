@@ -2,13 +2,13 @@
 
 #include <string>
 
-namespace report {
+namespace util {
 
 // Writes text into path through a temporary file in the same folder that is
 // renamed over path once complete, so a reader sees the old file or the new
 // one, never part of it. The file has the mode a new file gets under the
-// process's umask. Throws std::runtime_error naming the path when the
-// file cannot be written; the temporary file is removed then.
+// process's umask. Throws SystemError ("write", path, errno of the failing
+// call) when the file cannot be written; the temporary file is removed then.
 void writeFileAtomically(std::string const& path, std::string const& text);
 
-} // namespace report
+} // namespace util

@@ -4,9 +4,9 @@
 #include <string>
 #include <vector>
 
-namespace FleetTest {
+namespace QuorvexTest {
 
 // Each line without its line feed; a last line without one counts too.
 std::vector<std::string> linesOf(std::string const& text);
 
-} // namespace FleetTest
+} // namespace QuorvexTest

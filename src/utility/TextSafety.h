@@ -2,10 +2,10 @@
 
 #include <string>
 
-namespace report {
+namespace util {
 
 // Console texts (host names, OS texts, return strings) arrive as raw bytes.
-// The report's files are UTF-8, so every byte that does not belong to a
+// The files this system writes for people are UTF-8, so every byte that does not belong to a
 // well-formed UTF-8 sequence becomes U+FFFD.
 std::string validUtf8(std::string const& bytes);
 
@@ -13,4 +13,4 @@ std::string validUtf8(std::string const& bytes);
 // become entities, and bytes that are not UTF-8 become U+FFFD.
 std::string escapeHtml(std::string const& text);
 
-} // namespace report
+} // namespace util

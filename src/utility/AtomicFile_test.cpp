@@ -1,0 +1,133 @@
+#include "utility/AtomicFile.h"
+
+#include "utility/SystemError.h"
+
+#include "QuorvexTest.h"
+
+#include <gtest/gtest.h>
+
+#include <cerrno>
+#include <csignal>
+#include <cstdio>
+#include <filesystem>
+#include <optional>
+#include <sys/resource.h>
+#include <sys/stat.h>
+
+namespace {
+
+namespace fs = std::filesystem;
+
+std::size_t entriesIn(std::string const& folder) {
+    return static_cast<std::size_t>(
+        std::distance(fs::directory_iterator(folder), fs::directory_iterator()));
+}
+
+TEST(AtomicFile, WritesTheExactBytesAndLeavesNoTemporaryFile) {
+    QuorvexTest::TemporaryDirectory folder;
+    std::string const text("a\0b\r\n", 5);
+    util::writeFileAtomically(folder.file("out"), text);
+    EXPECT_EQ(text, QuorvexTest::readFile(folder.file("out")));
+    EXPECT_EQ(1U, entriesIn(folder.path()));
+}
+
+TEST(AtomicFile, ReplacesAnExistingFile) {
+    QuorvexTest::TemporaryDirectory folder;
+    QuorvexTest::writeFile(folder.file("out"), "old and longer");
+    util::writeFileAtomically(folder.file("out"), "new");
+    EXPECT_EQ("new", QuorvexTest::readFile(folder.file("out")));
+}
+
+// The permissions, in octal, of a file made by the writer under umask, read
+// in a child process, since umask is the whole process's.
+std::string modeUnderUmask(mode_t mask) {
+    QuorvexTest::TemporaryDirectory folder;
+    auto const result = QuorvexTest::runInChild([&folder, mask] {
+        ::umask(mask);
+        util::writeFileAtomically(folder.file("out"), "x");
+        struct stat status {};
+        if (::stat(folder.file("out").c_str(), &status) != 0) {
+            return 1;
+        }
+        std::printf("%o", static_cast<unsigned int>(status.st_mode & 0777U));
+        return 0;
+    });
+    EXPECT_EQ(0, result.exitStatus);
+    return result.stdoutText;
+}
+
+TEST(AtomicFile, FileHasTheModeOfAnyNewFileUnderTheUmask) {
+    EXPECT_EQ("644", modeUnderUmask(022));
+    EXPECT_EQ("640", modeUnderUmask(027));
+    EXPECT_EQ("664", modeUnderUmask(002));
+}
+
+// What writeFileAtomically throws for path, if anything.
+std::optional<util::SystemError> failureWriting(std::string const& path) {
+    return QuorvexTest::thrownBy<util::SystemError>(
+        [&path] { util::writeFileAtomically(path, "x"); });
+}
+
+TEST(AtomicFile, MissingFolderThrowsWriteWithThePathAndEnoent) {
+    QuorvexTest::TemporaryDirectory folder;
+    std::string const path = folder.file("missing/out");
+    auto const error = failureWriting(path);
+    ASSERT_TRUE(error);
+    EXPECT_EQ("write", error->operation());
+    EXPECT_EQ(path, error->object());
+    EXPECT_EQ(ENOENT, error->errorNumber());
+    EXPECT_EQ("cannot write " + path + ": No such file or directory", std::string(error->what()));
+}
+
+// Root bypasses a read-only folder, but not a regular file in the folder's place.
+TEST(AtomicFile, RegularFileAsFolderThrowsEnotdirWithTheExactMessage) {
+    QuorvexTest::TemporaryDirectory folder;
+    QuorvexTest::writeFile(folder.file("plain"), "");
+    std::string const path = folder.file("plain/out");
+    auto const error = failureWriting(path);
+    ASSERT_TRUE(error);
+    EXPECT_EQ(ENOTDIR, error->errorNumber());
+    EXPECT_EQ("cannot write " + path + ": Not a directory", std::string(error->what()));
+    EXPECT_EQ(1U, entriesIn(folder.path()));
+}
+
+TEST(AtomicFile, NameTooLongThrowsEnametoolong) {
+    QuorvexTest::TemporaryDirectory folder;
+    std::string const path = folder.file(std::string(300, 'n'));
+    auto const error = failureWriting(path);
+    ASSERT_TRUE(error);
+    EXPECT_EQ(ENAMETOOLONG, error->errorNumber());
+    EXPECT_EQ("cannot write " + path + ": File name too long", std::string(error->what()));
+    EXPECT_EQ(0U, entriesIn(folder.path()));
+}
+
+TEST(AtomicFile, FolderInTheWayOfTheFileThrowsEisdirAndLeavesNoTemporaryFile) {
+    QuorvexTest::TemporaryDirectory folder;
+    fs::create_directories(folder.file("out/inside"));
+    auto const error = failureWriting(folder.file("out"));
+    ASSERT_TRUE(error);
+    EXPECT_EQ(EISDIR, error->errorNumber());
+    EXPECT_EQ(1U, entriesIn(folder.path()));
+}
+
+// A file size limit fails the write itself, for root too. The limit, the
+// ignored SIGXFSZ and standard output (a file, which the limit would stop
+// too) stay in the child, which ends with the errno it saw when the message
+// is as expected.
+TEST(AtomicFile, FailedWriteThrowsItsErrnoAndRemovesTheTemporaryFile) {
+    QuorvexTest::TemporaryDirectory folder;
+    std::string const path = folder.file("out");
+    auto const result = QuorvexTest::runInChild([&path] {
+        std::signal(SIGXFSZ, SIG_IGN);
+        rlimit const limit{0, 0};
+        ::setrlimit(RLIMIT_FSIZE, &limit);
+        auto const error = failureWriting(path);
+        bool const exact =
+            error && std::string(error->what()) == "cannot write " + path + ": File too large";
+        return exact ? error->errorNumber() : 1;
+    });
+    EXPECT_EQ(EFBIG, result.exitStatus);
+    EXPECT_EQ(0U, entriesIn(folder.path()));
+}
+
+} // namespace
