@@ -32,8 +32,8 @@ TEST(PageSkeleton, OrdinaryCommentsAndSkeletonWithoutPlaceholdersStayAsTheyAre) 
 }
 
 TEST(PageSkeleton, PlaceholderWithoutFillerIsAnErrorNamingIt) {
-    std::string page;
     try {
+        std::string page;
         report::fillSkeleton(page, "<p><!--{{missing}}--></p>", {appending("other", "")});
         FAIL() << "no error for an unfilled placeholder";
     } catch (std::invalid_argument const& error) {

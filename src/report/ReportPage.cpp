@@ -176,7 +176,11 @@ void appendOutcomeChoices(std::string& page) {
 void appendMachineOptions(std::string& page, Json const& machines) {
     for (Json const& machine : machines) {
         std::string const identity = htmlText(member(machine, "identity"));
-        page += R"(<option value=")" + identity + R"(">)" + identity + "</option>";
+        page += R"(<option value=")";
+        page += identity;
+        page += R"(">)";
+        page += identity;
+        page += "</option>";
     }
 }
 

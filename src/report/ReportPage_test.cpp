@@ -182,20 +182,24 @@ TEST(ReportPage, StyleSheetGivesEveryOutcomesPageClassItsColour) {
     }
 }
 
+void expectOutcomeMarkup(std::string const& html, report::OutcomeText const& outcome) {
+    std::string const pageClass(outcome.pageClass);
+    std::string const name(outcome.name);
+    EXPECT_NE(std::string::npos,
+              html.find("<li class=\"" + pageClass + "\" data-outcome=\"" + name + "\"><b>"))
+        << name;
+    EXPECT_NE(std::string::npos,
+              html.find("<span class=\"key " + pageClass + "\"></span>" + outcome.label))
+        << name;
+    EXPECT_NE(std::string::npos,
+              html.find("value=\"" + pageClass + "\" data-outcome=\"" + name + "\" checked>"))
+        << name;
+}
+
 TEST(ReportPage, TotalsKeysAndFiltersCarryEveryOutcomesClassNameAndLabel) {
     std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
     for (report::OutcomeText const& outcome : report::outcomeTable()) {
-        std::string const pageClass(outcome.pageClass);
-        std::string const name(outcome.name);
-        EXPECT_NE(std::string::npos,
-                  html.find("<li class=\"" + pageClass + "\" data-outcome=\"" + name + "\"><b>"))
-            << name;
-        EXPECT_NE(std::string::npos,
-                  html.find("<span class=\"key " + pageClass + "\"></span>" + outcome.label))
-            << name;
-        EXPECT_NE(std::string::npos,
-                  html.find("value=\"" + pageClass + "\" data-outcome=\"" + name + "\" checked>"))
-            << name;
+        expectOutcomeMarkup(html, outcome);
     }
 }
 
