@@ -11,6 +11,7 @@ import csv
 import io
 import json
 import os
+import re
 import shutil
 import sys
 import tempfile
@@ -243,6 +244,40 @@ class PageTest(unittest.TestCase):
         for link in links:
             self.assertTrue(link.startswith("file://"))
             self.assertTrue(os.path.isfile(link[len("file://"):]), link)
+
+    def test_large_page_reads_every_row_and_sorts_them_all(self):
+        """A page too large for one slice of the script's reading: its rows
+        are those of the report repeated, written beside it so that its
+        links resolve the same way."""
+        copies = 1000
+        with open(os.path.join(REPORT, "index.html"), encoding="utf-8") as file:
+            page = file.read()
+        start = page.index("<tbody>", page.index('<noscript id="partition-rows">')) + len("<tbody>")
+        end = page.index("</tbody>", start)
+        rows = re.sub(r" id=m\d+", "", page[start:end])
+        large = os.path.join(REPORT, "large-test.html")
+        with open(large, "w", encoding="utf-8") as file:
+            file.write(page[:start] + rows * copies + page[end:])
+        try:
+            self.driver.get("file://" + large)
+            # Sorting at once reads the rows not yet read before it sorts.
+            self.script("document.querySelector('#parts thead th[data-column=id] button').click();")
+            partitions = self.summary["totals"]["partitions"] * copies
+            self.assertEqual(f"showing 200 of {partitions} of {partitions} partitions",
+                             self.script("return document.getElementById('row-count').textContent;"))
+            ids = [int(i) for i in self.column_texts("id")]
+            self.assertEqual(sorted(ids), ids)
+            self.assertEqual(min(int(p["id"]) for _, p in all_partitions(self.summary)
+                                 if p["id"] is not None), ids[0])
+            # The rarest outcome's rows fit on the page after one "Show more".
+            totals = self.summary["totals"]
+            rarest = min((o for o in self.outcome_classes() if totals[o] > 0), key=totals.get)
+            self.choose_only(rarest)
+            self.assertEqual(totals[rarest] * copies, len(self.script(
+                "document.querySelector('#show-more button').click();"
+                "return document.querySelectorAll('#parts tbody tr');")))
+        finally:
+            os.remove(large)
 
     def test_page_reads_fully_without_script(self):
         driver = start_chromium(tempfile.mkdtemp(prefix="report-chromium-"), script=False)
