@@ -15,14 +15,22 @@ using Json = nlohmann::ordered_json;
 
 namespace {
 
-// A partition whose outcome the summary names but the outcome table lacks
-// (a summary from a newer program) still gets a row; no style sheet rule
-// matches its class.
-constexpr OutcomeText gc_UnknownOutcome = {Outcome::Surveyed, "", "unknown", "u"};
+// How a partition's row shows its outcome.
+struct RowOutcome {
+    char const* label;
+    char const* pageClass;
+};
 
-OutcomeText const& outcomeText(std::string const& name) {
-    std::optional<Outcome> const outcome = outcomeNamed(name);
-    return outcome ? textOf(*outcome) : gc_UnknownOutcome;
+// A partition whose outcome the outcome table lacks (a summary from a newer
+// program, or none) still gets a row, labelled unknown; no style sheet rule
+// colours its class.
+RowOutcome rowOutcome(Json const& name) {
+    std::optional<Outcome> const outcome =
+        name.is_string() ? outcomeNamed(name.get<std::string>()) : std::nullopt;
+    if (!outcome) {
+        return {"unknown", "u"};
+    }
+    return {textOf(*outcome).label, textOf(*outcome).pageClass};
 }
 
 // The text of a value as the page carries it, escaped for HTML; "" for null.
@@ -205,7 +213,7 @@ std::string reasonDetails(Json const& reason) {
 // the cells the style sheet colours or aligns carry a class.
 void appendPartitionRow(std::string& page, Json const& partition, std::string const& identity,
                         std::string const& anchor, std::string const& documentFolder) {
-    OutcomeText const& outcome = outcomeText(htmlText(member(partition, "outcome")));
+    RowOutcome const outcome = rowOutcome(member(partition, "outcome"));
     page += "<tr" + anchor + " class=" + outcome.pageClass + "><td>" + identity +
             "<td class=number>" + htmlText(member(partition, "id")) + "<td>" +
             htmlText(member(partition, "host")) + "<td>" + htmlText(member(partition, "ip")) +

@@ -107,6 +107,13 @@ TEST(ReportPage, OneRowPerPartitionWithOutcomeClassAndMachineAnchorOnTheFirst) {
     EXPECT_NE(std::string::npos, html.find("<a href=\"#m0\" data-machine=\"1-A_S\">1-A_S</a>"));
 }
 
+TEST(ReportPage, OutcomeTheTableLacksShowsAsUnknown) {
+    std::string const html = page(Json::array({partitionEntry("1", "a", "teleported")}));
+    EXPECT_NE(std::string::npos,
+              html.find("<tr id=m0 class=u><td>1-A_S<td class=number>1<td>a<td>10.0.0.1"
+                        "<td class=outcome>unknown<td>"));
+}
+
 TEST(ReportPage, FullTableIsInsideNoscriptForTheScriptToRead) {
     std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
     std::size_t const start = html.find(R"(<noscript id="partition-rows"><table class="parts">)");
