@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cctype>
 #include <fstream>
 #include <sstream>
 
@@ -25,6 +26,21 @@ TEST(PageAssets, EmbeddedPageFilesAreTheSourceFilesByteForByte) {
     EXPECT_EQ(skeleton, report::pageSkeleton);
     EXPECT_EQ(pageFile("report.css"), report::pageStyle);
     EXPECT_EQ(pageFile("report.js"), report::pageScript);
+}
+
+std::string lowerCase(std::string_view text) {
+    std::string lower(text);
+    for (char& c : lower) {
+        c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+    }
+    return lower;
+}
+
+// The page writes them inline: an end tag inside would end the element
+// early and show the rest as text.
+TEST(PageAssets, InlineStyleAndScriptHoldNoEndTagOfTheirElement) {
+    EXPECT_EQ(std::string::npos, lowerCase(report::pageStyle).find("</style"));
+    EXPECT_EQ(std::string::npos, lowerCase(report::pageScript).find("</script"));
 }
 
 } // namespace
