@@ -80,3 +80,37 @@ function(quorvex_add_gtest name)
 endfunction()
 
 include(${CMAKE_CURRENT_LIST_DIR}/ValgrindTest.cmake)
+
+# quorvex_embed_texts(<target> OUTPUT <file.cpp> HEADER <header> NAMESPACE <ns>
+#                     TEXTS <name> <file> [<name> <file>...])
+# Writes OUTPUT at build time (cmake/EmbedText.cmake) with each file's text
+# as a constant <name> declared in HEADER, adds it to <target> and rewrites
+# it whenever one of the files changes. The custom target <target>_texts
+# makes just the source (for tools that read the compile database).
+function(quorvex_embed_texts target)
+  cmake_parse_arguments(ARG "" "OUTPUT;HEADER;NAMESPACE" "TEXTS" ${ARGN})
+  set(files "")
+  set(pairs "")
+  set(is_name TRUE)
+  foreach(item ${ARG_TEXTS})
+    if(is_name)
+      list(APPEND pairs "${item}")
+      set(is_name FALSE)
+    else()
+      get_filename_component(file "${item}" ABSOLUTE)
+      list(APPEND files "${file}")
+      list(APPEND pairs "${file}")
+      set(is_name TRUE)
+    endif()
+  endforeach()
+  string(REPLACE ";" "|" pairs "${pairs}")
+  set(script "${PROJECT_SOURCE_DIR}/cmake/EmbedText.cmake")
+  add_custom_command(OUTPUT "${ARG_OUTPUT}"
+    COMMAND "${CMAKE_COMMAND}" "-DOUTPUT=${ARG_OUTPUT}" "-DHEADER=${ARG_HEADER}"
+      "-DNAMESPACE=${ARG_NAMESPACE}" "-DTEXTS=${pairs}" -P "${script}"
+    DEPENDS ${files} "${script}"
+    COMMENT "Embedding texts in ${ARG_OUTPUT}"
+    VERBATIM)
+  target_sources(${target} PRIVATE "${ARG_OUTPUT}")
+  add_custom_target(${target}_texts DEPENDS "${ARG_OUTPUT}")
+endfunction()

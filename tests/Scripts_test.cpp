@@ -25,7 +25,8 @@ struct Script {
 
 std::vector<Script> const& _scripts() {
     static std::vector<Script> const scripts{
-        {"tools/check-static", "Usage: tools/check-static\n"},
+        {"tools/check-css", "Usage: tools/check-css FILE...\n"},
+        {"tools/check-static", "Usage: tools/check-static [--page]\n"},
         {"tools/coverage", "Usage: tools/coverage\n"},
         {"tools/demo", "Usage: tools/demo [SCENARIO [IDENTITY]]\n"},
         {"tools/ensure-deps", "Usage: tools/ensure-deps [PACKAGE ...]\n"},

@@ -1,10 +1,19 @@
 #pragma once
 
+#include <string_view>
+
 namespace report {
 
-// The style sheet and the script of the report page, written into it inline
-// so that the page needs nothing but itself, from file:// too.
-extern char const* const pageStyle;
-extern char const* const pageScript;
+// The report page's own files from src/report/page, put into the program at
+// build time (see cmake/EmbedText.cmake), so that the page needs nothing but
+// itself, from file:// too, and the program looks up no file to write it.
+
+// report.html: the page without its data; reportPage() fills each
+// <!--{{name}}--> placeholder.
+extern std::string_view const pageSkeleton;
+// report.css, written inline into the page's <style>.
+extern std::string_view const pageStyle;
+// report.js, written inline into the page's <script>.
+extern std::string_view const pageScript;
 
 } // namespace report

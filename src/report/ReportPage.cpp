@@ -1,11 +1,11 @@
 #include "report/ReportPage.h"
 
 #include "report/JsonMember.h"
+#include "report/Outcome.h"
 #include "report/PageAssets.h"
-#include "report/SummaryTotals.h"
+#include "report/PageSkeleton.h"
 #include "utility/TextSafety.h"
 
-#include <algorithm>
 #include <cstdio>
 #include <vector>
 
@@ -17,34 +17,26 @@ using Json = nlohmann::ordered_json;
 
 namespace {
 
-struct OutcomeStyle {
-    char const* name;
-    char const* cssClass;
+// How a partition's row shows its outcome.
+struct RowOutcome {
     char const* label;
+    char const* pageClass;
 };
 
-// One letter per outcome keeps the 50,000-row table small.
-std::vector<OutcomeStyle> const& outcomeStyles() {
-    static std::vector<OutcomeStyle> const styles = {{"surveyed", "s", "surveyed"},
-                                                     {"inactive", "i", "inactive"},
-                                                     {"channel_failure", "c", "channel failure"},
-                                                     {"client_failure", "l", "client failure"},
-                                                     {"fetch_failure", "f", "fetch failure"},
-                                                     {"timed_out", "t", "timed out"},
-                                                     {"interrupted", "x", "interrupted"}};
-    return styles;
+// A partition whose outcome the outcome table lacks (a summary from a newer
+// program, or none) still gets a row, labelled unknown; no style sheet rule
+// colours its class.
+RowOutcome rowOutcome(Json const& name) {
+    std::optional<Outcome> const outcome =
+        name.is_string() ? outcomeNamed(name.get<std::string>()) : std::nullopt;
+    if (!outcome) {
+        return {"unknown", "u"};
+    }
+    return {textOf(*outcome).label, textOf(*outcome).pageClass};
 }
 
-OutcomeStyle styleOf(std::string const& outcome) {
-    auto const& styles = outcomeStyles();
-    auto const found = std::find_if(styles.begin(), styles.end(), [&](OutcomeStyle const& style) {
-        return outcome == style.name;
-    });
-    return found == styles.end() ? OutcomeStyle{"", "u", "unknown"} : *found;
-}
-
-// The text of a value as the page shows it, escaped; "" for null.
-std::string shown(Json const& value) {
+// The text of a value as the page carries it, escaped for HTML; "" for null.
+std::string htmlText(Json const& value) {
     if (value.is_null()) {
         return "";
     }
@@ -58,7 +50,7 @@ std::string shown(Json const& value) {
 // and summary.json keep every digit.
 std::string secondsText(Json const& value) {
     if (!value.is_number()) {
-        return shown(value);
+        return htmlText(value);
     }
     char text[32] = {};
     std::snprintf(text, sizeof text, "%.1f", value.get<double>());
@@ -98,173 +90,151 @@ std::string urlPath(std::string const& path) {
 }
 
 std::string optionsText(Json const& summary) {
-    if (shown(member(summary, "tool")) != "quorvex-survey") {
+    if (htmlText(member(summary, "tool")) != "quorvex-survey") {
         return "read from the files earlier runs left";
     }
     Json const& options = member(summary, "options");
-    std::string text =
-        "-j " + shown(member(options, "jobs")) + " -t " + shown(member(options, "timeout_seconds"));
+    std::string text = "-j " + htmlText(member(options, "jobs")) + " -t " +
+                       htmlText(member(options, "timeout_seconds"));
     if (member(options, "all").is_boolean() && member(options, "all").get<bool>()) {
         return text + " --all";
     }
     for (Json const& identity : member(options, "identities")) {
-        text += " " + shown(identity);
+        text += " " + htmlText(identity);
     }
     return text;
 }
 
-void appendHead(std::string& page, Json const& summary) {
-    page += "<!DOCTYPE html>\n<html lang=\"en\"><head><meta charset=\"utf-8\">\n"
-            "<meta name=\"viewport\" content=\"width=device-width, initial-scale=1\">\n"
-            "<title>Partition survey of " +
-            shown(member(summary, "console_host")) + ", " + shown(member(summary, "started")) +
-            "</title>\n<style>";
-    page += pageStyle;
-    page += "</style></head>\n<body>\n";
-}
-
-void appendTotals(std::string& page, Json const& totals) {
-    page += "<ul class=\"totals\">\n<li><b>" + std::to_string(countOf(totals, "machines")) +
-            "</b>machines\n<li><b>" + std::to_string(countOf(totals, "partitions")) +
-            "</b>partitions\n";
-    for (OutcomeStyle const& style : outcomeStyles()) {
-        page += "<li class=\"" + std::string(style.cssClass) + "\" data-outcome=\"" + style.name +
-                "\"><b>" + std::to_string(countOf(totals, style.name)) + "</b>" + style.label +
-                "\n";
-    }
-    page += "</ul>\n";
-}
-
-void appendHeader(std::string& page, Json const& summary) {
+std::string interruptionText(Json const& summary) {
     Json const& interrupted = member(summary, "interrupted");
-    page += "<header>\n<h1>Partition survey <span>of console " +
-            shown(member(summary, "console_host")) + "</span></h1>\n<p class=\"run\">Started <b>" +
-            shown(member(summary, "started")) + "</b>, ended <b>" +
-            shown(member(summary, "ended")) + "</b> (" +
-            secondsText(member(summary, "elapsed_seconds")) + " s) &middot; overall code <b>" +
-            shown(member(summary, "return_code")) + "</b>" +
-            (interrupted.is_null() ? ""
-                                   : " &middot; <b>interrupted by " + shown(interrupted) + "</b>") +
-            " &middot; options: <b>" + optionsText(summary) + "</b></p>\n";
-    appendTotals(page, member(summary, "totals"));
-    page += "</header>\n<main>\n";
+    if (interrupted.is_null()) {
+        return "";
+    }
+    return " &middot; <b>interrupted by " + htmlText(interrupted) + "</b>";
+}
+
+// One item per outcome; the page's script finds them by data-outcome, and
+// their class gives them the outcome's colour.
+void appendOutcomeTotals(std::string& page, Json const& totals) {
+    for (OutcomeText const& outcome : outcomeTable()) {
+        page += "<li class=\"" + std::string(outcome.pageClass) + "\" data-outcome=\"" +
+                outcome.name + "\"><b>" + std::to_string(countOf(totals, outcome.name)) + "</b>" +
+                outcome.label + "</li>\n";
+    }
 }
 
 std::string barOf(Json const& counts) {
     long long const partitions = countOf(counts, "partitions");
     std::string bar = "<div class=\"bar\">";
     std::string described;
-    for (OutcomeStyle const& style : outcomeStyles()) {
-        long long const count = countOf(counts, style.name);
+    for (OutcomeText const& outcome : outcomeTable()) {
+        long long const count = countOf(counts, outcome.name);
         if (count <= 0 || partitions <= 0) {
             continue;
         }
         char width[32] = {};
         std::snprintf(width, sizeof width, "%.3f%%",
                       100.0 * static_cast<double>(count) / static_cast<double>(partitions));
-        std::string const text = std::to_string(count) + " " + style.label;
-        bar += "<i class=\"" + std::string(style.cssClass) + "\" style=\"width:" + width +
+        std::string const text = std::to_string(count) + " " + outcome.label;
+        bar += "<i class=\"" + std::string(outcome.pageClass) + "\" style=\"width:" + width +
                "\" title=\"" + text + "\"></i>";
         described += (described.empty() ? "" : ", ") + text;
     }
     return bar + "</div><td class=\"legend\">" + (described.empty() ? "none listed" : described);
 }
 
-void appendMachines(std::string& page, Json const& machines) {
-    page += "<section id=\"machines\"><h2>Machines</h2>\n<table class=\"machines\"><thead><tr>"
-            "<th>Machine<th>Code<th class=\"num\">Partitions<th class=\"bar-cell\">Outcomes"
-            "<th>Counts</thead>\n<tbody>\n";
-    std::size_t index = 0;
-    for (Json const& machine : machines) {
-        Json const& counts = member(machine, "counts");
-        std::string const identity = shown(member(machine, "identity"));
-        std::string const code = shown(member(machine, "return_code"));
-        bool const hasRows = !member(machine, "partitions").empty();
-        page += R"(<tr><th scope="row">)";
-        if (hasRows) {
-            page += R"(<a href="#m)" + std::to_string(index) + R"(" data-machine=")";
-            page += identity;
-            page += R"(">)";
-            page += identity;
-            page += "</a>";
-        } else {
-            page += identity;
-        }
-        page += R"(<td class="code code)";
-        page += code;
-        page += R"(">)";
-        page += code;
-        page += R"(<td class="num">)" + std::to_string(countOf(counts, "partitions")) +
-                R"(<td class="bar-cell">)" + barOf(counts) + "\n";
-        ++index;
+void appendMachineRow(std::string& page, Json const& machine, std::size_t index) {
+    std::string const identity = htmlText(member(machine, "identity"));
+    std::string const code = htmlText(member(machine, "return_code"));
+    page += R"(<tr><th scope="row">)";
+    if (member(machine, "partitions").empty()) {
+        page += identity;
+    } else {
+        page += R"(<a href="#m)" + std::to_string(index) + R"(" data-machine=")" + identity +
+                R"(">)" + identity + "</a>";
     }
-    page += "</tbody></table>\n<p class=\"legend\">";
-    for (OutcomeStyle const& style : outcomeStyles()) {
-        page += "<span class=\"key " + std::string(style.cssClass) + "\"></span>" + style.label;
-    }
-    page += "</p></section>\n";
+    page += R"(<td class="code code)" + code + R"(">)" + code + R"(<td class="number">)" +
+            std::to_string(countOf(member(machine, "counts"), "partitions")) +
+            R"(<td class="bar-cell">)" + barOf(member(machine, "counts")) + "\n";
 }
 
-void appendFilters(std::string& page, Json const& machines) {
-    page += "<form id=\"filters\" class=\"controls\" hidden>\n";
-    for (OutcomeStyle const& style : outcomeStyles()) {
-        page += R"(<label><input type="checkbox" name="o" value=")" + std::string(style.cssClass) +
-                R"(" checked><span class="key )" + style.cssClass + R"("></span>)" + style.label +
-                "</label>\n";
-    }
-    page += R"(<label>Machine <select id="machine"><option value="">all</option>)";
+void appendMachineRows(std::string& page, Json const& machines) {
+    std::size_t index = 0;
     for (Json const& machine : machines) {
-        std::string const identity = shown(member(machine, "identity"));
+        appendMachineRow(page, machine, index);
+        ++index;
+    }
+}
+
+void appendOutcomeKeys(std::string& page) {
+    for (OutcomeText const& outcome : outcomeTable()) {
+        page +=
+            "<span class=\"key " + std::string(outcome.pageClass) + "\"></span>" + outcome.label;
+    }
+}
+
+// The filter's boxes: the value is the class of the rows a box keeps.
+void appendOutcomeChoices(std::string& page) {
+    for (OutcomeText const& outcome : outcomeTable()) {
+        page += R"(<label><input type="checkbox" name="outcome" value=")" +
+                std::string(outcome.pageClass) + R"(" data-outcome=")" + outcome.name +
+                R"(" checked><span class="key )" + outcome.pageClass + R"("></span>)" +
+                outcome.label + "</label>\n";
+    }
+}
+
+void appendMachineOptions(std::string& page, Json const& machines) {
+    for (Json const& machine : machines) {
+        std::string const identity = htmlText(member(machine, "identity"));
         page += R"(<option value=")";
         page += identity;
         page += R"(">)";
         page += identity;
         page += "</option>";
     }
-    page += "</select></label>\n<label>Text <input type=\"search\" id=\"q\" "
-            "placeholder=\"host, IP, status, reason…\"></label>\n<span id=\"count\"></span>\n"
-            "</form>\n";
 }
 
+std::string documentLink(Json const& document, std::string const& documentFolder) {
+    if (!document.is_string()) {
+        return "";
+    }
+    std::string const path = document.get<std::string>();
+    std::string const file = path.substr(path.rfind('/') + 1);
+    return "<a href=\"" + escapeHtml(urlPath(documentFolder + "/" + file)) + "\">XML</a>";
+}
+
+std::string reasonDetails(Json const& reason) {
+    if (!reason.is_string()) {
+        return "";
+    }
+    return "<details><summary>reason</summary><pre>" + withoutTrailingBlanks(htmlText(reason)) +
+           "</pre></details>";
+}
+
+// Cells are left open (HTML closes them) to keep 50,000 rows small; only
+// the cells the style sheet colours or aligns carry a class.
 void appendPartitionRow(std::string& page, Json const& partition, std::string const& identity,
                         std::string const& anchor, std::string const& documentFolder) {
-    OutcomeStyle const style = styleOf(shown(member(partition, "outcome")));
-    page += "<tr";
-    page += anchor;
-    page += " class=";
-    page += style.cssClass;
-    page += "><td>" + identity + "<td>" + shown(member(partition, "id")) + "<td>" +
-            shown(member(partition, "host")) + "<td>" + shown(member(partition, "ip")) + "<td>" +
-            style.label + "<td>" + shown(member(partition, "status_text")) + "<td>" +
-            secondsText(member(partition, "seconds")) + "<td>";
-    Json const& document = member(partition, "document");
-    if (document.is_string()) {
-        std::string const path = document.get<std::string>();
-        std::string const file = path.substr(path.rfind('/') + 1);
-        page += "<a href=\"" + escapeHtml(urlPath(documentFolder + "/" + file)) + "\">XML</a>";
-    }
-    page += "<td>";
-    Json const& reason = member(partition, "reason");
-    if (reason.is_string()) {
-        page += "<details><summary>reason</summary><pre>" + withoutTrailingBlanks(shown(reason)) +
-                "</pre></details>";
-    }
-    // Closed, so that the line end is not part of the last cell.
+    RowOutcome const outcome = rowOutcome(member(partition, "outcome"));
+    page += "<tr" + anchor + " class=" + outcome.pageClass + "><td>" + identity +
+            "<td class=number>" + htmlText(member(partition, "id")) + "<td>" +
+            htmlText(member(partition, "host")) + "<td>" + htmlText(member(partition, "ip")) +
+            "<td class=outcome>" + outcome.label + "<td>" +
+            htmlText(member(partition, "status_text")) + "<td class=number>" +
+            secondsText(member(partition, "seconds")) + "<td>" +
+            documentLink(member(partition, "document"), documentFolder) + "<td>" +
+            reasonDetails(member(partition, "reason"));
+    // The row is closed before the line end: left open, the line end would
+    // belong to the last cell, and an empty reason cell would lose the dash
+    // the style sheet gives empty cells (td:empty).
     page += "</tr>\n";
 }
 
-void appendPartitions(std::string& page, Json const& machines, std::string const& documentFolder) {
-    page += "<section id=\"partitions\"><h2>Partitions</h2>\n";
-    appendFilters(page, machines);
-    page += "<div id=\"live\"></div>\n<noscript id=\"rows\"><table class=\"parts\"><colgroup><col "
-            "class=\"m\"><col class=\"id\"><col class=\"h\">"
-            "<col class=\"ip\"><col class=\"o\"><col class=\"st\"><col class=\"sec\">"
-            "<col class=\"d\"><col class=\"r\"></colgroup>\n<thead><tr><th>Machine"
-            "<th data-type=\"number\">ID<th>Host<th data-type=\"ip\">IP<th>Outcome<th>Status"
-            "<th data-type=\"number\">Seconds<th>Document<th>Reason</thead>\n<tbody>\n";
+void appendPartitionRows(std::string& page, Json const& machines,
+                         std::string const& documentFolder) {
     std::size_t index = 0;
     for (Json const& machine : machines) {
-        std::string const identity = shown(member(machine, "identity"));
+        std::string const identity = htmlText(member(machine, "identity"));
         std::string anchor = " id=m" + std::to_string(index);
         for (Json const& partition : member(machine, "partitions")) {
             appendPartitionRow(page, partition, identity, anchor, documentFolder);
@@ -272,38 +242,58 @@ void appendPartitions(std::string& page, Json const& machines, std::string const
         }
         ++index;
     }
-    page += "</tbody></table></noscript>\n<p id=\"more\" hidden><button type=\"button\">Show "
-            "more</button>"
-            "</p>\n</section>\n";
-}
-
-void appendFooter(std::string& page, Json const& summary) {
-    page += "</main>\n<footer>Written by " + shown(member(summary, "tool")) + " " +
-            shown(member(summary, "version")) +
-            " &middot; the same data: partitions.csv and summary.json beside this page</footer>"
-            "\n<script>";
-    page += pageScript;
-    page += "</script>\n</body></html>\n";
 }
 
 std::size_t expectedSize(Json const& summary) {
-    constexpr std::size_t bytesPerRow = 260;
+    constexpr std::size_t bytesPerRow = 300;
     constexpr std::size_t headAndMachines = std::size_t{64} * 1024;
     return headAndMachines +
            bytesPerRow * static_cast<std::size_t>(countOf(member(summary, "totals"), "partitions"));
 }
 
+// A placeholder filled with a text that is ready as it is.
+Placeholder textPlaceholder(std::string_view name, std::string text) {
+    return {name, [text = std::move(text)](std::string& page) { page += text; }};
+}
+
+std::vector<Placeholder> runPlaceholders(Json const& summary) {
+    Json const& totals = member(summary, "totals");
+    return {
+        textPlaceholder("console-host", htmlText(member(summary, "console_host"))),
+        textPlaceholder("started", htmlText(member(summary, "started"))),
+        textPlaceholder("ended", htmlText(member(summary, "ended"))),
+        textPlaceholder("elapsed-seconds", secondsText(member(summary, "elapsed_seconds"))),
+        textPlaceholder("return-code", htmlText(member(summary, "return_code"))),
+        textPlaceholder("interruption", interruptionText(summary)),
+        textPlaceholder("options", optionsText(summary)),
+        textPlaceholder("machine-count", std::to_string(countOf(totals, "machines"))),
+        textPlaceholder("partition-count", std::to_string(countOf(totals, "partitions"))),
+        {"outcome-totals", [&totals](std::string& page) { appendOutcomeTotals(page, totals); }},
+        textPlaceholder("tool", htmlText(member(summary, "tool"))),
+        textPlaceholder("version", htmlText(member(summary, "version"))),
+        textPlaceholder("style", std::string(pageStyle)),
+        textPlaceholder("script", std::string(pageScript)),
+    };
+}
+
 } // namespace
 
 std::string reportPage(Json const& summary, std::string const& documentFolder) {
+    Json const& machines = member(summary, "machines");
+    std::vector<Placeholder> placeholders = runPlaceholders(summary);
+    placeholders.push_back(
+        {"machine-rows", [&machines](std::string& page) { appendMachineRows(page, machines); }});
+    placeholders.push_back({"outcome-keys", appendOutcomeKeys});
+    placeholders.push_back({"outcome-choices", appendOutcomeChoices});
+    placeholders.push_back({"machine-options", [&machines](std::string& page) {
+                                appendMachineOptions(page, machines);
+                            }});
+    placeholders.push_back({"partition-rows", [&](std::string& page) {
+                                appendPartitionRows(page, machines, documentFolder);
+                            }});
     std::string page;
     page.reserve(expectedSize(summary));
-    appendHead(page, summary);
-    appendHeader(page, summary);
-    Json const& machines = member(summary, "machines");
-    appendMachines(page, machines);
-    appendPartitions(page, machines, documentFolder);
-    appendFooter(page, summary);
+    fillSkeleton(page, pageSkeleton, placeholders);
     return page;
 }
 

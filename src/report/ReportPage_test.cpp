@@ -1,5 +1,9 @@
 #include "report/ReportPage.h"
 
+#include "report/Outcome.h"
+#include "report/PageAssets.h"
+#include "report/PageSkeleton.h"
+
 #include <gtest/gtest.h>
 
 #include <regex>
@@ -96,21 +100,29 @@ TEST(ReportPage, HostNameMarkupShowsAsTextEverywhere) {
 TEST(ReportPage, OneRowPerPartitionWithOutcomeClassAndMachineAnchorOnTheFirst) {
     std::string const html = page(Json::array(
         {partitionEntry("1", "a", "surveyed"), partitionEntry("2", "b", "channel_failure")}));
-    EXPECT_NE(std::string::npos, html.find("<tr id=m0 class=s><td>1-A_S<td>1<td>a<td>10.0.0.1<td>"
-                                           "surveyed<td>Ok<td>2.5<td>"));
-    EXPECT_NE(std::string::npos, html.find("<tr class=c><td>1-A_S<td>2<td>b"));
+    EXPECT_NE(std::string::npos,
+              html.find("<tr id=m0 class=s><td>1-A_S<td class=number>1<td>a<td>10.0.0.1"
+                        "<td class=outcome>surveyed<td>Ok<td class=number>2.5<td>"));
+    EXPECT_NE(std::string::npos, html.find("<tr class=c><td>1-A_S<td class=number>2<td>b"));
     EXPECT_NE(std::string::npos, html.find("<a href=\"#m0\" data-machine=\"1-A_S\">1-A_S</a>"));
+}
+
+TEST(ReportPage, OutcomeTheTableLacksShowsAsUnknown) {
+    std::string const html = page(Json::array({partitionEntry("1", "a", "teleported")}));
+    EXPECT_NE(std::string::npos,
+              html.find("<tr id=m0 class=u><td>1-A_S<td class=number>1<td>a<td>10.0.0.1"
+                        "<td class=outcome>unknown<td>"));
 }
 
 TEST(ReportPage, FullTableIsInsideNoscriptForTheScriptToRead) {
     std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
-    std::size_t const start = html.find(R"(<noscript id="rows"><table class="parts">)");
+    std::size_t const start = html.find(R"(<noscript id="partition-rows"><table class="parts">)");
     std::size_t const row = html.find("<tr id=m0 class=s>");
-    std::size_t const end = html.find("</tbody></table></noscript>");
+    std::size_t const end = html.find("</tbody>\n</table></noscript>");
     EXPECT_LT(start, row);
     EXPECT_LT(row, end);
     EXPECT_NE(std::string::npos, end);
-    EXPECT_LT(html.find("<div id=\"live\"></div>"), start);
+    EXPECT_LT(html.find("<div id=\"live-rows\"></div>"), start);
 }
 
 TEST(ReportPage, DocumentsLinkRelativeToThePage) {
@@ -147,6 +159,55 @@ TEST(ReportPage, SummaryWithFieldsMissingStillGivesAPage) {
     std::string const html = report::reportPage(Json::object(), "../VPD");
     EXPECT_NE(std::string::npos, html.find("</html>"));
     EXPECT_NE(std::string::npos, html.find("read from the files earlier runs left"));
+}
+
+TEST(ReportPage, EveryPlaceholderOfTheSkeletonIsFilled) {
+    std::string const full = page(Json::array({partitionEntry("1", "a", "surveyed")}));
+    std::string const empty = report::reportPage(Json::object(), "../VPD");
+    EXPECT_FALSE(report::placeholderNames(report::pageSkeleton).empty());
+    EXPECT_EQ(std::string::npos, full.find("<!--{{"));
+    EXPECT_EQ(std::string::npos, empty.find("<!--{{"));
+}
+
+TEST(ReportPage, StyleAndScriptAreTheEmbeddedPageFiles) {
+    std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
+    EXPECT_NE(std::string::npos,
+              html.find("<style>" + std::string(report::pageStyle) + "</style>"));
+    EXPECT_NE(std::string::npos,
+              html.find("<script>" + std::string(report::pageScript) + "</script>"));
+}
+
+// The outcome table gives each outcome its page class; the style sheet gives
+// the class its colour. A new outcome, or a renamed class, without its rule
+// would show uncoloured.
+TEST(ReportPage, StyleSheetGivesEveryOutcomesPageClassItsColour) {
+    std::string const style(report::pageStyle);
+    for (report::OutcomeText const& outcome : report::outcomeTable()) {
+        std::regex const rule(std::string(R"((^|[\s,}])\.)") + outcome.pageClass +
+                              R"(\s*\{[^}]*--outcome-colour\s*:\s*#[0-9a-fA-F]{3,6}\s*;)");
+        EXPECT_TRUE(std::regex_search(style, rule)) << outcome.name << " ." << outcome.pageClass;
+    }
+}
+
+void expectOutcomeMarkup(std::string const& html, report::OutcomeText const& outcome) {
+    std::string const pageClass(outcome.pageClass);
+    std::string const name(outcome.name);
+    EXPECT_NE(std::string::npos,
+              html.find("<li class=\"" + pageClass + "\" data-outcome=\"" + name + "\"><b>"))
+        << name;
+    EXPECT_NE(std::string::npos,
+              html.find("<span class=\"key " + pageClass + "\"></span>" + outcome.label))
+        << name;
+    EXPECT_NE(std::string::npos,
+              html.find("value=\"" + pageClass + "\" data-outcome=\"" + name + "\" checked>"))
+        << name;
+}
+
+TEST(ReportPage, TotalsKeysAndFiltersCarryEveryOutcomesClassNameAndLabel) {
+    std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
+    for (report::OutcomeText const& outcome : report::outcomeTable()) {
+        expectOutcomeMarkup(html, outcome);
+    }
 }
 
 TEST(ReportPage, RowMarkupStaysSmallForLargeConsoles) {

@@ -1,0 +1,46 @@
+#include "report/PageAssets.h"
+
+#include "TestConstants.h"
+
+#include <gtest/gtest.h>
+
+#include <cctype>
+#include <fstream>
+#include <sstream>
+
+namespace {
+
+std::string pageFile(std::string const& name) {
+    std::ifstream file(QuorvexTest::sourceRoot() + "/src/report/page/" + name, std::ios::binary);
+    std::ostringstream text;
+    text << file.rdbuf();
+    return text.str();
+}
+
+// The build writes the files into raw string literals; quotes, backslashes
+// (the style sheet's "\2013"), semicolons and line ends must come through
+// unchanged.
+TEST(PageAssets, EmbeddedPageFilesAreTheSourceFilesByteForByte) {
+    std::string const skeleton = pageFile("report.html");
+    ASSERT_FALSE(skeleton.empty());
+    EXPECT_EQ(skeleton, report::pageSkeleton);
+    EXPECT_EQ(pageFile("report.css"), report::pageStyle);
+    EXPECT_EQ(pageFile("report.js"), report::pageScript);
+}
+
+std::string lowerCase(std::string_view text) {
+    std::string lower(text);
+    for (char& c : lower) {
+        c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+    }
+    return lower;
+}
+
+// The page writes them inline: an end tag inside would end the element
+// early and show the rest as text.
+TEST(PageAssets, InlineStyleAndScriptHoldNoEndTagOfTheirElement) {
+    EXPECT_EQ(std::string::npos, lowerCase(report::pageStyle).find("</style"));
+    EXPECT_EQ(std::string::npos, lowerCase(report::pageScript).find("</script"));
+}
+
+} // namespace
