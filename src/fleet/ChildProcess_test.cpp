@@ -7,7 +7,6 @@
 #include <gtest/gtest.h>
 
 #include <poll.h>
-#include <sys/resource.h>
 #include <unistd.h>
 
 #include <chrono>
@@ -34,26 +33,6 @@ std::string sleepLong() {
     std::system("sleep 300");
     return "went on";
 }
-
-// While it lives, no new descriptor can be opened: the soft limit is put
-// just below the lowest free descriptor, and put back at the end.
-class DescriptorsExhausted {
-public:
-    DescriptorsExhausted() {
-        getrlimit(RLIMIT_NOFILE, &_saved);
-        int const lowestFree = dup(STDIN_FILENO);
-        close(lowestFree);
-        rlimit lowered = _saved;
-        lowered.rlim_cur = static_cast<rlim_t>(lowestFree);
-        setrlimit(RLIMIT_NOFILE, &lowered);
-    }
-    ~DescriptorsExhausted() { setrlimit(RLIMIT_NOFILE, &_saved); }
-    DescriptorsExhausted(DescriptorsExhausted const&) = delete;
-    DescriptorsExhausted& operator=(DescriptorsExhausted const&) = delete;
-
-private:
-    rlimit _saved{};
-};
 
 TEST(ChildProcess, StopNoteLeftByTheParentIsReadInTheChild) {
     // The child waits until the parent has left the note, then reports it.
@@ -90,7 +69,7 @@ TEST(ChildProcess, ChildWithoutAResultPipeSaysWhichOperationFailedAndWhy) {
     std::optional<std::string> failure;
     bool started = true;
     {
-        DescriptorsExhausted const exhausted;
+        QuorvexTest::NoFreeDescriptors const exhausted;
         ChildProcess const worker([] { return std::string(); });
         started = worker.isStarted();
         failure = worker.startFailure();

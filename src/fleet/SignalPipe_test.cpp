@@ -4,7 +4,6 @@
 
 #include <gtest/gtest.h>
 
-#include <sys/resource.h>
 #include <unistd.h>
 
 #include <csignal>
@@ -30,13 +29,11 @@ TEST(SignalPipe, FirstSignalIsKeptAndLaterOnesChangeNothing) {
 
 TEST(SignalPipe, PipeThatCannotBeMadeIsReportedWithErrnoAndNoHandlerIsSet) {
     QuorvexTest::CommandResult const result = QuorvexTest::runInChild([] {
-        int const lowestFree = dup(STDIN_FILENO);
-        close(lowestFree);
-        rlimit limit{};
-        getrlimit(RLIMIT_NOFILE, &limit);
-        limit.rlim_cur = static_cast<rlim_t>(lowestFree);
-        setrlimit(RLIMIT_NOFILE, &limit);
-        std::optional<std::string> const failure = Fleet::installSignalPipe();
+        std::optional<std::string> failure;
+        {
+            QuorvexTest::NoFreeDescriptors const exhausted;
+            failure = Fleet::installSignalPipe();
+        }
         struct sigaction action {};
         sigaction(SIGTERM, nullptr, &action);
         bool const untouched = action.sa_handler == SIG_DFL;

@@ -6,7 +6,6 @@
 
 #include <gtest/gtest.h>
 
-#include <sys/resource.h>
 #include <unistd.h>
 
 #include <chrono>
@@ -97,16 +96,11 @@ TEST(WorkerPool, EndedWorkerIsReportedOnceWithItsTagAndResult) {
 
 TEST(WorkerPool, WorkerThatCannotStartIsNotKeptAndSaysWhy) {
     WorkerPool pool(gc_NoWake);
-    rlimit saved{};
-    getrlimit(RLIMIT_NOFILE, &saved);
-    int const lowestFree = dup(STDIN_FILENO);
-    close(lowestFree);
-    rlimit lowered = saved;
-    lowered.rlim_cur = static_cast<rlim_t>(lowestFree);
-    setrlimit(RLIMIT_NOFILE, &lowered);
-    std::optional<std::string> const failure =
-        pool.start(1, UnitKind::Survey, [] { return std::string(); });
-    setrlimit(RLIMIT_NOFILE, &saved);
+    std::optional<std::string> failure;
+    {
+        QuorvexTest::NoFreeDescriptors const exhausted;
+        failure = pool.start(1, UnitKind::Survey, [] { return std::string(); });
+    }
     EXPECT_EQ(failure, std::optional<std::string>("cannot create the result pipe: Too many "
                                                   "open files"));
     EXPECT_EQ(pool.size(), 0U);
@@ -123,15 +117,24 @@ TEST(WorkerPool, ActionOfAYoungUnitIsLeftAloneUnderTheTimeLimit) {
     EXPECT_EQ(events[0].text, "0");
 }
 
-TEST(WorkerPool, InterruptionStopsAListingsActionAndTheWorkerGoesOn) {
+// Starts body as the pool's one worker, interrupts the run once a process
+// below this one runs command, and returns what the pool reported up to the
+// worker's end.
+std::vector<WorkerEvent> interruptWhileRunning(UnitKind kind, Fleet::ChildProcess::Body const& body,
+                                               std::string const& command, TimeLimits& limits) {
     WorkerPool pool(gc_NoWake);
-    ASSERT_EQ(pool.start(4, UnitKind::PartitionListing,
-                         [] { return "went on " + std::to_string(std::system("sleep 300")); }),
-              std::nullopt);
-    ASSERT_TRUE(waitForCommand("sleep 300"));
-    TimeLimits limits(0);
+    if (pool.start(4, kind, body) || !waitForCommand(command)) {
+        return {};
+    }
     limits.interrupt(SIGTERM);
-    std::vector<WorkerEvent> const events = waitFor(pool, WorkerEvent::Kind::Ended, &limits);
+    return waitFor(pool, WorkerEvent::Kind::Ended, &limits);
+}
+
+TEST(WorkerPool, InterruptionStopsAListingsActionAndTheWorkerGoesOn) {
+    TimeLimits limits(0);
+    std::vector<WorkerEvent> const events = interruptWhileRunning(
+        UnitKind::PartitionListing,
+        [] { return "went on " + std::to_string(std::system("sleep 300")); }, "sleep 300", limits);
     ASSERT_GE(events.size(), 2U);
     EXPECT_EQ(events[0].kind, WorkerEvent::Kind::ActionStopped);
     EXPECT_EQ(events[0].tag, 4U);
@@ -144,22 +147,20 @@ TEST(WorkerPool, InterruptionStopsAListingsActionAndTheWorkerGoesOn) {
 TEST(WorkerPool, StoppedSurveyActionLeavesTheNoteOfItsAgeForTheWorker) {
     RemoteAction const action;
     std::string const command = action.command();
-    WorkerPool pool(gc_NoWake);
-    ASSERT_EQ(pool.start(2, UnitKind::Survey,
-                         [command] {
-                             std::system(command.c_str());
-                             return Fleet::ChildProcess::stopNote();
-                         }),
-              std::nullopt);
-    ASSERT_TRUE(waitForCommand("runact-api 300"));
     TimeLimits limits(0);
-    limits.interrupt(SIGINT);
-    std::vector<WorkerEvent> const events = waitFor(pool, WorkerEvent::Kind::Ended, &limits);
+    std::vector<WorkerEvent> const events = interruptWhileRunning(
+        UnitKind::Survey,
+        [command] {
+            std::system(command.c_str());
+            return Fleet::ChildProcess::stopNote();
+        },
+        "runact-api 300", limits);
     ASSERT_GE(events.size(), 2U);
     WorkerEvent const& stopped = events.front();
     ASSERT_EQ(stopped.kind, WorkerEvent::Kind::ActionStopped);
     EXPECT_NE(stopped.text.find("runact-api 300"), std::string::npos) << stopped.text;
     EXPECT_EQ(events.back().text, limits.stopNote(UnitKind::Survey, stopped.seconds));
+    EXPECT_EQ(events.back().text.rfind("Stopped by SIGTERM after ", 0), 0U);
 }
 
 TEST(WorkerPool, StoppedMachineListingIsEndedWithoutGoingOnOrHanging) {

@@ -49,6 +49,31 @@ void writeSummary(Fleet::RunFacts const& facts, nlohmann::json const& summary) {
     }
 }
 
+// The summary and the report of a run that has ended.
+void writeRunFiles(Fleet::Options const& options, Fleet::SurveyRun const& run, int exitStatus,
+                   std::time_t started, std::chrono::steady_clock::time_point startedAt) {
+    Fleet::RunFacts facts;
+    facts.options = options;
+    // Every unit of work has ended: the host name command may trace here.
+    facts.consoleHost = Utility::get_HostName();
+    facts.started = report::localTimeText(started);
+    facts.ended = report::localTimeText(std::time(nullptr));
+    facts.elapsedSeconds =
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - startedAt).count();
+    if (run.interruptingSignal() != 0) {
+        facts.interruptedBy = Fleet::signalName(run.interruptingSignal());
+    }
+    facts.returnCode = run.overallCode();
+    facts.exitStatus = exitStatus;
+    nlohmann::json const summary = Fleet::Summary::build(facts, run.machines());
+    if (!options.summaryFile.empty()) {
+        writeSummary(facts, summary);
+    }
+    if (!options.reportFolder.empty()) {
+        report::writeRunReport(summary, options.reportFolder, std::cerr);
+    }
+}
+
 } // namespace
 
 int main(int argc, char** argv) {
@@ -75,26 +100,7 @@ int main(int argc, char** argv) {
     int const exitStatus = run.run();
 
     if (!options.summaryFile.empty() || !options.reportFolder.empty()) {
-        Fleet::RunFacts facts;
-        facts.options = options;
-        // Every unit of work has ended: the host name command may trace here.
-        facts.consoleHost = Utility::get_HostName();
-        facts.started = report::localTimeText(started);
-        facts.ended = report::localTimeText(std::time(nullptr));
-        facts.elapsedSeconds =
-            std::chrono::duration<double>(std::chrono::steady_clock::now() - startedAt).count();
-        if (run.interruptingSignal() != 0) {
-            facts.interruptedBy = Fleet::signalName(run.interruptingSignal());
-        }
-        facts.returnCode = run.overallCode();
-        facts.exitStatus = exitStatus;
-        nlohmann::json const summary = Fleet::Summary::build(facts, run.machines());
-        if (!options.summaryFile.empty()) {
-            writeSummary(facts, summary);
-        }
-        if (!options.reportFolder.empty()) {
-            report::writeRunReport(summary, options.reportFolder, std::cerr);
-        }
+        writeRunFiles(options, run, exitStatus, started, startedAt);
     }
     return exitStatus;
 }
