@@ -9,6 +9,7 @@
 #include <poll.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <chrono>
 #include <cstdlib>
 #include <thread>
@@ -133,10 +134,8 @@ TEST(ChildProcess, StoppedChildIsKilledAndReapedWithEverythingItStarted) {
             return 1;
         }
         worker.killAndReap();
-        for (pid_t pid : started) {
-            if (!Fleet::hasEnded(pid)) {
-                return 2;
-            }
+        if (!std::all_of(started.begin(), started.end(), &Fleet::hasEnded)) {
+            return 2;
         }
         return worker.isReaped() && !worker.isStopped() ? 0 : 3;
     });

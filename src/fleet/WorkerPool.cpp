@@ -99,14 +99,21 @@ std::vector<WorkerEvent> WorkerPool::stopDueActions(TimeLimits const& limits) {
             !limits.mayHaveActionToStop(unitSeconds)) {
             continue;
         }
-        for (pid_t action : limits.actionsToStop(worker.kind, _actionsOf(worker))) {
-            if (std::optional<WorkerEvent> stopped = _stopAction(worker, action, limits)) {
-                events.push_back(std::move(*stopped));
-                break;
-            }
+        if (std::optional<WorkerEvent> stopped = _stopFirstDue(worker, limits)) {
+            events.push_back(std::move(*stopped));
         }
     }
     return events;
+}
+
+// An action that ended meanwhile is passed over for the next one due.
+std::optional<WorkerEvent> WorkerPool::_stopFirstDue(Worker& worker, TimeLimits const& limits) {
+    std::optional<WorkerEvent> stopped;
+    std::vector<pid_t> const due = limits.actionsToStop(worker.kind, _actionsOf(worker));
+    for (auto action = due.begin(); !stopped && action != due.end(); ++action) {
+        stopped = _stopAction(worker, *action, limits);
+    }
+    return stopped;
 }
 
 // The worker is stopped first, so that it starts nothing new while its

@@ -75,6 +75,7 @@ private:
     void _poll();
     bool _mayHaveEnded(Worker const& worker) const;
     std::vector<ActionFacts> _actionsOf(Worker const& worker) const;
+    std::optional<WorkerEvent> _stopFirstDue(Worker& worker, TimeLimits const& limits);
     std::optional<WorkerEvent> _stopAction(Worker& worker, pid_t action, TimeLimits const& limits);
 
     int _wakeDescriptor;

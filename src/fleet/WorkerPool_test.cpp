@@ -8,6 +8,7 @@
 
 #include <unistd.h>
 
+#include <algorithm>
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
@@ -52,10 +53,11 @@ std::vector<WorkerEvent> waitFor(WorkerPool& pool, WorkerEvent::Kind kind,
 bool waitForCommand(std::string const& text) {
     auto const deadline = std::chrono::steady_clock::now() + gc_Bound;
     while (std::chrono::steady_clock::now() < deadline) {
-        for (pid_t pid : Fleet::descendantsOf(getpid())) {
-            if (Fleet::commandLineOf(pid).find(text) != std::string::npos) {
-                return true;
-            }
+        std::vector<pid_t> const below = Fleet::descendantsOf(getpid());
+        if (std::any_of(below.begin(), below.end(), [&text](pid_t pid) {
+                return Fleet::commandLineOf(pid).find(text) != std::string::npos;
+            })) {
+            return true;
         }
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }
@@ -82,9 +84,8 @@ TEST(WorkerPool, EndedWorkerIsReportedOnceWithItsTagAndResult) {
     std::vector<WorkerEvent> ended;
     auto const deadline = std::chrono::steady_clock::now() + gc_Bound;
     while (pool.size() > 0 && std::chrono::steady_clock::now() < deadline) {
-        for (auto const& event : pool.waitForEvents()) {
-            ended.push_back(event);
-        }
+        std::vector<WorkerEvent> const events = pool.waitForEvents();
+        ended.insert(ended.end(), events.begin(), events.end());
     }
     ASSERT_EQ(ended.size(), 2U);
     for (auto const& event : ended) {
