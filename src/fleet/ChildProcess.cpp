@@ -15,6 +15,7 @@
 #include <cstring>
 #include <iostream>
 #include <new>
+#include <utility>
 
 namespace Fleet {
 
@@ -37,12 +38,14 @@ ChildProcess::ChildProcess(Body const& body) {
         // cppcheck-suppress invalidFunctionArg
         mmap(nullptr, sizeof(Slot), PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0);
     if (memory == MAP_FAILED) {
+        _fail("cannot map the stop note slot");
         return;
     }
     _slot = new (memory) Slot{};
     int ends[2];
     // Close-on-exec: the commands the child runs must not hold the pipe open.
     if (pipe2(ends, O_CLOEXEC) != 0) {
+        _fail("cannot create the result pipe");
         return;
     }
     // Nothing buffered in the parent may be written twice by a child.
@@ -53,13 +56,20 @@ ChildProcess::ChildProcess(Body const& body) {
         close(ends[0]);
         _runChild(body, ends[1]);
     }
-    close(ends[1]);
     if (_pid < 0) {
+        _fail("cannot fork");
         close(ends[0]);
+        close(ends[1]);
         return;
     }
+    close(ends[1]);
     _readEnd = ends[0];
     fcntl(_readEnd, F_SETFL, fcntl(_readEnd, F_GETFL) | O_NONBLOCK);
+}
+
+// errno is read before anything else can change it.
+void ChildProcess::_fail(char const* operation) {
+    _startFailure = std::string(operation) + ": " + std::strerror(errno);
 }
 
 void ChildProcess::_runChild(Body const& body, int writeEnd) {
@@ -93,6 +103,10 @@ ChildProcess::~ChildProcess() {
 
 bool ChildProcess::isStarted() const {
     return _pid > 0;
+}
+
+std::optional<std::string> ChildProcess::startFailure() const {
+    return _startFailure;
 }
 
 pid_t ChildProcess::pid() const {
@@ -130,6 +144,10 @@ std::string const& ChildProcess::result() const {
     return _result;
 }
 
+std::string ChildProcess::takeResult() {
+    return std::exchange(_result, std::string());
+}
+
 bool ChildProcess::reap() {
     if (_reaped || _pid <= 0) {
         return true;
@@ -142,29 +160,48 @@ bool ChildProcess::reap() {
     return _reaped;
 }
 
-void ChildProcess::markReaped() {
-    _reaped = true;
-}
-
 bool ChildProcess::isReaped() const {
     return _reaped || _pid <= 0;
 }
 
-void ChildProcess::killAndReap() {
+bool ChildProcess::stop() {
     if (isReaped()) {
+        return false;
+    }
+    if (_stopped) {
+        return true;
+    }
+    ChildStop const outcome = stopChild(_pid);
+    // Ended: reaped by the wait. Gone: no wait can find it any more.
+    _stopped = outcome.state == ChildStop::State::Stopped;
+    _reaped = !_stopped;
+    return _stopped;
+}
+
+void ChildProcess::resume() {
+    if (_stopped && !isReaped()) {
+        kill(_pid, SIGCONT);
+        _stopped = false;
+    }
+}
+
+bool ChildProcess::isStopped() const {
+    return _stopped;
+}
+
+// Stopped first, so that it starts nothing while what it started is killed.
+// SIGKILL ends a stopped child too, so the wait below never waits on one
+// that stays stopped.
+void ChildProcess::killAndReap() {
+    if (!stop()) {
         return;
     }
-    // Stopped first, so that it starts nothing while what it started is killed.
-    int status = 0;
-    if (!ProcessTree::stopChild(_pid, status)) {
-        _reaped = true;
-        return;
-    }
-    ProcessTree::killDescendants(_pid);
+    killDescendants(_pid);
     kill(_pid, SIGKILL);
     while (waitpid(_pid, nullptr, 0) < 0 && errno == EINTR) {
     }
     _reaped = true;
+    _stopped = false;
 }
 
 std::string ChildProcess::stopNote() {

@@ -4,6 +4,7 @@
 
 #include <atomic>
 #include <functional>
+#include <optional>
 #include <string>
 
 namespace Fleet {
@@ -19,24 +20,36 @@ public:
     using Body = std::function<std::string()>;
 
     // Forks and runs body in the child; its returned text is the result.
+    // When the child cannot be made, startFailure() says why.
     explicit ChildProcess(Body const& body);
     ~ChildProcess();
     ChildProcess(ChildProcess const&) = delete;
     ChildProcess& operator=(ChildProcess const&) = delete;
 
     bool isStarted() const;
+    // What kept the child from starting, with errno's text, for example
+    // "cannot fork: Resource temporarily unavailable"; nullopt once started.
+    std::optional<std::string> startFailure() const;
     pid_t pid() const;
     // The reading end of the result pipe, non-blocking; -1 once at its end.
     int resultDescriptor() const;
     // Reads what the pipe holds now; false once it is at its end.
     bool readAvailable();
     std::string const& result() const;
+    // Hands the result over, leaving none behind.
+    std::string takeResult();
     // Reaps the child when it has ended; true once reaped.
     bool reap();
-    // The parent has reaped the child elsewhere (while stopping it).
-    void markReaped();
     bool isReaped() const;
-    // Kills a child that is still there, with everything it started, and reaps it.
+    // Stops the child with SIGSTOP, so that it starts nothing new while what
+    // it started is looked at or killed. True once it is stopped (at once
+    // when it already was); false when it ended first, and is then reaped.
+    [[nodiscard]] bool stop();
+    // Lets a stopped child go on.
+    void resume();
+    bool isStopped() const;
+    // Kills a child that is still there, with everything it started, and
+    // reaps it; a child already stopped is not stopped again.
     void killAndReap();
 
     // The line the parent leaves in the slot; read by the child itself.
@@ -52,12 +65,15 @@ private:
     static Slot* ms_ownSlot;
 
     [[noreturn]] void _runChild(Body const& body, int writeEnd);
+    void _fail(char const* operation);
 
     pid_t _pid = -1;
+    std::optional<std::string> _startFailure;
     int _readEnd = -1;
     Slot* _slot = nullptr;
     std::string _result;
     bool _reaped = false;
+    bool _stopped = false;
 };
 
 } // namespace Fleet

@@ -47,15 +47,26 @@ std::vector<std::string> threadsOf(pid_t pid) {
     return threads;
 }
 
+// The fields of /proc/<pid>/stat after the command name; nullopt when gone.
+std::optional<std::string> statFields(pid_t pid) {
+    std::string const stat = readProcFile(procPath(pid, "stat"));
+    // The command name in parentheses may hold blanks and parentheses itself.
+    std::size_t const end = stat.rfind(')');
+    if (end == std::string::npos || end + 2 > stat.size()) {
+        return std::nullopt;
+    }
+    return stat.substr(end + 2);
+}
+
 } // namespace
 
-double ProcessTree::secondsSinceBoot() {
+double secondsSinceBoot() {
     timespec now{};
     clock_gettime(CLOCK_BOOTTIME, &now);
     return static_cast<double>(now.tv_sec) + static_cast<double>(now.tv_nsec) / 1e9;
 }
 
-std::vector<pid_t> ProcessTree::childrenOf(pid_t pid) {
+std::vector<pid_t> childrenOf(pid_t pid) {
     std::vector<pid_t> children;
     for (auto const& thread : threadsOf(pid)) {
         std::istringstream list(readProcFile(procPath(pid, "task/") + thread + "/children"));
@@ -67,7 +78,7 @@ std::vector<pid_t> ProcessTree::childrenOf(pid_t pid) {
     return children;
 }
 
-std::vector<pid_t> ProcessTree::descendantsOf(pid_t pid) {
+std::vector<pid_t> descendantsOf(pid_t pid) {
     std::vector<pid_t> found = childrenOf(pid);
     for (std::size_t i = 0; i < found.size(); ++i) {
         std::vector<pid_t> const grandchildren = childrenOf(found[i]);
@@ -76,24 +87,14 @@ std::vector<pid_t> ProcessTree::descendantsOf(pid_t pid) {
     return found;
 }
 
-std::string ProcessTree::commandLineOf(pid_t pid) {
+std::string commandLineOf(pid_t pid) {
     std::string text = readProcFile(procPath(pid, "cmdline"));
     std::replace(text.begin(), text.end(), '\0', ' ');
     return text;
 }
 
-std::optional<std::string> ProcessTree::_statFields(pid_t pid) {
-    std::string const stat = readProcFile(procPath(pid, "stat"));
-    // The command name in parentheses may hold blanks and parentheses itself.
-    std::size_t const end = stat.rfind(')');
-    if (end == std::string::npos || end + 2 > stat.size()) {
-        return std::nullopt;
-    }
-    return stat.substr(end + 2);
-}
-
-std::optional<double> ProcessTree::ageOf(pid_t pid) {
-    std::optional<std::string> const fields = _statFields(pid);
+std::optional<double> ageOf(pid_t pid) {
+    std::optional<std::string> const fields = statFields(pid);
     if (!fields) {
         return std::nullopt;
     }
@@ -112,32 +113,32 @@ std::optional<double> ProcessTree::ageOf(pid_t pid) {
     return age < 0 ? 0.0 : age;
 }
 
-bool ProcessTree::hasEnded(pid_t pid) {
-    std::optional<std::string> const fields = _statFields(pid);
+bool hasEnded(pid_t pid) {
+    std::optional<std::string> const fields = statFields(pid);
     return !fields || fields->empty() || (*fields)[0] == 'Z' || (*fields)[0] == 'X';
 }
 
-bool ProcessTree::stopChild(pid_t child, int& exitStatus) {
+ChildStop stopChild(pid_t child) {
+    ChildStop stop;
     if (kill(child, SIGSTOP) != 0) {
-        return false;
+        stop.error = errno;
+        return stop;
     }
     while (true) {
-        int status = 0;
-        pid_t const result = waitpid(child, &status, WUNTRACED);
-        if (result == child && WIFSTOPPED(status)) {
-            return true;
-        }
+        pid_t const result = waitpid(child, &stop.waitStatus, WUNTRACED);
         if (result == child) {
-            exitStatus = status;
-            return false;
+            stop.state =
+                WIFSTOPPED(stop.waitStatus) ? ChildStop::State::Stopped : ChildStop::State::Ended;
+            return stop;
         }
         if (result < 0 && errno != EINTR) {
-            return false;
+            stop.error = errno;
+            return stop;
         }
     }
 }
 
-std::size_t ProcessTree::killDescendants(pid_t root) {
+std::size_t killDescendants(pid_t root) {
     std::size_t signalsSent = 0;
     for (int round = 0; round < gc_KillRounds; ++round) {
         bool anyAlive = false;

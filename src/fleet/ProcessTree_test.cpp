@@ -5,9 +5,11 @@
 #include <gtest/gtest.h>
 
 #include <poll.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
@@ -17,7 +19,6 @@
 namespace {
 
 using Fleet::ChildProcess;
-using Fleet::ProcessTree;
 
 // A child that runs a shell leaving three sleeping processes: one orphaned
 // at once (adopted by the child), two under the shell. The child reports
@@ -28,10 +29,10 @@ std::string runSleepingTree() {
 }
 
 std::vector<pid_t> liveDescendants(pid_t root) {
-    std::vector<pid_t> const all = ProcessTree::descendantsOf(root);
+    std::vector<pid_t> const all = Fleet::descendantsOf(root);
     std::vector<pid_t> live;
     std::copy_if(all.begin(), all.end(), std::back_inserter(live),
-                 [](pid_t pid) { return !ProcessTree::hasEnded(pid); });
+                 [](pid_t pid) { return !Fleet::hasEnded(pid); });
     return live;
 }
 
@@ -49,10 +50,10 @@ std::vector<pid_t> waitForLiveDescendants(pid_t root, std::size_t count) {
 // system() shows its parent's command line until its exec has run.
 std::string waitForCommandLine(pid_t pid, std::string const& text) {
     auto const deadline = std::chrono::steady_clock::now() + std::chrono::seconds(20);
-    std::string line = ProcessTree::commandLineOf(pid);
+    std::string line = Fleet::commandLineOf(pid);
     while (line.find(text) == std::string::npos && std::chrono::steady_clock::now() < deadline) {
         std::this_thread::sleep_for(std::chrono::milliseconds(20));
-        line = ProcessTree::commandLineOf(pid);
+        line = Fleet::commandLineOf(pid);
     }
     return line;
 }
@@ -72,20 +73,19 @@ TEST(ProcessTree, TreeOfSleepingShellsIsKilledAndTheWorkerGoesOn) {
     std::vector<pid_t> const tree = waitForLiveDescendants(worker.pid(), 4);
     ASSERT_GE(tree.size(), 4U);
 
-    int status = 0;
-    ASSERT_TRUE(ProcessTree::stopChild(worker.pid(), status));
-    EXPECT_GT(ProcessTree::killDescendants(worker.pid()), 0U);
+    ASSERT_TRUE(worker.stop());
+    EXPECT_GT(Fleet::killDescendants(worker.pid()), 0U);
     for (pid_t pid : tree) {
-        EXPECT_TRUE(ProcessTree::hasEnded(pid)) << pid;
+        EXPECT_TRUE(Fleet::hasEnded(pid)) << pid;
     }
-    kill(worker.pid(), SIGCONT);
+    worker.resume();
 
     EXPECT_EQ(readToEnd(worker).rfind("survived ", 0), 0U) << worker.result();
     while (!worker.reap()) {
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }
     for (pid_t pid : tree) {
-        EXPECT_TRUE(ProcessTree::hasEnded(pid)) << pid;
+        EXPECT_TRUE(Fleet::hasEnded(pid)) << pid;
     }
 }
 
@@ -93,7 +93,7 @@ TEST(ProcessTree, KillingWithoutDescendantsSendsNothing) {
     ChildProcess worker([] { return std::string("done"); });
     ASSERT_TRUE(worker.isStarted());
     EXPECT_EQ(readToEnd(worker), "done");
-    EXPECT_EQ(ProcessTree::killDescendants(worker.pid()), 0U);
+    EXPECT_EQ(Fleet::killDescendants(worker.pid()), 0U);
 }
 
 TEST(ProcessTree, ChildIsListedWithItsAgeAndCommandLine) {
@@ -102,14 +102,14 @@ TEST(ProcessTree, ChildIsListedWithItsAgeAndCommandLine) {
         return std::string();
     });
     ASSERT_TRUE(worker.isStarted());
-    auto const children = ProcessTree::childrenOf(getpid());
+    auto const children = Fleet::childrenOf(getpid());
     EXPECT_NE(std::find(children.begin(), children.end(), worker.pid()), children.end());
     // The shell's own process becomes the sleep once it has run exec.
     std::vector<pid_t> const sleeper = waitForLiveDescendants(worker.pid(), 1);
     ASSERT_FALSE(sleeper.empty());
     EXPECT_NE(waitForCommandLine(sleeper.front(), "sleep 300").find("sleep 300"),
               std::string::npos);
-    auto const age = ProcessTree::ageOf(sleeper.front());
+    auto const age = Fleet::ageOf(sleeper.front());
     ASSERT_TRUE(age.has_value());
     EXPECT_GE(*age, 0.0);
     EXPECT_LT(*age, 60.0);
@@ -117,46 +117,47 @@ TEST(ProcessTree, ChildIsListedWithItsAgeAndCommandLine) {
     kill(sleeper.front(), SIGKILL);
 }
 
-TEST(ProcessTree, StoppingAChildThatEndedGivesItsStatus) {
-    ChildProcess worker([] { return std::string(); });
-    ASSERT_TRUE(worker.isStarted());
-    readToEnd(worker);
-    std::this_thread::sleep_for(std::chrono::milliseconds(100));
-    int status = -1;
-    EXPECT_FALSE(ProcessTree::stopChild(worker.pid(), status));
-    worker.markReaped();
+TEST(ProcessTree, StoppingAChildThatEndedReapsItAndGivesItsExitStatus) {
+    pid_t const child = fork();
+    ASSERT_GE(child, 0);
+    if (child == 0) {
+        _exit(3);
+    }
+    while (!Fleet::hasEnded(child)) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+    Fleet::ChildStop const stop = Fleet::stopChild(child);
+    EXPECT_EQ(stop.state, Fleet::ChildStop::State::Ended);
+    ASSERT_TRUE(WIFEXITED(stop.waitStatus));
+    EXPECT_EQ(WEXITSTATUS(stop.waitStatus), 3);
+    EXPECT_EQ(waitpid(child, nullptr, WNOHANG), -1) << "the child was not reaped";
+}
+
+TEST(ProcessTree, StoppingALiveChildLeavesItStopped) {
+    pid_t const child = fork();
+    ASSERT_GE(child, 0);
+    if (child == 0) {
+        pause();
+        _exit(0);
+    }
+    Fleet::ChildStop const stop = Fleet::stopChild(child);
+    EXPECT_EQ(stop.state, Fleet::ChildStop::State::Stopped);
+    EXPECT_TRUE(WIFSTOPPED(stop.waitStatus));
+    kill(child, SIGKILL);
+    waitpid(child, nullptr, 0);
+}
+
+TEST(ProcessTree, StoppingAProcessThatIsNoChildSaysItIsGoneWithErrno) {
+    Fleet::ChildStop const stop = Fleet::stopChild(0x7ffffff0);
+    EXPECT_EQ(stop.state, Fleet::ChildStop::State::Gone);
+    EXPECT_EQ(stop.error, ESRCH);
 }
 
 TEST(ProcessTree, ProcessThatIsGoneHasEndedAndNoAge) {
-    EXPECT_TRUE(ProcessTree::hasEnded(0x7ffffff0));
-    EXPECT_FALSE(ProcessTree::ageOf(0x7ffffff0).has_value());
-    EXPECT_EQ(ProcessTree::commandLineOf(0x7ffffff0), "");
-    EXPECT_TRUE(ProcessTree::childrenOf(0x7ffffff0).empty());
-}
-
-TEST(ChildProcess, StopNoteLeftByTheParentIsReadInTheChild) {
-    // The child waits until the parent has left the note, then reports it.
-    ChildProcess worker([] {
-        while (ChildProcess::stopNote().empty()) {
-            std::this_thread::sleep_for(std::chrono::milliseconds(5));
-        }
-        return ChildProcess::stopNote();
-    });
-    ASSERT_TRUE(worker.isStarted());
-    worker.setStopNote("Stopped by the time limit of 2 s after 2.0 s.");
-    EXPECT_EQ(readToEnd(worker), "Stopped by the time limit of 2 s after 2.0 s.");
-}
-
-TEST(ChildProcess, NoNoteOutsideAChild) {
-    EXPECT_EQ(ChildProcess::stopNote(), "");
-}
-
-TEST(ChildProcess, ChildRunsInAProcessGroupOfItsOwn) {
-    ChildProcess worker([] { return std::to_string(getpgrp()) + " " + std::to_string(getpid()); });
-    ASSERT_TRUE(worker.isStarted());
-    std::string const text = readToEnd(worker);
-    std::string const pid = std::to_string(worker.pid());
-    EXPECT_EQ(text, pid + " " + pid);
+    EXPECT_TRUE(Fleet::hasEnded(0x7ffffff0));
+    EXPECT_FALSE(Fleet::ageOf(0x7ffffff0).has_value());
+    EXPECT_EQ(Fleet::commandLineOf(0x7ffffff0), "");
+    EXPECT_TRUE(Fleet::childrenOf(0x7ffffff0).empty());
 }
 
 } // namespace

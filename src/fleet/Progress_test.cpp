@@ -4,7 +4,6 @@
 
 namespace {
 
-using Fleet::Progress;
 using Fleet::ProgressFigures;
 
 ProgressFigures exampleFigures() {
@@ -23,7 +22,7 @@ ProgressFigures exampleFigures() {
 }
 
 TEST(Progress, LineShowsEveryFigureInItsPlace) {
-    EXPECT_EQ(Progress::format(exampleFigures()),
+    EXPECT_EQ(Fleet::formatProgress(exampleFigures()),
               "machines 1/3  partitions 12 ok 2 failed 4 running /40  00:01:12 elapsed, "
               "~00:03:10 left  longest: 9119-MHE_21ABCDE-7 (45 s)");
 }
@@ -32,29 +31,29 @@ TEST(Progress, WithoutEstimateOrRunningPartitionTheirPlacesSaySo) {
     ProgressFigures figures;
     figures.machines = 2;
     figures.elapsedSeconds = 3.9;
-    EXPECT_EQ(Progress::format(figures),
+    EXPECT_EQ(Fleet::formatProgress(figures),
               "machines 0/2  partitions 0 ok 0 failed 0 running /0  00:00:03 elapsed, ~--:--:-- "
               "left");
 }
 
 TEST(Progress, LineIsCutToLeaveTheTerminalsLastColumnFree) {
-    std::string const line = Progress::format(exampleFigures());
-    EXPECT_EQ(Progress::fitToWidth(line, 80), line.substr(0, 79));
-    EXPECT_EQ(Progress::fitToWidth("abc", 4), "abc");
-    EXPECT_EQ(Progress::fitToWidth("abcd", 4), "abc");
-    EXPECT_EQ(Progress::fitToWidth("abcd", 1), "");
+    std::string const line = Fleet::formatProgress(exampleFigures());
+    EXPECT_EQ(Fleet::fitToWidth(line, 80), line.substr(0, 79));
+    EXPECT_EQ(Fleet::fitToWidth("abc", 4), "abc");
+    EXPECT_EQ(Fleet::fitToWidth("abcd", 4), "abc");
+    EXPECT_EQ(Fleet::fitToWidth("abcd", 1), "");
 }
 
 TEST(Progress, LineIsKeptWholeWhenTheWidthIsUnknown) {
-    std::string const line = Progress::format(exampleFigures());
-    EXPECT_EQ(Progress::fitToWidth(line, 0), line);
+    std::string const line = Fleet::formatProgress(exampleFigures());
+    EXPECT_EQ(Fleet::fitToWidth(line, 0), line);
 }
 
 TEST(Progress, ClockCountsHoursBeyondADay) {
-    EXPECT_EQ(Progress::clock(0), "00:00:00");
-    EXPECT_EQ(Progress::clock(3661.5), "01:01:01");
-    EXPECT_EQ(Progress::clock(90000), "25:00:00");
-    EXPECT_EQ(Progress::clock(-5), "00:00:00");
+    EXPECT_EQ(Fleet::clockText(0), "00:00:00");
+    EXPECT_EQ(Fleet::clockText(3661.5), "01:01:01");
+    EXPECT_EQ(Fleet::clockText(90000), "25:00:00");
+    EXPECT_EQ(Fleet::clockText(-5), "00:00:00");
 }
 
 TEST(Progress, EstimateFollowsThePaceSoFar) {
@@ -63,15 +62,15 @@ TEST(Progress, EstimateFollowsThePaceSoFar) {
     figures.failed = 1;
     figures.partitions = 10;
     figures.elapsedSeconds = 20;
-    ASSERT_TRUE(Progress::estimateLeft(figures).has_value());
-    EXPECT_DOUBLE_EQ(*Progress::estimateLeft(figures), 30.0);
+    ASSERT_TRUE(Fleet::estimateLeft(figures).has_value());
+    EXPECT_DOUBLE_EQ(*Fleet::estimateLeft(figures), 30.0);
 }
 
 TEST(Progress, NoEstimateBeforeAnyPartitionFinished) {
     ProgressFigures figures;
     figures.partitions = 10;
     figures.elapsedSeconds = 20;
-    EXPECT_FALSE(Progress::estimateLeft(figures).has_value());
+    EXPECT_FALSE(Fleet::estimateLeft(figures).has_value());
 }
 
 } // namespace

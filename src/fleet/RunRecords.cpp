@@ -31,4 +31,14 @@ void settleUnfinished(PartitionRecord& record) {
     markInterrupted(record);
 }
 
+void settleUnfinished(std::vector<MachineRecord>& machines) {
+    for (auto& machine : machines) {
+        for (auto& record : machine.partitions) {
+            if (!record.outcome) {
+                settleUnfinished(record);
+            }
+        }
+    }
+}
+
 } // namespace Fleet

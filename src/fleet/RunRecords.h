@@ -50,4 +50,8 @@ struct MachineRecord {
     std::vector<PartitionRecord> partitions;
 };
 
+// Settles every partition of the machines whose survey has not ended: the
+// run was interrupted.
+void settleUnfinished(std::vector<MachineRecord>& machines);
+
 } // namespace Fleet

@@ -55,3 +55,16 @@ TEST(RunRecords, UnfinishedPartitionIsInterruptedWithCodeEight) {
     EXPECT_EQ(record.result.statusText, "Interrupted - not surveyed");
     EXPECT_EQ(record.result.returnCode, "8");
 }
+
+TEST(RunRecords, InterruptedRunSettlesOnlyThePartitionsThatHadNotEnded) {
+    std::vector<Fleet::MachineRecord> machines(2);
+    machines[0].partitions.resize(2);
+    machines[1].partitions.resize(1);
+    Fleet::settlePartition(machines[0].partitions[0], surveyResult(Kind::Surveyed, "0", "Ok"));
+    Fleet::settleUnfinished(machines);
+    EXPECT_EQ(machines[0].partitions[0].outcome, Outcome::Surveyed);
+    EXPECT_EQ(machines[0].partitions[0].result.statusText, "Ok");
+    EXPECT_EQ(machines[0].partitions[1].outcome, Outcome::Interrupted);
+    EXPECT_EQ(machines[1].partitions[0].outcome, Outcome::Interrupted);
+    EXPECT_EQ(machines[1].partitions[0].result.returnCode, "8");
+}

@@ -5,45 +5,64 @@
 
 #include <cerrno>
 #include <csignal>
+#include <cstring>
 
 namespace Fleet {
 
-void SignalPipe::install() {
-    int ends[2];
-    if (pipe2(ends, O_CLOEXEC | O_NONBLOCK) != 0) {
-        return;
-    }
-    ms_readEnd = ends[0];
-    ms_writeEnd = ends[1];
-    struct sigaction action {};
-    action.sa_handler = &SignalPipe::_handle;
-    sigemptyset(&action.sa_mask);
-    action.sa_flags = SA_RESTART;
-    sigaction(SIGINT, &action, nullptr);
-    sigaction(SIGTERM, &action, nullptr);
-}
+namespace {
 
-int SignalPipe::readDescriptor() {
-    return ms_readEnd;
-}
+int readEnd = -1;
+int writeEnd = -1;
+int firstSignal = 0;
 
-void SignalPipe::_handle(int signalNumber) {
+void handleSignal(int signalNumber) {
     int const savedErrno = errno;
     auto const byte = static_cast<unsigned char>(signalNumber);
     // A full pipe already holds a signal for the loop; this one adds nothing.
-    ssize_t const written = write(ms_writeEnd, &byte, 1);
+    ssize_t const written = write(writeEnd, &byte, 1);
     static_cast<void>(written);
     errno = savedErrno;
 }
 
-int SignalPipe::takeSignal() {
+std::string failure(char const* operation) {
+    return std::string(operation) + ": " + std::strerror(errno);
+}
+
+} // namespace
+
+std::optional<std::string> installSignalPipe() {
+    int ends[2];
+    if (pipe2(ends, O_CLOEXEC | O_NONBLOCK) != 0) {
+        return failure("cannot create the signal pipe");
+    }
+    readEnd = ends[0];
+    writeEnd = ends[1];
+    struct sigaction action {};
+    action.sa_handler = &handleSignal;
+    sigemptyset(&action.sa_mask);
+    action.sa_flags = SA_RESTART;
+    if (sigaction(SIGINT, &action, nullptr) != 0 || sigaction(SIGTERM, &action, nullptr) != 0) {
+        return failure("cannot handle SIGINT and SIGTERM");
+    }
+    return std::nullopt;
+}
+
+int signalPipeDescriptor() {
+    return readEnd;
+}
+
+int takeSignal() {
     unsigned char byte = 0;
-    while (ms_readEnd >= 0 && read(ms_readEnd, &byte, 1) == 1) {
-        if (ms_firstSignal == 0) {
-            ms_firstSignal = byte;
+    while (readEnd >= 0 && read(readEnd, &byte, 1) == 1) {
+        if (firstSignal == 0) {
+            firstSignal = byte;
         }
     }
-    return ms_firstSignal;
+    return firstSignal;
+}
+
+char const* signalName(int signalNumber) {
+    return signalNumber == SIGTERM ? "SIGTERM" : "SIGINT";
 }
 
 } // namespace Fleet

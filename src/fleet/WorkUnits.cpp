@@ -40,13 +40,13 @@ std::optional<int> optionalNumber(std::string const& text) {
     }
 }
 
-} // namespace
-
-void WorkUnits::_closeTrace() {
+void closeTrace() {
     Utility::Trace::ms_FileHandle.close();
 }
 
-std::string WorkUnits::listMachines() {
+} // namespace
+
+std::string listMachines() {
     Quorvex::PYLON::ListOf_Machines machines;
     std::sort(machines.begin(), machines.end());
     FieldCodec::Record identities;
@@ -60,7 +60,7 @@ std::string WorkUnits::listMachines() {
     return FieldCodec::encode(identities);
 }
 
-std::vector<std::string> WorkUnits::decodeMachines(std::string const& text) {
+std::vector<std::string> decodeMachines(std::string const& text) {
     auto const records = FieldCodec::decode(text);
     if (!records || records->size() != 1) {
         return {};
@@ -68,7 +68,7 @@ std::vector<std::string> WorkUnits::decodeMachines(std::string const& text) {
     return records->front();
 }
 
-std::string WorkUnits::listPartitions(std::string const& identity, std::string const& tracePiece) {
+std::string listPartitions(std::string const& identity, std::string const& tracePiece) {
     std::string encoded;
     {
         Utility::Trace trace(tracePiece);
@@ -83,12 +83,12 @@ std::string WorkUnits::listPartitions(std::string const& identity, std::string c
                                            partition.get_OperatingSystem_Version()});
         }
     }
-    _closeTrace();
+    closeTrace();
     return encoded;
 }
 
-std::optional<std::vector<Quorvex::System::Partition>>
-WorkUnits::decodePartitions(std::string const& identity, std::string const& text) {
+std::optional<std::vector<Quorvex::System::Partition>> decodePartitions(std::string const& identity,
+                                                                        std::string const& text) {
     auto const records = FieldCodec::decode(text);
     if (!records) {
         return std::nullopt;
@@ -112,22 +112,22 @@ WorkUnits::decodePartitions(std::string const& identity, std::string const& text
     return partitions;
 }
 
-std::string WorkUnits::surveyPartition(Quorvex::System::Partition const& partition,
-                                       std::string const& tracePiece) {
+std::string surveyPartition(Quorvex::System::Partition const& partition,
+                            std::string const& tracePiece) {
     PartitionOutcome outcome;
     {
         Utility::Trace trace(tracePiece);
         outcome = Quorvex::PYLON::VPD::Survey_ClientPartition::survey_Partition(
             partition, &ChildProcess::stopNote);
     }
-    _closeTrace();
+    closeTrace();
     return FieldCodec::encode({outcome.fileName, outcome.returnCode, outcome.statusText,
                                std::to_string(static_cast<int>(outcome.kind)),
                                optionalText(outcome.rc), optionalText(outcome.rcCmd),
                                outcome.reason});
 }
 
-std::optional<PartitionOutcome> WorkUnits::decodeOutcome(std::string const& text) {
+std::optional<PartitionOutcome> decodeOutcome(std::string const& text) {
     auto const records = FieldCodec::decode(text);
     if (!records || records->size() != 1 || records->front().size() != gc_OutcomeFields) {
         return std::nullopt;

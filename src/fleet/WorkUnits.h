@@ -13,29 +13,23 @@ namespace Fleet {
 // the parent. Each body runs in a child process of its own: the survey code
 // keeps one trace and runs commands with system(), which only one unit may
 // use per process.
-class WorkUnits {
-public:
-    // The identities of the managed machines of object type 0, in the
-    // listing's sorted order, each once. Traces nothing.
-    static std::string listMachines();
-    static std::vector<std::string> decodeMachines(std::string const& text);
 
-    // Opens the trace on tracePiece, writes the line the tool's trace starts
-    // with and lists the machine's partitions.
-    static std::string listPartitions(std::string const& identity, std::string const& tracePiece);
-    // nullopt when the result is cut short (the child did not finish).
-    static std::optional<std::vector<Quorvex::System::Partition>>
-    decodePartitions(std::string const& identity, std::string const& text);
+// The identities of the managed machines of object type 0, in the listing's
+// sorted order, each once. Traces nothing.
+std::string listMachines();
+std::vector<std::string> decodeMachines(std::string const& text);
 
-    // Opens the trace on tracePiece and surveys the partition; a remote
-    // action stopped by the parent gets the note the parent left.
-    static std::string surveyPartition(Quorvex::System::Partition const& partition,
-                                       std::string const& tracePiece);
-    static std::optional<Quorvex::PYLON::VPD::PartitionOutcome>
-    decodeOutcome(std::string const& text);
+// Opens the trace on tracePiece, writes the line the tool's trace starts
+// with and lists the machine's partitions.
+std::string listPartitions(std::string const& identity, std::string const& tracePiece);
+// nullopt when the result is cut short (the child did not finish).
+std::optional<std::vector<Quorvex::System::Partition>> decodePartitions(std::string const& identity,
+                                                                        std::string const& text);
 
-private:
-    static void _closeTrace();
-};
+// Opens the trace on tracePiece and surveys the partition; a remote action
+// stopped by the parent gets the note the parent left.
+std::string surveyPartition(Quorvex::System::Partition const& partition,
+                            std::string const& tracePiece);
+std::optional<Quorvex::PYLON::VPD::PartitionOutcome> decodeOutcome(std::string const& text);
 
 } // namespace Fleet

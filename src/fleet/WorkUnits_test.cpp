@@ -7,13 +7,12 @@
 namespace {
 
 using Fleet::FieldCodec;
-using Fleet::WorkUnits;
 using Kind = Quorvex::PYLON::VPD::PartitionOutcomeKind;
 
 TEST(WorkUnits, PartitionsAreRebuiltWithTheMachineAndEveryField) {
     std::string const text = FieldCodec::encode({"7", "", "3", "aurora", "Zeph", "7.2"}) +
                              FieldCodec::encode({"7", "10.0.0.1", " 3x", "", "", ""});
-    auto const partitions = WorkUnits::decodePartitions("9119-MHE_21ABCDE", text);
+    auto const partitions = Fleet::decodePartitions("9119-MHE_21ABCDE", text);
     ASSERT_TRUE(partitions.has_value());
     ASSERT_EQ(partitions->size(), 2U);
     auto const& first = (*partitions)[0];
@@ -27,12 +26,12 @@ TEST(WorkUnits, PartitionsAreRebuiltWithTheMachineAndEveryField) {
 }
 
 TEST(WorkUnits, ListingCutShortIsRejected) {
-    EXPECT_FALSE(WorkUnits::decodePartitions("A-1_B", "6:1:7").has_value());
-    EXPECT_FALSE(WorkUnits::decodePartitions("A-1_B", FieldCodec::encode({"7"})).has_value());
+    EXPECT_FALSE(Fleet::decodePartitions("A-1_B", "6:1:7").has_value());
+    EXPECT_FALSE(Fleet::decodePartitions("A-1_B", FieldCodec::encode({"7"})).has_value());
 }
 
 TEST(WorkUnits, EmptyListingGivesNoPartitions) {
-    auto const partitions = WorkUnits::decodePartitions("A-1_B", "");
+    auto const partitions = Fleet::decodePartitions("A-1_B", "");
     ASSERT_TRUE(partitions.has_value());
     EXPECT_TRUE(partitions->empty());
 }
@@ -40,7 +39,7 @@ TEST(WorkUnits, EmptyListingGivesNoPartitions) {
 TEST(WorkUnits, OutcomeFieldsAreReadBack) {
     std::string const text = FieldCodec::encode(
         {"VPD/f.VPD.xml", "8", "get result Failed, rc = 3", "4", "3", "0", "reason\n"});
-    auto const outcome = WorkUnits::decodeOutcome(text);
+    auto const outcome = Fleet::decodeOutcome(text);
     ASSERT_TRUE(outcome.has_value());
     EXPECT_EQ(outcome->fileName, "VPD/f.VPD.xml");
     EXPECT_EQ(outcome->returnCode, "8");
@@ -52,8 +51,7 @@ TEST(WorkUnits, OutcomeFieldsAreReadBack) {
 }
 
 TEST(WorkUnits, MissingCodesStayUnknown) {
-    auto const outcome =
-        WorkUnits::decodeOutcome(FieldCodec::encode({"", "8", "x", "1", "", "", ""}));
+    auto const outcome = Fleet::decodeOutcome(FieldCodec::encode({"", "8", "x", "1", "", "", ""}));
     ASSERT_TRUE(outcome.has_value());
     EXPECT_EQ(outcome->kind, Kind::Inactive);
     EXPECT_FALSE(outcome->rc.has_value());
@@ -61,16 +59,16 @@ TEST(WorkUnits, MissingCodesStayUnknown) {
 }
 
 TEST(WorkUnits, OutcomeOfAChildThatDiedIsRejected) {
-    EXPECT_FALSE(WorkUnits::decodeOutcome("").has_value());
-    EXPECT_FALSE(WorkUnits::decodeOutcome(FieldCodec::encode({"a", "b"})).has_value());
+    EXPECT_FALSE(Fleet::decodeOutcome("").has_value());
+    EXPECT_FALSE(Fleet::decodeOutcome(FieldCodec::encode({"a", "b"})).has_value());
     EXPECT_FALSE(
-        WorkUnits::decodeOutcome(FieldCodec::encode({"", "8", "x", "9", "", "", ""})).has_value());
+        Fleet::decodeOutcome(FieldCodec::encode({"", "8", "x", "9", "", "", ""})).has_value());
 }
 
 TEST(WorkUnits, MachineListIsOneRecordOfIdentities) {
-    EXPECT_EQ(WorkUnits::decodeMachines(FieldCodec::encode({"A-1_B", "C-2_D"})),
+    EXPECT_EQ(Fleet::decodeMachines(FieldCodec::encode({"A-1_B", "C-2_D"})),
               (std::vector<std::string>{"A-1_B", "C-2_D"}));
-    EXPECT_TRUE(WorkUnits::decodeMachines("").empty());
+    EXPECT_TRUE(Fleet::decodeMachines("").empty());
 }
 
 } // namespace

@@ -1,56 +1,45 @@
-#include "fleet/ChildProcess.h"
 #include "fleet/CommandLine.h"
-#include "fleet/ProcessTree.h"
 #include "fleet/RunFiles.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
+#include "fleet/TimeLimits.h"
 #include "fleet/WorkUnits.h"
+#include "fleet/WorkerPool.h"
 #include "report/ReportCommand.h"
 #include "report/RunSummary.h"
 #include "utility/LocalTime.h"
 #include "utility/Trace.h"
 
-#include <poll.h>
-
 #include <chrono>
-#include <csignal>
 #include <ctime>
 #include <iostream>
 
 namespace {
 
-constexpr int gc_PollMilliseconds = 50;
-
-// The console's managed machines, listed in a child of its own so that this
-// process never writes through the survey code's trace. A listing that runs
-// past the time limit, or an interruption, stops it with everything it
-// started; the run then has no machines.
+// The console's managed machines, listed in a worker of its own so that this
+// process never writes through the survey code's trace. A listing action that
+// runs past the time limit, or an interruption, stops the listing with
+// everything it started, and it never goes on: the run then has no machines.
 std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
-    Fleet::ChildProcess lister(&Fleet::WorkUnits::listMachines);
-    if (!lister.isStarted()) {
+    Fleet::WorkerPool pool(Fleet::signalPipeDescriptor());
+    Fleet::TimeLimits limits(timeoutSeconds);
+    if (std::optional<std::string> const failure =
+            pool.start(0, Fleet::UnitKind::MachineListing, &Fleet::listMachines)) {
+        std::cerr << "quorvex-survey: cannot list the managed machines: " << *failure << std::endl;
         return {};
     }
-    auto const started = std::chrono::steady_clock::now();
-    while (lister.readAvailable()) {
-        pollfd descriptors[] = {{lister.resultDescriptor(), POLLIN, 0},
-                                {Fleet::SignalPipe::readDescriptor(), POLLIN, 0}};
-        poll(descriptors, 2, gc_PollMilliseconds);
-        std::chrono::duration<double> const elapsed = std::chrono::steady_clock::now() - started;
-        bool const overLimit = timeoutSeconds > 0 && elapsed.count() >= timeoutSeconds;
-        if (overLimit || Fleet::SignalPipe::takeSignal() != 0) {
-            int status = 0;
-            if (Fleet::ProcessTree::stopChild(lister.pid(), status)) {
-                Fleet::ProcessTree::killDescendants(lister.pid());
-                lister.killAndReap();
-            } else {
-                lister.markReaped();
-            }
+    while (true) {
+        std::vector<Fleet::WorkerEvent> const ended = pool.waitForEvents();
+        if (!ended.empty()) {
+            return Fleet::decodeMachines(ended.front().text);
+        }
+        limits.interrupt(Fleet::takeSignal());
+        if (!pool.stopDueActions(limits).empty() || limits.isInterrupted()) {
+            // The pool ends the stopped worker with everything it started.
             return {};
         }
     }
-    lister.killAndReap();
-    return Fleet::WorkUnits::decodeMachines(lister.result());
 }
 
 void writeSummary(Fleet::RunFacts const& facts, nlohmann::ordered_json const& summary) {
@@ -58,6 +47,31 @@ void writeSummary(Fleet::RunFacts const& facts, nlohmann::ordered_json const& su
     if (!Fleet::RunFiles::writeAtomically(facts.options.summaryFile, text)) {
         std::cerr << "quorvex-survey: cannot write the summary to " << facts.options.summaryFile
                   << std::endl;
+    }
+}
+
+// The summary and the report of a run that has ended.
+void writeRunFiles(Fleet::Options const& options, Fleet::SurveyRun const& run, int exitStatus,
+                   std::time_t started, std::chrono::steady_clock::time_point startedAt) {
+    Fleet::RunFacts facts;
+    facts.options = options;
+    // Every unit of work has ended: the host name command may trace here.
+    facts.consoleHost = Utility::get_HostName();
+    facts.started = util::localTimeText(started);
+    facts.ended = util::localTimeText(std::time(nullptr));
+    facts.elapsedSeconds =
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - startedAt).count();
+    if (run.interruptingSignal() != 0) {
+        facts.interruptedBy = Fleet::signalName(run.interruptingSignal());
+    }
+    facts.exitStatus = exitStatus;
+    nlohmann::ordered_json const summary =
+        report::summaryDocument(Fleet::runSummary(facts, run.machines()));
+    if (!options.summaryFile.empty()) {
+        writeSummary(facts, summary);
+    }
+    if (!options.reportFolder.empty()) {
+        report::writeRunReport(summary, options.reportFolder, std::cerr);
     }
 }
 
@@ -74,7 +88,9 @@ int main(int argc, char** argv) {
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;
     }
-    Fleet::SignalPipe::install();
+    if (std::optional<std::string> const failure = Fleet::installSignalPipe()) {
+        std::cerr << "quorvex-survey: " << *failure << std::endl;
+    }
     auto const startedAt = std::chrono::steady_clock::now();
     std::time_t const started = std::time(nullptr);
 
@@ -85,26 +101,7 @@ int main(int argc, char** argv) {
     int const exitStatus = run.run();
 
     if (!options.summaryFile.empty() || !options.reportFolder.empty()) {
-        Fleet::RunFacts facts;
-        facts.options = options;
-        // Every unit of work has ended: the host name command may trace here.
-        facts.consoleHost = Utility::get_HostName();
-        facts.started = util::localTimeText(started);
-        facts.ended = util::localTimeText(std::time(nullptr));
-        facts.elapsedSeconds =
-            std::chrono::duration<double>(std::chrono::steady_clock::now() - startedAt).count();
-        if (run.interruptingSignal() != 0) {
-            facts.interruptedBy = run.interruptingSignal() == SIGTERM ? "SIGTERM" : "SIGINT";
-        }
-        facts.exitStatus = exitStatus;
-        nlohmann::ordered_json const summary =
-            report::summaryDocument(Fleet::runSummary(facts, run.machines()));
-        if (!options.summaryFile.empty()) {
-            writeSummary(facts, summary);
-        }
-        if (!options.reportFolder.empty()) {
-            report::writeRunReport(summary, options.reportFolder, std::cerr);
-        }
+        writeRunFiles(options, run, exitStatus, started, startedAt);
     }
     return exitStatus;
 }

@@ -3,6 +3,7 @@
 //   TestConstants.h      result folders, the example machine, the source tree
 //   TemporaryFiles.h     temporary and scratch folders, exact file contents
 //   ChildProcess.h       commands and code in child and fresh processes
+//   DescriptorLimit.h    a process that can open no more descriptors
 //   Sandbox.h            the sandbox runner and a read-only /tmp
 //   SimulatedConsole.h   the simulated console and its invocation log
 //   Normalise.h          temporary file names and time stamps made fixed
@@ -16,6 +17,7 @@
 //   FlushCountingBuffer.h a string buffer counting its flushes
 
 #include "ChildProcess.h"
+#include "DescriptorLimit.h"
 #include "ExpectedOutput.h"
 #include "FlushCountingBuffer.h"
 #include "Lines.h"

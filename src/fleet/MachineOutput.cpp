@@ -1,0 +1,80 @@
+#include "fleet/MachineOutput.h"
+
+#include "fleet/MachineReport.h"
+#include "fleet/RunFiles.h"
+#include "survey/calculate_ReturnCode.h"
+
+#include <algorithm>
+#include <cstdio>
+
+namespace Fleet {
+
+MachineOutput::MachineOutput(std::vector<MachineRecord> const& machines, ProgressLine& line)
+    : _machines(machines), _line(line) {}
+
+std::size_t MachineOutput::takeSlot() {
+    auto const free = std::find(_slotInUse.begin(), _slotInUse.end(), false);
+    std::size_t const slot = static_cast<std::size_t>(free - _slotInUse.begin());
+    if (free == _slotInUse.end()) {
+        _slotInUse.push_back(true);
+    } else {
+        *free = true;
+    }
+    return slot;
+}
+
+void MachineOutput::releaseSlot(std::size_t slot) {
+    _slotInUse[slot] = false;
+}
+
+std::string MachineOutput::tracePiece(std::size_t machine, std::size_t slot) const {
+    return RunFiles::tracePiece(_machines[machine].identity, slot);
+}
+
+void MachineOutput::writeReady(Scheduler const& scheduler) {
+    while (_written < _machines.size() && scheduler.isMachineDone(_written)) {
+        _write(_written);
+        ++_written;
+    }
+}
+
+void MachineOutput::writeRest() {
+    while (_written < _machines.size()) {
+        _write(_written);
+        ++_written;
+    }
+}
+
+std::size_t MachineOutput::writtenCount() const {
+    return _written;
+}
+
+bool MachineOutput::isAllWritten() const {
+    return _written == _machines.size();
+}
+
+void MachineOutput::_write(std::size_t index) {
+    MachineRecord const& machine = _machines[index];
+    _removeTracePieces(machine.identity);
+    if (!machine.listed) {
+        // A listing stopped by an interruption leaves no files and prints nothing.
+        return;
+    }
+    _line.erase();
+    MachineReport::print(machine);
+    // The block ends with the code digit and no line end.
+    _line.leaveOpenRow(std::string(get_OverallCode(MachineReport::returnCodes(machine))).size());
+    RunFiles::writeAtomically(RunFiles::statusFile(machine.identity),
+                              MachineReport::statusText(machine));
+    if (auto const trace = MachineReport::traceText(machine)) {
+        RunFiles::writeAtomically(RunFiles::traceFile(machine.identity), *trace);
+    }
+}
+
+void MachineOutput::_removeTracePieces(std::string const& identity) const {
+    for (std::size_t slot = 0; slot < _slotInUse.size(); ++slot) {
+        std::remove(RunFiles::tracePiece(identity, slot).c_str());
+    }
+}
+
+} // namespace Fleet
