@@ -17,7 +17,7 @@
 #include <new>
 #include <utility>
 
-namespace Fleet {
+namespace fleet {
 
 ChildProcess::Slot* ChildProcess::ms_ownSlot = nullptr;
 
@@ -221,4 +221,4 @@ void ChildProcess::setStopNote(std::string const& note) {
     _slot->hasNote.store(1);
 }
 
-} // namespace Fleet
+} // namespace fleet

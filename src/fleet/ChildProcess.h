@@ -7,7 +7,7 @@
 #include <optional>
 #include <string>
 
-namespace Fleet {
+namespace fleet {
 
 // One unit of work run in a forked process of its own. The child runs in a
 // process group of its own (a terminal's Ctrl-C reaches only the run's
@@ -76,4 +76,4 @@ private:
     bool _stopped = false;
 };
 
-} // namespace Fleet
+} // namespace fleet

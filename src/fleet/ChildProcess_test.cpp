@@ -16,7 +16,7 @@
 
 namespace {
 
-using Fleet::ChildProcess;
+using fleet::ChildProcess;
 
 // A bound on work that must not hang: a wait on a worker left stopped would
 // never end, and SIGALRM ends the process that runs the work instead.
@@ -103,7 +103,7 @@ TEST(ChildProcess, StoppedChildGoesOnToItsEndOnceResumed) {
 TEST(ChildProcess, ChildThatEndedIsReapedInsteadOfStopped) {
     ChildProcess worker([] { return std::string("done"); });
     readToEnd(worker);
-    while (!Fleet::hasEnded(worker.pid())) {
+    while (!fleet::hasEnded(worker.pid())) {
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }
     EXPECT_FALSE(worker.stop());
@@ -126,15 +126,15 @@ TEST(ChildProcess, StoppedChildIsKilledAndReapedWithEverythingItStarted) {
     QuorvexTest::CommandResult const result = QuorvexTest::runInChild([] {
         alarm(gc_HangSeconds);
         ChildProcess worker(&sleepLong);
-        while (Fleet::descendantsOf(worker.pid()).empty()) {
+        while (fleet::descendantsOf(worker.pid()).empty()) {
             std::this_thread::sleep_for(std::chrono::milliseconds(10));
         }
-        std::vector<pid_t> const started = Fleet::descendantsOf(worker.pid());
+        std::vector<pid_t> const started = fleet::descendantsOf(worker.pid());
         if (!worker.stop()) {
             return 1;
         }
         worker.killAndReap();
-        if (!std::all_of(started.begin(), started.end(), &Fleet::hasEnded)) {
+        if (!std::all_of(started.begin(), started.end(), &fleet::hasEnded)) {
             return 2;
         }
         return worker.isReaped() && !worker.isStopped() ? 0 : 3;

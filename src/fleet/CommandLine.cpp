@@ -6,7 +6,7 @@
 #include <iostream>
 #include <set>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -19,14 +19,8 @@ std::string const& versionText() {
     return text;
 }
 
-} // namespace
-
-CommandLine::Parsed CommandLine::parse(int argc, char const* const* argv) {
-    Parsed parsed;
-    Options& options = parsed.options;
-    CLI::App app{"Surveys the client partitions of the PYLON console's managed machines, "
-                 "several partitions at a time.",
-                 gc_ProgramName};
+// The survey's options; the report subcommand adds its own.
+void addSurveyOptions(CLI::App& app, Options& options) {
     // Defaults are shown for the numbers only: CLI11 2.1 reads past the end of
     // an empty list when it captures the identities' default.
     app.add_option("-j,--jobs", options.jobs,
@@ -47,40 +41,22 @@ CommandLine::Parsed CommandLine::parse(int argc, char const* const* argv) {
         app.add_option("IDENTITY", options.identities, "Managed machine (type-model_serial)");
     identities->excludes(all);
     report::addReportOption(app, options.reportFolder);
-    report::ReportRequest reportRequest;
-    CLI::App const* const reportCommand = report::addReportSubcommand(app, reportRequest);
-    app.set_version_flag("--version", versionText());
-    try {
-        app.parse(argc, argv);
-        if (reportCommand->parsed()) {
-            parsed.reportRequest = reportRequest;
-            return parsed;
-        }
-        if (!options.all && options.identities.empty()) {
-            throw CLI::RequiredError("IDENTITY or --all");
-        }
-        if (std::any_of(options.identities.begin(), options.identities.end(),
-                        [](std::string const& identity) { return identity.empty(); })) {
-            throw CLI::ValidationError("IDENTITY", "an identity must not be empty");
-        }
-    } catch (CLI::CallForHelp const&) {
-        std::cout << app.help();
-        parsed.exitStatus = 0;
-        return parsed;
-    } catch (CLI::CallForVersion const&) {
-        std::cout << versionText() << "\n";
-        parsed.exitStatus = 0;
-        return parsed;
-    } catch (CLI::ParseError const& error) {
-        std::cerr << gc_ProgramName << ": " << error.what() << "\n" << app.help();
-        parsed.exitStatus = gc_ExitUsage;
-        return parsed;
-    }
-    _keepFirstOfEach(parsed);
-    return parsed;
 }
 
-void CommandLine::_keepFirstOfEach(Parsed& parsed) {
+// What CLI11 cannot say: a survey needs machines, and no identity is empty.
+void checkMachines(Options const& options) {
+    if (!options.all && options.identities.empty()) {
+        throw CLI::RequiredError("IDENTITY or --all");
+    }
+    if (std::any_of(options.identities.begin(), options.identities.end(),
+                    [](std::string const& identity) { return identity.empty(); })) {
+        throw CLI::ValidationError("IDENTITY", "an identity must not be empty");
+    }
+}
+
+// An identity given more than once is surveyed once, at its first place,
+// with one warning.
+void keepFirstOfEach(ParsedCommandLine& parsed) {
     std::vector<std::string> kept;
     std::set<std::string> seen;
     std::set<std::string> warned;
@@ -95,4 +71,43 @@ void CommandLine::_keepFirstOfEach(Parsed& parsed) {
     parsed.options.identities = kept;
 }
 
-} // namespace Fleet
+// The program ends here: --help, --version, or a bad command line.
+ParsedCommandLine endingWith(int exitStatus) {
+    ParsedCommandLine parsed;
+    parsed.exitStatus = exitStatus;
+    return parsed;
+}
+
+} // namespace
+
+ParsedCommandLine parseCommandLine(int argc, char const* const* argv) {
+    ParsedCommandLine parsed;
+    CLI::App app{"Surveys the client partitions of the PYLON console's managed machines, "
+                 "several partitions at a time.",
+                 gc_ProgramName};
+    addSurveyOptions(app, parsed.options);
+    report::ReportRequest reportRequest;
+    CLI::App const* const reportCommand = report::addReportSubcommand(app, reportRequest);
+    app.set_version_flag("--version", versionText());
+    try {
+        app.parse(argc, argv);
+        if (reportCommand->parsed()) {
+            parsed.reportRequest = reportRequest;
+            return parsed;
+        }
+        checkMachines(parsed.options);
+    } catch (CLI::CallForHelp const&) {
+        std::cout << app.help();
+        return endingWith(0);
+    } catch (CLI::CallForVersion const&) {
+        std::cout << versionText() << "\n";
+        return endingWith(0);
+    } catch (CLI::ParseError const& error) {
+        std::cerr << gc_ProgramName << ": " << error.what() << "\n" << app.help();
+        return endingWith(gc_ExitUsage);
+    }
+    keepFirstOfEach(parsed);
+    return parsed;
+}
+
+} // namespace fleet

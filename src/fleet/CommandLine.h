@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-namespace Fleet {
+namespace fleet {
 
 // The run's options as given on the command line.
 struct Options {
@@ -26,24 +26,18 @@ struct Options {
 // and the usage on standard error and ends the program with 64 before
 // anything runs; --help and --version print on standard output and end it
 // with 0.
-class CommandLine {
-public:
-    struct Parsed {
-        Options options;
-        // Set when the program ends here with this status.
-        std::optional<int> exitStatus;
-        // Warnings to print on standard error before anything else.
-        std::vector<std::string> warnings;
-        // Set for "report [--from VPD_FOLDER] DIR", which surveys nothing.
-        std::optional<report::ReportRequest> reportRequest;
-    };
-
-    static constexpr int gc_ExitUsage = 64;
-
-    static Parsed parse(int argc, char const* const* argv);
-
-private:
-    static void _keepFirstOfEach(Parsed& parsed);
+struct ParsedCommandLine {
+    Options options;
+    // Set when the program ends here with this status.
+    std::optional<int> exitStatus;
+    // Warnings to print on standard error before anything else.
+    std::vector<std::string> warnings;
+    // Set for "report [--from VPD_FOLDER] DIR", which surveys nothing.
+    std::optional<report::ReportRequest> reportRequest;
 };
 
-} // namespace Fleet
+constexpr int gc_ExitUsage = 64;
+
+ParsedCommandLine parseCommandLine(int argc, char const* const* argv);
+
+} // namespace fleet

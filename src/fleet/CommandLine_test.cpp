@@ -9,11 +9,12 @@
 
 namespace {
 
-using Fleet::CommandLine;
+using fleet::parseCommandLine;
+using fleet::ParsedCommandLine;
 
 // Parses argv with both standard streams captured.
 struct ParseRun {
-    CommandLine::Parsed parsed;
+    ParsedCommandLine parsed;
     std::string out;
     std::string err;
 };
@@ -28,7 +29,7 @@ ParseRun parse(std::vector<std::string> arguments) {
     std::ostringstream err;
     std::streambuf* const oldOut = std::cout.rdbuf(out.rdbuf());
     std::streambuf* const oldErr = std::cerr.rdbuf(err.rdbuf());
-    ParseRun run{CommandLine::parse(static_cast<int>(argv.size()), argv.data()), "", ""};
+    ParseRun run{parseCommandLine(static_cast<int>(argv.size()), argv.data()), "", ""};
     std::cout.rdbuf(oldOut);
     std::cerr.rdbuf(oldErr);
     run.out = out.str();

@@ -3,7 +3,7 @@
 #include <cctype>
 #include <limits>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -13,39 +13,8 @@ void appendCounted(std::string& text, std::string const& field) {
     text += field;
 }
 
-} // namespace
-
-std::string FieldCodec::encode(Record const& record) {
-    std::string text = std::to_string(record.size()) + ":";
-    for (auto const& field : record) {
-        appendCounted(text, field);
-    }
-    return text;
-}
-
-std::optional<std::vector<FieldCodec::Record>> FieldCodec::decode(std::string const& text) {
-    std::vector<Record> records;
-    std::size_t position = 0;
-    while (position < text.size()) {
-        std::size_t count = 0;
-        if (!_readNumber(text, position, count) || count > text.size() - position) {
-            return std::nullopt;
-        }
-        Record record;
-        for (std::size_t i = 0; i < count; ++i) {
-            std::size_t length = 0;
-            if (!_readNumber(text, position, length) || length > text.size() - position) {
-                return std::nullopt;
-            }
-            record.push_back(text.substr(position, length));
-            position += length;
-        }
-        records.push_back(std::move(record));
-    }
-    return records;
-}
-
-bool FieldCodec::_readNumber(std::string const& text, std::size_t& position, std::size_t& number) {
+// Reads "<decimal>:" at position and moves past it.
+bool readNumber(std::string const& text, std::size_t& position, std::size_t& number) {
     constexpr std::size_t limit = std::numeric_limits<std::size_t>::max() / 10 - 9;
     std::size_t value = 0;
     std::size_t digits = 0;
@@ -65,4 +34,36 @@ bool FieldCodec::_readNumber(std::string const& text, std::size_t& position, std
     return true;
 }
 
-} // namespace Fleet
+} // namespace
+
+std::string encodeFields(FieldRecord const& record) {
+    std::string text = std::to_string(record.size()) + ":";
+    for (auto const& field : record) {
+        appendCounted(text, field);
+    }
+    return text;
+}
+
+std::optional<std::vector<FieldRecord>> decodeFields(std::string const& text) {
+    std::vector<FieldRecord> records;
+    std::size_t position = 0;
+    while (position < text.size()) {
+        std::size_t count = 0;
+        if (!readNumber(text, position, count) || count > text.size() - position) {
+            return std::nullopt;
+        }
+        FieldRecord record;
+        for (std::size_t i = 0; i < count; ++i) {
+            std::size_t length = 0;
+            if (!readNumber(text, position, length) || length > text.size() - position) {
+                return std::nullopt;
+            }
+            record.push_back(text.substr(position, length));
+            position += length;
+        }
+        records.push_back(std::move(record));
+    }
+    return records;
+}
+
+} // namespace fleet

@@ -1,5 +1,8 @@
 #include "fleet/MachineOutput.h"
 
+#include "utility/AtomicFile.h"
+#include "utility/SystemError.h"
+
 #include "fleet/MachineReport.h"
 #include "fleet/RunFiles.h"
 #include "survey/calculate_ReturnCode.h"
@@ -7,7 +10,7 @@
 #include <algorithm>
 #include <cstdio>
 
-namespace Fleet {
+namespace fleet {
 
 MachineOutput::MachineOutput(std::vector<MachineRecord> const& machines, ProgressLine& line)
     : _machines(machines), _line(line) {}
@@ -28,7 +31,7 @@ void MachineOutput::releaseSlot(std::size_t slot) {
 }
 
 std::string MachineOutput::tracePiece(std::size_t machine, std::size_t slot) const {
-    return RunFiles::tracePiece(_machines[machine].identity, slot);
+    return tracePiecePath(_machines[machine].identity, slot);
 }
 
 void MachineOutput::writeReady(Scheduler const& scheduler) {
@@ -61,20 +64,29 @@ void MachineOutput::_write(std::size_t index) {
         return;
     }
     _line.erase();
-    MachineReport::print(machine);
+    printMachineBlock(machine);
     // The block ends with the code digit and no line end.
-    _line.leaveOpenRow(std::string(get_OverallCode(MachineReport::returnCodes(machine))).size());
-    RunFiles::writeAtomically(RunFiles::statusFile(machine.identity),
-                              MachineReport::statusText(machine));
-    if (auto const trace = MachineReport::traceText(machine)) {
-        RunFiles::writeAtomically(RunFiles::traceFile(machine.identity), *trace);
+    _line.leaveOpenRow(std::string(get_OverallCode(machineReturnCodes(machine))).size());
+    _writeFile(statusFilePath(machine.identity), machineStatusText(machine));
+    if (auto const trace = machineTraceText(machine)) {
+        _writeFile(traceFilePath(machine.identity), *trace);
+    }
+}
+
+void MachineOutput::_writeFile(std::string const& path, std::string const& text) {
+    try {
+        util::writeFileAtomically(path, text);
+    } catch (util::SystemError const&) {
+        // The single-machine tool says nothing when its status file or trace
+        // cannot be written, and scripts compare the two programs' standard
+        // error byte for byte (tests/fleet/FleetDifferential_test.cpp).
     }
 }
 
 void MachineOutput::_removeTracePieces(std::string const& identity) const {
     for (std::size_t slot = 0; slot < _slotInUse.size(); ++slot) {
-        std::remove(RunFiles::tracePiece(identity, slot).c_str());
+        std::remove(tracePiecePath(identity, slot).c_str());
     }
 }
 
-} // namespace Fleet
+} // namespace fleet

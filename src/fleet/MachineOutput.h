@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-namespace Fleet {
+namespace fleet {
 
 // What the run writes for its machines, in listing order: each machine's
 // block on standard output and error, its status file and its trace, as
@@ -38,6 +38,7 @@ public:
 private:
     void _write(std::size_t index);
     void _removeTracePieces(std::string const& identity) const;
+    void _writeFile(std::string const& path, std::string const& text);
 
     std::vector<MachineRecord> const& _machines;
     ProgressLine& _line;
@@ -45,4 +46,4 @@ private:
     std::size_t _written = 0;
 };
 
-} // namespace Fleet
+} // namespace fleet

@@ -8,10 +8,10 @@
 
 namespace {
 
-using Fleet::MachineOutput;
-using Fleet::MachineRecord;
-using Fleet::ProgressLine;
-using Fleet::Scheduler;
+using fleet::MachineOutput;
+using fleet::MachineRecord;
+using fleet::ProgressLine;
+using fleet::Scheduler;
 
 // Machines whose listing has not ended write nothing and print nothing, so
 // the order in which they are written shows without files being made.
@@ -50,7 +50,7 @@ TEST_F(MachineOutputTest, UnitTakesTheFirstFreeSlot) {
 TEST_F(MachineOutputTest, SlotsPieceIsTheMachinesTracePieceOfThatSlot) {
     std::vector<MachineRecord> const machines = unlistedMachines(2);
     MachineOutput const output(machines, _line);
-    EXPECT_EQ(output.tracePiece(1, 3), Fleet::RunFiles::tracePiece(machines[1].identity, 3));
+    EXPECT_EQ(output.tracePiece(1, 3), fleet::tracePiecePath(machines[1].identity, 3));
     EXPECT_NE(output.tracePiece(0, 3), output.tracePiece(1, 3));
 }
 

@@ -6,7 +6,7 @@
 #include <iostream>
 #include <iterator>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -14,17 +14,17 @@ constexpr char gc_NoPartitions[] = "No ACTIVE Partition Found.\n";
 
 } // namespace
 
-void MachineReport::print(MachineRecord const& machine) {
+void printMachineBlock(MachineRecord const& machine) {
     for (auto const& record : machine.partitions) {
         if (!record.result.fileName.empty()) {
             std::cout << record.result.fileName << std::endl;
             std::cerr << record.result.returnCode << std::endl;
         }
     }
-    calculate_ReturnCode(returnCodes(machine));
+    calculate_ReturnCode(machineReturnCodes(machine));
 }
 
-std::string MachineReport::statusText(MachineRecord const& machine) {
+std::string machineStatusText(MachineRecord const& machine) {
     if (machine.partitions.empty()) {
         return gc_NoPartitions;
     }
@@ -36,7 +36,7 @@ std::string MachineReport::statusText(MachineRecord const& machine) {
     return text;
 }
 
-std::vector<std::string> MachineReport::returnCodes(MachineRecord const& machine) {
+std::vector<std::string> machineReturnCodes(MachineRecord const& machine) {
     std::vector<std::string> codes;
     codes.reserve(machine.partitions.size());
     std::transform(machine.partitions.begin(), machine.partitions.end(), std::back_inserter(codes),
@@ -44,7 +44,7 @@ std::vector<std::string> MachineReport::returnCodes(MachineRecord const& machine
     return codes;
 }
 
-std::optional<std::string> MachineReport::traceText(MachineRecord const& machine) {
+std::optional<std::string> machineTraceText(MachineRecord const& machine) {
     std::optional<std::string> text;
     auto const append = [&text](std::optional<std::string> const& piece) {
         if (piece) {
@@ -58,4 +58,4 @@ std::optional<std::string> MachineReport::traceText(MachineRecord const& machine
     return text;
 }
 
-} // namespace Fleet
+} // namespace fleet

@@ -7,9 +7,12 @@
 
 namespace {
 
-using Fleet::MachineRecord;
-using Fleet::MachineReport;
-using Fleet::PartitionRecord;
+using fleet::MachineRecord;
+using fleet::machineReturnCodes;
+using fleet::machineStatusText;
+using fleet::machineTraceText;
+using fleet::PartitionRecord;
+using fleet::printMachineBlock;
 
 // Standard output and standard error into one buffer for as long as it
 // lives, as when both streams of the tool go to one file.
@@ -54,7 +57,7 @@ MachineRecord mixedMachine() {
 
 TEST(MachineReport, NamesAndCodesInterleaveThenTheOverallCodeEndsTheBlock) {
     BothStreamsCaptured const captured;
-    MachineReport::print(mixedMachine());
+    printMachineBlock(mixedMachine());
     EXPECT_EQ(captured.text(), "VPD/one.VPD.xml\n0\nVPD/three.VPD.xml\n8\n"
                                "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n4");
 }
@@ -63,24 +66,23 @@ TEST(MachineReport, MachineWithoutPartitionsPrintsOnlyTheOverallCodeEight) {
     MachineRecord machine;
     machine.listed = true;
     BothStreamsCaptured const captured;
-    MachineReport::print(machine);
+    printMachineBlock(machine);
     EXPECT_EQ(captured.text(), "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n8");
 }
 
 TEST(MachineReport, StatusFileHasOneLinePerListedPartition) {
-    EXPECT_EQ(MachineReport::statusText(mixedMachine()),
+    EXPECT_EQ(machineStatusText(mixedMachine()),
               "1a [10.0.0.1] - VPD Survey - Ok\n"
               "2b [10.0.0.2] - VPD Survey - Failed - Active Status < 3\n"
               "3c [10.0.0.3] - VPD Survey - RELAY Failed, rc = 4\n");
 }
 
 TEST(MachineReport, StatusFileOfAMachineWithoutPartitionsSaysSo) {
-    EXPECT_EQ(MachineReport::statusText(MachineRecord{}), "No ACTIVE Partition Found.\n");
+    EXPECT_EQ(machineStatusText(MachineRecord{}), "No ACTIVE Partition Found.\n");
 }
 
 TEST(MachineReport, ReturnCodesFollowListingOrder) {
-    EXPECT_EQ(MachineReport::returnCodes(mixedMachine()),
-              (std::vector<std::string>{"0", "8", "8"}));
+    EXPECT_EQ(machineReturnCodes(mixedMachine()), (std::vector<std::string>{"0", "8", "8"}));
 }
 
 TEST(MachineReport, TraceJoinsTheListingAndThePartitionBlocksInListingOrder) {
@@ -88,19 +90,18 @@ TEST(MachineReport, TraceJoinsTheListingAndThePartitionBlocksInListingOrder) {
     machine.listingTrace = "listing\n";
     machine.partitions[2].trace = "third\n";
     machine.partitions[0].trace = "first\n";
-    EXPECT_EQ(MachineReport::traceText(machine),
-              std::optional<std::string>("listing\nfirst\nthird\n"));
+    EXPECT_EQ(machineTraceText(machine), std::optional<std::string>("listing\nfirst\nthird\n"));
 }
 
 TEST(MachineReport, TraceOfPartitionsAloneKeepsTheirBlocks) {
     MachineRecord machine = mixedMachine();
     machine.partitions[1].trace = "";
     machine.partitions[2].trace = "third\n";
-    EXPECT_EQ(MachineReport::traceText(machine), std::optional<std::string>("third\n"));
+    EXPECT_EQ(machineTraceText(machine), std::optional<std::string>("third\n"));
 }
 
 TEST(MachineReport, NoTraceWhenNoUnitWroteOne) {
-    EXPECT_EQ(MachineReport::traceText(mixedMachine()), std::nullopt);
+    EXPECT_EQ(machineTraceText(mixedMachine()), std::nullopt);
 }
 
 } // namespace

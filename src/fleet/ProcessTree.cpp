@@ -15,7 +15,7 @@
 #include <sstream>
 #include <thread>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -157,4 +157,4 @@ std::size_t killDescendants(pid_t root) {
     return signalsSent;
 }
 
-} // namespace Fleet
+} // namespace fleet

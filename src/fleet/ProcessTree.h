@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-namespace Fleet {
+namespace fleet {
 
 // What /proc tells about the processes below one of ours, and the means to
 // end a whole subtree. Processes are read afresh on every call: they come
@@ -50,4 +50,4 @@ struct ChildStop {
 // left alone. Returns the number of kill signals sent.
 std::size_t killDescendants(pid_t root);
 
-} // namespace Fleet
+} // namespace fleet

@@ -18,7 +18,7 @@
 
 namespace {
 
-using Fleet::ChildProcess;
+using fleet::ChildProcess;
 
 // A child that runs a shell leaving three sleeping processes: one orphaned
 // at once (adopted by the child), two under the shell. The child reports
@@ -29,10 +29,10 @@ std::string runSleepingTree() {
 }
 
 std::vector<pid_t> liveDescendants(pid_t root) {
-    std::vector<pid_t> const all = Fleet::descendantsOf(root);
+    std::vector<pid_t> const all = fleet::descendantsOf(root);
     std::vector<pid_t> live;
     std::copy_if(all.begin(), all.end(), std::back_inserter(live),
-                 [](pid_t pid) { return !Fleet::hasEnded(pid); });
+                 [](pid_t pid) { return !fleet::hasEnded(pid); });
     return live;
 }
 
@@ -50,10 +50,10 @@ std::vector<pid_t> waitForLiveDescendants(pid_t root, std::size_t count) {
 // system() shows its parent's command line until its exec has run.
 std::string waitForCommandLine(pid_t pid, std::string const& text) {
     auto const deadline = std::chrono::steady_clock::now() + std::chrono::seconds(20);
-    std::string line = Fleet::commandLineOf(pid);
+    std::string line = fleet::commandLineOf(pid);
     while (line.find(text) == std::string::npos && std::chrono::steady_clock::now() < deadline) {
         std::this_thread::sleep_for(std::chrono::milliseconds(20));
-        line = Fleet::commandLineOf(pid);
+        line = fleet::commandLineOf(pid);
     }
     return line;
 }
@@ -74,9 +74,9 @@ TEST(ProcessTree, TreeOfSleepingShellsIsKilledAndTheWorkerGoesOn) {
     ASSERT_GE(tree.size(), 4U);
 
     ASSERT_TRUE(worker.stop());
-    EXPECT_GT(Fleet::killDescendants(worker.pid()), 0U);
+    EXPECT_GT(fleet::killDescendants(worker.pid()), 0U);
     for (pid_t pid : tree) {
-        EXPECT_TRUE(Fleet::hasEnded(pid)) << pid;
+        EXPECT_TRUE(fleet::hasEnded(pid)) << pid;
     }
     worker.resume();
 
@@ -85,7 +85,7 @@ TEST(ProcessTree, TreeOfSleepingShellsIsKilledAndTheWorkerGoesOn) {
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }
     for (pid_t pid : tree) {
-        EXPECT_TRUE(Fleet::hasEnded(pid)) << pid;
+        EXPECT_TRUE(fleet::hasEnded(pid)) << pid;
     }
 }
 
@@ -93,7 +93,7 @@ TEST(ProcessTree, KillingWithoutDescendantsSendsNothing) {
     ChildProcess worker([] { return std::string("done"); });
     ASSERT_TRUE(worker.isStarted());
     EXPECT_EQ(readToEnd(worker), "done");
-    EXPECT_EQ(Fleet::killDescendants(worker.pid()), 0U);
+    EXPECT_EQ(fleet::killDescendants(worker.pid()), 0U);
 }
 
 TEST(ProcessTree, ChildIsListedWithItsAgeAndCommandLine) {
@@ -102,14 +102,14 @@ TEST(ProcessTree, ChildIsListedWithItsAgeAndCommandLine) {
         return std::string();
     });
     ASSERT_TRUE(worker.isStarted());
-    auto const children = Fleet::childrenOf(getpid());
+    auto const children = fleet::childrenOf(getpid());
     EXPECT_NE(std::find(children.begin(), children.end(), worker.pid()), children.end());
     // The shell's own process becomes the sleep once it has run exec.
     std::vector<pid_t> const sleeper = waitForLiveDescendants(worker.pid(), 1);
     ASSERT_FALSE(sleeper.empty());
     EXPECT_NE(waitForCommandLine(sleeper.front(), "sleep 300").find("sleep 300"),
               std::string::npos);
-    auto const age = Fleet::ageOf(sleeper.front());
+    auto const age = fleet::ageOf(sleeper.front());
     ASSERT_TRUE(age.has_value());
     EXPECT_GE(*age, 0.0);
     EXPECT_LT(*age, 60.0);
@@ -123,11 +123,11 @@ TEST(ProcessTree, StoppingAChildThatEndedReapsItAndGivesItsExitStatus) {
     if (child == 0) {
         _exit(3);
     }
-    while (!Fleet::hasEnded(child)) {
+    while (!fleet::hasEnded(child)) {
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }
-    Fleet::ChildStop const stop = Fleet::stopChild(child);
-    EXPECT_EQ(stop.state, Fleet::ChildStop::State::Ended);
+    fleet::ChildStop const stop = fleet::stopChild(child);
+    EXPECT_EQ(stop.state, fleet::ChildStop::State::Ended);
     ASSERT_TRUE(WIFEXITED(stop.waitStatus));
     EXPECT_EQ(WEXITSTATUS(stop.waitStatus), 3);
     EXPECT_EQ(waitpid(child, nullptr, WNOHANG), -1) << "the child was not reaped";
@@ -140,24 +140,24 @@ TEST(ProcessTree, StoppingALiveChildLeavesItStopped) {
         pause();
         _exit(0);
     }
-    Fleet::ChildStop const stop = Fleet::stopChild(child);
-    EXPECT_EQ(stop.state, Fleet::ChildStop::State::Stopped);
+    fleet::ChildStop const stop = fleet::stopChild(child);
+    EXPECT_EQ(stop.state, fleet::ChildStop::State::Stopped);
     EXPECT_TRUE(WIFSTOPPED(stop.waitStatus));
     kill(child, SIGKILL);
     waitpid(child, nullptr, 0);
 }
 
 TEST(ProcessTree, StoppingAProcessThatIsNoChildSaysItIsGoneWithErrno) {
-    Fleet::ChildStop const stop = Fleet::stopChild(0x7ffffff0);
-    EXPECT_EQ(stop.state, Fleet::ChildStop::State::Gone);
+    fleet::ChildStop const stop = fleet::stopChild(0x7ffffff0);
+    EXPECT_EQ(stop.state, fleet::ChildStop::State::Gone);
     EXPECT_EQ(stop.error, ESRCH);
 }
 
 TEST(ProcessTree, ProcessThatIsGoneHasEndedAndNoAge) {
-    EXPECT_TRUE(Fleet::hasEnded(0x7ffffff0));
-    EXPECT_FALSE(Fleet::ageOf(0x7ffffff0).has_value());
-    EXPECT_EQ(Fleet::commandLineOf(0x7ffffff0), "");
-    EXPECT_TRUE(Fleet::childrenOf(0x7ffffff0).empty());
+    EXPECT_TRUE(fleet::hasEnded(0x7ffffff0));
+    EXPECT_FALSE(fleet::ageOf(0x7ffffff0).has_value());
+    EXPECT_EQ(fleet::commandLineOf(0x7ffffff0), "");
+    EXPECT_TRUE(fleet::childrenOf(0x7ffffff0).empty());
 }
 
 } // namespace

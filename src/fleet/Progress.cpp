@@ -3,7 +3,7 @@
 #include <cmath>
 #include <cstdio>
 
-namespace Fleet {
+namespace fleet {
 
 std::string clockText(double seconds) {
     long const whole = seconds < 0 ? 0 : static_cast<long>(seconds);
@@ -45,4 +45,4 @@ std::string fitToWidth(std::string const& line, std::size_t columns) {
     return line.substr(0, columns - 1);
 }
 
-} // namespace Fleet
+} // namespace fleet

@@ -4,7 +4,7 @@
 #include <optional>
 #include <string>
 
-namespace Fleet {
+namespace fleet {
 
 // The figures of the live progress line and the text made of them; the
 // line on the terminal is ProgressLine's.
@@ -37,4 +37,4 @@ std::string clockText(double seconds);
 // a line that wrapped could not be erased with one "\r".
 std::string fitToWidth(std::string const& line, std::size_t columns);
 
-} // namespace Fleet
+} // namespace fleet

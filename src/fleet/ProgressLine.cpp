@@ -6,7 +6,7 @@
 
 #include <ostream>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -63,4 +63,4 @@ void ProgressLine::leaveOpenRow(std::size_t columns) {
     _openColumns = columns;
 }
 
-} // namespace Fleet
+} // namespace fleet

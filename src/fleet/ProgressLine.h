@@ -5,7 +5,7 @@
 #include <iosfwd>
 #include <string>
 
-namespace Fleet {
+namespace fleet {
 
 // The one live line a person watching a terminal sees: redrawn in place,
 // at most every gc_ProgressInterval, and erased before any output line, so
@@ -45,4 +45,4 @@ private:
     Clock::time_point _lastDraw;
 };
 
-} // namespace Fleet
+} // namespace fleet

@@ -6,7 +6,7 @@
 
 namespace {
 
-using Fleet::ProgressLine;
+using fleet::ProgressLine;
 using Clock = ProgressLine::Clock;
 
 // Not a terminal: the width is unknown and the line is kept whole.

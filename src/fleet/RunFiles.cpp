@@ -11,7 +11,7 @@
 #include <sstream>
 #include <stdexcept>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -21,29 +21,20 @@ constexpr char gc_PieceSeparator[] = "-";
 
 } // namespace
 
-std::string RunFiles::statusFile(std::string const& identity) {
+std::string statusFilePath(std::string const& identity) {
     return Quorvex::PYLON::VPD::get_StatusFileName(identity);
 }
 
-std::string RunFiles::traceFile(std::string const& identity) {
+std::string traceFilePath(std::string const& identity) {
     return Quorvex::PYLON::VPD::get_MachineTraceFileName(identity);
 }
 
-std::string RunFiles::tracePiece(std::string const& identity, std::size_t slot) {
-    return traceFile(identity) + gc_PieceMark + std::to_string(getpid()) + gc_PieceSeparator +
+std::string tracePiecePath(std::string const& identity, std::size_t slot) {
+    return traceFilePath(identity) + gc_PieceMark + std::to_string(getpid()) + gc_PieceSeparator +
            std::to_string(slot);
 }
 
-bool RunFiles::writeAtomically(std::string const& path, std::string const& text) {
-    try {
-        util::writeFileAtomically(path, text);
-        return true;
-    } catch (util::SystemError const&) {
-        return false;
-    }
-}
-
-std::optional<std::string> RunFiles::takePiece(std::string const& piece) {
+std::optional<std::string> takeTracePiece(std::string const& piece) {
     std::ifstream input(piece, std::ios::binary);
     if (!input) {
         return std::nullopt;
@@ -60,4 +51,4 @@ std::optional<std::string> RunFiles::takePiece(std::string const& piece) {
     return text.str();
 }
 
-} // namespace Fleet
+} // namespace fleet

@@ -6,7 +6,10 @@
 
 namespace {
 
-using Fleet::RunFiles;
+using fleet::statusFilePath;
+using fleet::takeTracePiece;
+using fleet::traceFilePath;
+using fleet::tracePiecePath;
 using QuorvexTest::TemporaryDirectory;
 
 TEST(RunFiles, TakingAPieceGivesItsBytesAndLeavesItEmptyForTheSlotsNextUnit) {
@@ -14,39 +17,24 @@ TEST(RunFiles, TakingAPieceGivesItsBytesAndLeavesItEmptyForTheSlotsNextUnit) {
     std::string const piece = folder.file("piece");
     std::string const bytes("line one\n\0two", 13);
     QuorvexTest::writeFile(piece, bytes);
-    EXPECT_EQ(RunFiles::takePiece(piece), std::optional<std::string>(bytes));
+    EXPECT_EQ(takeTracePiece(piece), std::optional<std::string>(bytes));
     EXPECT_EQ(QuorvexTest::readFile(piece), "");
-    EXPECT_EQ(RunFiles::takePiece(piece), std::optional<std::string>(""));
+    EXPECT_EQ(takeTracePiece(piece), std::optional<std::string>(""));
 }
 
 TEST(RunFiles, TakingAPieceThatDoesNotExistGivesNothing) {
     TemporaryDirectory const folder;
-    EXPECT_EQ(RunFiles::takePiece(folder.file("never written")), std::nullopt);
+    EXPECT_EQ(takeTracePiece(folder.file("never written")), std::nullopt);
     EXPECT_FALSE(QuorvexTest::fileExists(folder.file("never written")));
 }
 
 TEST(RunFiles, PiecesOfOneMachineDifferBySlotAndLieBesideItsTrace) {
-    std::string const trace = RunFiles::traceFile("9119-MHE_21ABCDE");
-    std::string const first = RunFiles::tracePiece("9119-MHE_21ABCDE", 0);
-    std::string const second = RunFiles::tracePiece("9119-MHE_21ABCDE", 1);
+    std::string const trace = traceFilePath("9119-MHE_21ABCDE");
+    std::string const first = tracePiecePath("9119-MHE_21ABCDE", 0);
+    std::string const second = tracePiecePath("9119-MHE_21ABCDE", 1);
     EXPECT_NE(first, second);
     EXPECT_EQ(first.rfind(trace + ".piece-", 0), 0U);
-    EXPECT_NE(RunFiles::tracePiece("9119-MHE_21ABCDF", 0), first);
-}
-
-TEST(RunFiles, WritingAtomicallyReplacesTheFileAndLeavesNoTemporaryName) {
-    TemporaryDirectory const folder;
-    std::string const target = folder.file("summary.json");
-    QuorvexTest::writeFile(target, "old");
-    ASSERT_TRUE(RunFiles::writeAtomically(target, "new"));
-    EXPECT_EQ(QuorvexTest::readFile(target), "new");
-    EXPECT_EQ(QuorvexTest::listFolder(folder.path()), (std::vector<std::string>{"summary.json"}));
-}
-
-TEST(RunFiles, WritingAtomicallyIntoAMissingFolderFailsAndWritesNothing) {
-    TemporaryDirectory const folder;
-    EXPECT_FALSE(RunFiles::writeAtomically(folder.file("missing/summary.json"), "text"));
-    EXPECT_TRUE(QuorvexTest::listFolder(folder.path()).empty());
+    EXPECT_NE(tracePiecePath("9119-MHE_21ABCDF", 0), first);
 }
 
 } // namespace

@@ -2,7 +2,7 @@
 
 #include "report/StatusText.h"
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -41,4 +41,4 @@ void settleUnfinished(std::vector<MachineRecord>& machines) {
     }
 }
 
-} // namespace Fleet
+} // namespace fleet

@@ -9,7 +9,7 @@
 #include <string>
 #include <vector>
 
-namespace Fleet {
+namespace fleet {
 
 // A remote action that the run stopped: which one, after how long, and
 // whether a signal to the run (rather than the time limit) stopped it.
@@ -54,4 +54,4 @@ struct MachineRecord {
 // run was interrupted.
 void settleUnfinished(std::vector<MachineRecord>& machines);
 
-} // namespace Fleet
+} // namespace fleet

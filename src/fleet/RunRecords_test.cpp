@@ -2,8 +2,8 @@
 
 #include <gtest/gtest.h>
 
-using Fleet::ActionStop;
-using Fleet::PartitionRecord;
+using fleet::ActionStop;
+using fleet::PartitionRecord;
 using report::Outcome;
 using Kind = Quorvex::PYLON::VPD::PartitionOutcomeKind;
 
@@ -23,7 +23,7 @@ Quorvex::PYLON::VPD::PartitionOutcome surveyResult(Kind kind, std::string const&
 TEST(RunRecords, UnstoppedPartitionTakesItsSurveysOutcome) {
     PartitionRecord record;
     EXPECT_EQ(record.outcome, std::nullopt);
-    Fleet::settlePartition(record,
+    fleet::settlePartition(record,
                            surveyResult(Kind::FetchFailure, "8", "2et result Failed, rc = "));
     EXPECT_EQ(record.outcome, Outcome::FetchFailure);
     EXPECT_EQ(record.result.statusText, "2et result Failed, rc = ");
@@ -32,7 +32,7 @@ TEST(RunRecords, UnstoppedPartitionTakesItsSurveysOutcome) {
 TEST(RunRecords, PartitionStoppedByTheTimeLimitKeepsItsStatusTextAndIsTimedOut) {
     PartitionRecord record;
     record.stop = ActionStop{report::RemoteAction::RunCommand, 2.04, false};
-    Fleet::settlePartition(record,
+    fleet::settlePartition(record,
                            surveyResult(Kind::ClientFailure, "8", "Partition Failed, RcCmd = 9"));
     EXPECT_EQ(record.outcome, Outcome::TimedOut);
     EXPECT_EQ(record.result.statusText, "Partition Failed, RcCmd = 9");
@@ -42,7 +42,7 @@ TEST(RunRecords, PartitionStoppedByTheTimeLimitKeepsItsStatusTextAndIsTimedOut) 
 TEST(RunRecords, PartitionStoppedByASignalReadsInterruptedWhateverItsSurveyLeft) {
     PartitionRecord record;
     record.stop = ActionStop{report::RemoteAction::GetFile, 0.4, true};
-    Fleet::settlePartition(record, surveyResult(Kind::Surveyed, "0", "Ok"));
+    fleet::settlePartition(record, surveyResult(Kind::Surveyed, "0", "Ok"));
     EXPECT_EQ(record.outcome, Outcome::Interrupted);
     EXPECT_EQ(record.result.statusText, "Interrupted - not surveyed");
     EXPECT_EQ(record.result.returnCode, "8");
@@ -50,18 +50,18 @@ TEST(RunRecords, PartitionStoppedByASignalReadsInterruptedWhateverItsSurveyLeft)
 
 TEST(RunRecords, UnfinishedPartitionIsInterruptedWithCodeEight) {
     PartitionRecord record;
-    Fleet::settleUnfinished(record);
+    fleet::settleUnfinished(record);
     EXPECT_EQ(record.outcome, Outcome::Interrupted);
     EXPECT_EQ(record.result.statusText, "Interrupted - not surveyed");
     EXPECT_EQ(record.result.returnCode, "8");
 }
 
 TEST(RunRecords, InterruptedRunSettlesOnlyThePartitionsThatHadNotEnded) {
-    std::vector<Fleet::MachineRecord> machines(2);
+    std::vector<fleet::MachineRecord> machines(2);
     machines[0].partitions.resize(2);
     machines[1].partitions.resize(1);
-    Fleet::settlePartition(machines[0].partitions[0], surveyResult(Kind::Surveyed, "0", "Ok"));
-    Fleet::settleUnfinished(machines);
+    fleet::settlePartition(machines[0].partitions[0], surveyResult(Kind::Surveyed, "0", "Ok"));
+    fleet::settleUnfinished(machines);
     EXPECT_EQ(machines[0].partitions[0].outcome, Outcome::Surveyed);
     EXPECT_EQ(machines[0].partitions[0].result.statusText, "Ok");
     EXPECT_EQ(machines[0].partitions[1].outcome, Outcome::Interrupted);

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-namespace Fleet {
+namespace fleet {
 
 bool Scheduler::Unit::operator==(Unit const& other) const {
     return machine == other.machine && partition == other.partition;
@@ -99,4 +99,4 @@ bool Scheduler::isFinished() const {
     return true;
 }
 
-} // namespace Fleet
+} // namespace fleet

@@ -5,7 +5,7 @@
 #include <string>
 #include <vector>
 
-namespace Fleet {
+namespace fleet {
 
 // Decides which unit of work starts next. A machine's listing comes first;
 // its partitions can start once it is listed. Earlier machines and earlier
@@ -57,4 +57,4 @@ private:
     bool _stopped = false;
 };
 
-} // namespace Fleet
+} // namespace fleet

@@ -4,7 +4,7 @@
 
 namespace {
 
-using Fleet::Scheduler;
+using fleet::Scheduler;
 using Unit = Scheduler::Unit;
 
 Unit listing(std::size_t machine) {

@@ -7,19 +7,19 @@
 #include <csignal>
 #include <cstring>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
-int readEnd = -1;
-int writeEnd = -1;
-int firstSignal = 0;
+int gs_ReadEnd = -1;
+int gs_WriteEnd = -1;
+int gs_FirstSignal = 0;
 
 void handleSignal(int signalNumber) {
     int const savedErrno = errno;
     auto const byte = static_cast<unsigned char>(signalNumber);
     // A full pipe already holds a signal for the loop; this one adds nothing.
-    ssize_t const written = write(writeEnd, &byte, 1);
+    ssize_t const written = write(gs_WriteEnd, &byte, 1);
     static_cast<void>(written);
     errno = savedErrno;
 }
@@ -35,8 +35,8 @@ std::optional<std::string> installSignalPipe() {
     if (pipe2(ends, O_CLOEXEC | O_NONBLOCK) != 0) {
         return failure("cannot create the signal pipe");
     }
-    readEnd = ends[0];
-    writeEnd = ends[1];
+    gs_ReadEnd = ends[0];
+    gs_WriteEnd = ends[1];
     struct sigaction action {};
     action.sa_handler = &handleSignal;
     sigemptyset(&action.sa_mask);
@@ -48,21 +48,21 @@ std::optional<std::string> installSignalPipe() {
 }
 
 int signalPipeDescriptor() {
-    return readEnd;
+    return gs_ReadEnd;
 }
 
 int takeSignal() {
     unsigned char byte = 0;
-    while (readEnd >= 0 && read(readEnd, &byte, 1) == 1) {
-        if (firstSignal == 0) {
-            firstSignal = byte;
+    while (gs_ReadEnd >= 0 && read(gs_ReadEnd, &byte, 1) == 1) {
+        if (gs_FirstSignal == 0) {
+            gs_FirstSignal = byte;
         }
     }
-    return firstSignal;
+    return gs_FirstSignal;
 }
 
 char const* signalName(int signalNumber) {
     return signalNumber == SIGTERM ? "SIGTERM" : "SIGINT";
 }
 
-} // namespace Fleet
+} // namespace fleet

@@ -3,7 +3,7 @@
 #include <optional>
 #include <string>
 
-namespace Fleet {
+namespace fleet {
 
 // SIGINT and SIGTERM turned into bytes on a pipe that the run's poll loop
 // watches, so the run reacts to them between its steps and never inside one.
@@ -19,4 +19,4 @@ int takeSignal();
 // "SIGTERM" for SIGTERM, "SIGINT" for the other signal the run handles.
 char const* signalName(int signalNumber);
 
-} // namespace Fleet
+} // namespace fleet

@@ -5,7 +5,7 @@
 #include <algorithm>
 #include <iterator>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -45,8 +45,8 @@ report::PartitionSummary partitionSummary(PartitionRecord const& record) {
 report::MachineSummary machineSummary(MachineRecord const& machine) {
     report::MachineSummary summary;
     summary.identity = machine.identity;
-    summary.statusFile = RunFiles::statusFile(machine.identity);
-    summary.traceFile = RunFiles::traceFile(machine.identity);
+    summary.statusFile = statusFilePath(machine.identity);
+    summary.traceFile = traceFilePath(machine.identity);
     std::transform(machine.partitions.begin(), machine.partitions.end(),
                    std::back_inserter(summary.partitions), &partitionSummary);
     return summary;
@@ -78,4 +78,4 @@ report::RunSummary runSummary(RunFacts const& facts, std::vector<MachineRecord> 
     return summary;
 }
 
-} // namespace Fleet
+} // namespace fleet

@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-namespace Fleet {
+namespace fleet {
 
 // The facts of a whole run that its summary carries besides the machines.
 struct RunFacts {
@@ -26,4 +26,4 @@ struct RunFacts {
 // wrote for its machine.
 report::RunSummary runSummary(RunFacts const& facts, std::vector<MachineRecord> const& machines);
 
-} // namespace Fleet
+} // namespace fleet

@@ -7,9 +7,9 @@
 
 namespace {
 
-using Fleet::MachineRecord;
-using Fleet::PartitionRecord;
-using Fleet::RunFacts;
+using fleet::MachineRecord;
+using fleet::PartitionRecord;
+using fleet::RunFacts;
 using Json = nlohmann::ordered_json;
 using Kind = Quorvex::PYLON::VPD::PartitionOutcomeKind;
 
@@ -46,7 +46,7 @@ std::vector<MachineRecord> everyOutcome() {
     PartitionRecord timedOut = finished(Kind::ChannelFailure, "8");
     timedOut.result.fileName = "VPD/x-7.VPD.xml";
     timedOut.result.reason = "Partition not surveyed, reason: \nRELAY Failed.\n\n\n\nStopped.\n";
-    timedOut.stop = Fleet::ActionStop{report::RemoteAction::RunCommand, 2.04, false};
+    timedOut.stop = fleet::ActionStop{report::RemoteAction::RunCommand, 2.04, false};
     timedOut.outcome = report::Outcome::TimedOut;
     PartitionRecord interrupted;
     interrupted.partition.set_PartitionID("9");
@@ -79,7 +79,7 @@ RunFacts facts() {
 }
 
 Json document(RunFacts const& run, std::vector<MachineRecord> const& machines) {
-    return report::summaryDocument(Fleet::runSummary(run, machines));
+    return report::summaryDocument(fleet::runSummary(run, machines));
 }
 
 TEST(Summary, PartitionOutcomesAreTheRecordsOutcomes) {
@@ -98,7 +98,7 @@ TEST(Summary, PartitionWhoseSurveyNeverEndedIsInterrupted) {
     machine.identity = "9119-MHE_21ABCDE";
     machine.partitions = {PartitionRecord{}};
     EXPECT_EQ(report::Outcome::Interrupted,
-              Fleet::runSummary(facts(), {machine}).machines[0].partitions[0].outcome);
+              fleet::runSummary(facts(), {machine}).machines[0].partitions[0].outcome);
 }
 
 TEST(Summary, RunFactsAndOptionsAreCarried) {

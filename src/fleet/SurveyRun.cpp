@@ -11,7 +11,7 @@
 #include <cstdlib>
 #include <iostream>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -48,6 +48,10 @@ std::vector<MachineRecord> const& SurveyRun::machines() const {
     return _machines;
 }
 
+bool SurveyRun::endsOnOpenRow() const {
+    return _output.writtenCount() > 0;
+}
+
 int SurveyRun::interruptingSignal() const {
     return _limits.interruptingSignal();
 }
@@ -55,7 +59,7 @@ int SurveyRun::interruptingSignal() const {
 std::string SurveyRun::overallCode() const {
     std::vector<std::string> codes;
     for (auto const& machine : _machines) {
-        auto const machineCodes = MachineReport::returnCodes(machine);
+        auto const machineCodes = machineReturnCodes(machine);
         codes.insert(codes.end(), machineCodes.begin(), machineCodes.end());
     }
     return get_OverallCode(codes);
@@ -166,7 +170,7 @@ void SurveyRun::_finish(std::size_t slot, std::string const& result) {
 void SurveyRun::_finishListing(InFlight const& running, std::string const& result) {
     _scheduler.finish(running.unit);
     std::optional<std::string> trace =
-        RunFiles::takePiece(_output.tracePiece(running.unit.machine, running.slot));
+        takeTracePiece(_output.tracePiece(running.unit.machine, running.slot));
     if (running.listingStopped) {
         return;
     }
@@ -187,7 +191,7 @@ void SurveyRun::_finishListing(InFlight const& running, std::string const& resul
 void SurveyRun::_finishSurvey(InFlight const& running, std::string const& result) {
     PartitionRecord& record = _record(running.unit);
     record.seconds = secondsSince(running.started);
-    record.trace = RunFiles::takePiece(_output.tracePiece(running.unit.machine, running.slot));
+    record.trace = takeTracePiece(_output.tracePiece(running.unit.machine, running.slot));
     settlePartition(record, decodeOutcome(result).value_or(notStartedOutcome()));
     _scheduler.finish(running.unit);
 }
@@ -238,4 +242,4 @@ ProgressFigures SurveyRun::_progressFigures() const {
     return figures;
 }
 
-} // namespace Fleet
+} // namespace fleet

@@ -14,7 +14,7 @@
 #include <string>
 #include <vector>
 
-namespace Fleet {
+namespace fleet {
 
 // One console-wide survey: lists each machine and surveys its partitions,
 // each unit of work in a forked process of its own, at most `jobs` at once;
@@ -35,6 +35,9 @@ public:
 
     std::vector<MachineRecord> const& machines() const;
     int interruptingSignal() const;
+    // Whether standard error's last row is still open: a machine's block
+    // ends with its code digit and no line end.
+    bool endsOnOpenRow() const;
     std::string overallCode() const;
 
 private:
@@ -73,4 +76,4 @@ private:
     Clock::time_point _start;
 };
 
-} // namespace Fleet
+} // namespace fleet

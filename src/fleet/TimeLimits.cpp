@@ -4,7 +4,7 @@
 
 #include <cstdio>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -76,4 +76,4 @@ bool resumesAfterStop(UnitKind kind) {
     return kind != UnitKind::MachineListing;
 }
 
-} // namespace Fleet
+} // namespace fleet

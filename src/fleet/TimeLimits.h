@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-namespace Fleet {
+namespace fleet {
 
 // What a unit of work does; each kind has its own rule for which of its
 // actions the run stops.
@@ -62,4 +62,4 @@ private:
 // Whether a unit's worker goes on once its stopped action is killed.
 bool resumesAfterStop(UnitKind kind);
 
-} // namespace Fleet
+} // namespace fleet

@@ -6,9 +6,9 @@
 
 namespace {
 
-using Fleet::ActionFacts;
-using Fleet::TimeLimits;
-using Fleet::UnitKind;
+using fleet::ActionFacts;
+using fleet::TimeLimits;
+using fleet::UnitKind;
 
 constexpr char gc_ClientRun[] = "/bin/sh -c /usr/bin/runact-api ZOR.ServiceEvent::::"
                                 "runCmdOnPartition::PartitionId::2";
@@ -105,9 +105,9 @@ TEST(TimeLimits, ListingsKeepNoNote) {
 }
 
 TEST(TimeLimits, OnlyTheMachineListingStaysStoppedAfterItsActionIsKilled) {
-    EXPECT_FALSE(Fleet::resumesAfterStop(UnitKind::MachineListing));
-    EXPECT_TRUE(Fleet::resumesAfterStop(UnitKind::PartitionListing));
-    EXPECT_TRUE(Fleet::resumesAfterStop(UnitKind::Survey));
+    EXPECT_FALSE(fleet::resumesAfterStop(UnitKind::MachineListing));
+    EXPECT_TRUE(fleet::resumesAfterStop(UnitKind::PartitionListing));
+    EXPECT_TRUE(fleet::resumesAfterStop(UnitKind::Survey));
 }
 
 } // namespace

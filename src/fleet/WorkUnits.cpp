@@ -12,7 +12,7 @@
 #include <algorithm>
 #include <ostream>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -49,7 +49,7 @@ void closeTrace() {
 std::string listMachines() {
     Quorvex::PYLON::ListOf_Machines machines;
     std::sort(machines.begin(), machines.end());
-    FieldCodec::Record identities;
+    FieldRecord identities;
     for (auto const& machine : machines) {
         std::string const identity = machine.get_MTMS();
         if (machine.get_ObjectType() == gc_ManagedMachineType &&
@@ -57,11 +57,11 @@ std::string listMachines() {
             identities.push_back(identity);
         }
     }
-    return FieldCodec::encode(identities);
+    return encodeFields(identities);
 }
 
 std::vector<std::string> decodeMachines(std::string const& text) {
-    auto const records = FieldCodec::decode(text);
+    auto const records = decodeFields(text);
     if (!records || records->size() != 1) {
         return {};
     }
@@ -77,10 +77,10 @@ std::string listPartitions(std::string const& identity, std::string const& trace
         Quorvex::PYLON::ListOf_Partitions partitions;
         partitions.getPartitions_FromMachine(Quorvex::PYLON::Machine(gc_ManagedMachineType, mtms));
         for (auto const& partition : partitions) {
-            encoded += FieldCodec::encode({partition.get_PartitionID(), partition.get_IP(),
-                                           partition.get_ActiveStatus(), partition.get_HostName(),
-                                           partition.get_OperatingSystem_Name(),
-                                           partition.get_OperatingSystem_Version()});
+            encoded += encodeFields({partition.get_PartitionID(), partition.get_IP(),
+                                     partition.get_ActiveStatus(), partition.get_HostName(),
+                                     partition.get_OperatingSystem_Name(),
+                                     partition.get_OperatingSystem_Version()});
         }
     }
     closeTrace();
@@ -89,7 +89,7 @@ std::string listPartitions(std::string const& identity, std::string const& trace
 
 std::optional<std::vector<Quorvex::System::Partition>> decodePartitions(std::string const& identity,
                                                                         std::string const& text) {
-    auto const records = FieldCodec::decode(text);
+    auto const records = decodeFields(text);
     if (!records) {
         return std::nullopt;
     }
@@ -121,14 +121,13 @@ std::string surveyPartition(Quorvex::System::Partition const& partition,
             partition, &ChildProcess::stopNote);
     }
     closeTrace();
-    return FieldCodec::encode({outcome.fileName, outcome.returnCode, outcome.statusText,
-                               std::to_string(static_cast<int>(outcome.kind)),
-                               optionalText(outcome.rc), optionalText(outcome.rcCmd),
-                               outcome.reason});
+    return encodeFields({outcome.fileName, outcome.returnCode, outcome.statusText,
+                         std::to_string(static_cast<int>(outcome.kind)), optionalText(outcome.rc),
+                         optionalText(outcome.rcCmd), outcome.reason});
 }
 
 std::optional<PartitionOutcome> decodeOutcome(std::string const& text) {
-    auto const records = FieldCodec::decode(text);
+    auto const records = decodeFields(text);
     if (!records || records->size() != 1 || records->front().size() != gc_OutcomeFields) {
         return std::nullopt;
     }
@@ -148,4 +147,4 @@ std::optional<PartitionOutcome> decodeOutcome(std::string const& text) {
     return outcome;
 }
 
-} // namespace Fleet
+} // namespace fleet

@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-namespace Fleet {
+namespace fleet {
 
 // What each forked unit of work does, and how its result travels back to
 // the parent. Each body runs in a child process of its own: the survey code
@@ -32,4 +32,4 @@ std::string surveyPartition(Quorvex::System::Partition const& partition,
                             std::string const& tracePiece);
 std::optional<Quorvex::PYLON::VPD::PartitionOutcome> decodeOutcome(std::string const& text);
 
-} // namespace Fleet
+} // namespace fleet

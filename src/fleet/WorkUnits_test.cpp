@@ -6,13 +6,13 @@
 
 namespace {
 
-using Fleet::FieldCodec;
+using fleet::encodeFields;
 using Kind = Quorvex::PYLON::VPD::PartitionOutcomeKind;
 
 TEST(WorkUnits, PartitionsAreRebuiltWithTheMachineAndEveryField) {
-    std::string const text = FieldCodec::encode({"7", "", "3", "aurora", "Zeph", "7.2"}) +
-                             FieldCodec::encode({"7", "10.0.0.1", " 3x", "", "", ""});
-    auto const partitions = Fleet::decodePartitions("9119-MHE_21ABCDE", text);
+    std::string const text = encodeFields({"7", "", "3", "aurora", "Zeph", "7.2"}) +
+                             encodeFields({"7", "10.0.0.1", " 3x", "", "", ""});
+    auto const partitions = fleet::decodePartitions("9119-MHE_21ABCDE", text);
     ASSERT_TRUE(partitions.has_value());
     ASSERT_EQ(partitions->size(), 2U);
     auto const& first = (*partitions)[0];
@@ -26,20 +26,20 @@ TEST(WorkUnits, PartitionsAreRebuiltWithTheMachineAndEveryField) {
 }
 
 TEST(WorkUnits, ListingCutShortIsRejected) {
-    EXPECT_FALSE(Fleet::decodePartitions("A-1_B", "6:1:7").has_value());
-    EXPECT_FALSE(Fleet::decodePartitions("A-1_B", FieldCodec::encode({"7"})).has_value());
+    EXPECT_FALSE(fleet::decodePartitions("A-1_B", "6:1:7").has_value());
+    EXPECT_FALSE(fleet::decodePartitions("A-1_B", encodeFields({"7"})).has_value());
 }
 
 TEST(WorkUnits, EmptyListingGivesNoPartitions) {
-    auto const partitions = Fleet::decodePartitions("A-1_B", "");
+    auto const partitions = fleet::decodePartitions("A-1_B", "");
     ASSERT_TRUE(partitions.has_value());
     EXPECT_TRUE(partitions->empty());
 }
 
 TEST(WorkUnits, OutcomeFieldsAreReadBack) {
-    std::string const text = FieldCodec::encode(
+    std::string const text = encodeFields(
         {"VPD/f.VPD.xml", "8", "get result Failed, rc = 3", "4", "3", "0", "reason\n"});
-    auto const outcome = Fleet::decodeOutcome(text);
+    auto const outcome = fleet::decodeOutcome(text);
     ASSERT_TRUE(outcome.has_value());
     EXPECT_EQ(outcome->fileName, "VPD/f.VPD.xml");
     EXPECT_EQ(outcome->returnCode, "8");
@@ -51,7 +51,7 @@ TEST(WorkUnits, OutcomeFieldsAreReadBack) {
 }
 
 TEST(WorkUnits, MissingCodesStayUnknown) {
-    auto const outcome = Fleet::decodeOutcome(FieldCodec::encode({"", "8", "x", "1", "", "", ""}));
+    auto const outcome = fleet::decodeOutcome(encodeFields({"", "8", "x", "1", "", "", ""}));
     ASSERT_TRUE(outcome.has_value());
     EXPECT_EQ(outcome->kind, Kind::Inactive);
     EXPECT_FALSE(outcome->rc.has_value());
@@ -59,16 +59,15 @@ TEST(WorkUnits, MissingCodesStayUnknown) {
 }
 
 TEST(WorkUnits, OutcomeOfAChildThatDiedIsRejected) {
-    EXPECT_FALSE(Fleet::decodeOutcome("").has_value());
-    EXPECT_FALSE(Fleet::decodeOutcome(FieldCodec::encode({"a", "b"})).has_value());
-    EXPECT_FALSE(
-        Fleet::decodeOutcome(FieldCodec::encode({"", "8", "x", "9", "", "", ""})).has_value());
+    EXPECT_FALSE(fleet::decodeOutcome("").has_value());
+    EXPECT_FALSE(fleet::decodeOutcome(encodeFields({"a", "b"})).has_value());
+    EXPECT_FALSE(fleet::decodeOutcome(encodeFields({"", "8", "x", "9", "", "", ""})).has_value());
 }
 
 TEST(WorkUnits, MachineListIsOneRecordOfIdentities) {
-    EXPECT_EQ(Fleet::decodeMachines(FieldCodec::encode({"A-1_B", "C-2_D"})),
+    EXPECT_EQ(fleet::decodeMachines(encodeFields({"A-1_B", "C-2_D"})),
               (std::vector<std::string>{"A-1_B", "C-2_D"}));
-    EXPECT_TRUE(Fleet::decodeMachines("").empty());
+    EXPECT_TRUE(fleet::decodeMachines("").empty());
 }
 
 } // namespace

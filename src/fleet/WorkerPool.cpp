@@ -4,7 +4,7 @@
 
 #include <algorithm>
 
-namespace Fleet {
+namespace fleet {
 
 namespace {
 
@@ -143,4 +143,4 @@ std::optional<WorkerEvent> WorkerPool::_stopAction(Worker& worker, pid_t action,
     return event;
 }
 
-} // namespace Fleet
+} // namespace fleet

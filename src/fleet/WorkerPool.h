@@ -11,7 +11,7 @@
 #include <string>
 #include <vector>
 
-namespace Fleet {
+namespace fleet {
 
 // How long the run waits for its workers at most before it looks at the
 // time limits again: the one poll interval of the program.
@@ -85,4 +85,4 @@ private:
     std::vector<int> _readyDescriptors;
 };
 
-} // namespace Fleet
+} // namespace fleet

@@ -16,10 +16,10 @@
 
 namespace {
 
-using Fleet::TimeLimits;
-using Fleet::UnitKind;
-using Fleet::WorkerEvent;
-using Fleet::WorkerPool;
+using fleet::TimeLimits;
+using fleet::UnitKind;
+using fleet::WorkerEvent;
+using fleet::WorkerPool;
 
 constexpr int gc_NoWake = -1;
 // Bounds of waits that end long before unless something is wrong.
@@ -53,9 +53,9 @@ std::vector<WorkerEvent> waitFor(WorkerPool& pool, WorkerEvent::Kind kind,
 bool waitForCommand(std::string const& text) {
     auto const deadline = std::chrono::steady_clock::now() + gc_Bound;
     while (std::chrono::steady_clock::now() < deadline) {
-        std::vector<pid_t> const below = Fleet::descendantsOf(getpid());
+        std::vector<pid_t> const below = fleet::descendantsOf(getpid());
         if (std::any_of(below.begin(), below.end(), [&text](pid_t pid) {
-                return Fleet::commandLineOf(pid).find(text) != std::string::npos;
+                return fleet::commandLineOf(pid).find(text) != std::string::npos;
             })) {
             return true;
         }
@@ -121,7 +121,7 @@ TEST(WorkerPool, ActionOfAYoungUnitIsLeftAloneUnderTheTimeLimit) {
 // Starts body as the pool's one worker, interrupts the run once a process
 // below this one runs command, and returns what the pool reported up to the
 // worker's end.
-std::vector<WorkerEvent> interruptWhileRunning(UnitKind kind, Fleet::ChildProcess::Body const& body,
+std::vector<WorkerEvent> interruptWhileRunning(UnitKind kind, fleet::ChildProcess::Body const& body,
                                                std::string const& command, TimeLimits& limits) {
     WorkerPool pool(gc_NoWake);
     if (pool.start(4, kind, body) || !waitForCommand(command)) {
@@ -153,7 +153,7 @@ TEST(WorkerPool, StoppedSurveyActionLeavesTheNoteOfItsAgeForTheWorker) {
         UnitKind::Survey,
         [command] {
             std::system(command.c_str());
-            return Fleet::ChildProcess::stopNote();
+            return fleet::ChildProcess::stopNote();
         },
         "runact-api 300", limits);
     ASSERT_GE(events.size(), 2U);

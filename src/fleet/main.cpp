@@ -8,12 +8,15 @@
 #include "fleet/WorkerPool.h"
 #include "report/ReportCommand.h"
 #include "report/RunSummary.h"
+#include "utility/AtomicFile.h"
 #include "utility/LocalTime.h"
+#include "utility/SystemError.h"
 #include "utility/Trace.h"
 
 #include <chrono>
 #include <ctime>
 #include <iostream>
+#include <sstream>
 
 namespace {
 
@@ -22,19 +25,19 @@ namespace {
 // runs past the time limit, or an interruption, stops the listing with
 // everything it started, and it never goes on: the run then has no machines.
 std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
-    Fleet::WorkerPool pool(Fleet::signalPipeDescriptor());
-    Fleet::TimeLimits limits(timeoutSeconds);
+    fleet::WorkerPool pool(fleet::signalPipeDescriptor());
+    fleet::TimeLimits limits(timeoutSeconds);
     if (std::optional<std::string> const failure =
-            pool.start(0, Fleet::UnitKind::MachineListing, &Fleet::listMachines)) {
+            pool.start(0, fleet::UnitKind::MachineListing, &fleet::listMachines)) {
         std::cerr << "quorvex-survey: cannot list the managed machines: " << *failure << std::endl;
         return {};
     }
     while (true) {
-        std::vector<Fleet::WorkerEvent> const ended = pool.waitForEvents();
+        std::vector<fleet::WorkerEvent> const ended = pool.waitForEvents();
         if (!ended.empty()) {
-            return Fleet::decodeMachines(ended.front().text);
+            return fleet::decodeMachines(ended.front().text);
         }
-        limits.interrupt(Fleet::takeSignal());
+        limits.interrupt(fleet::takeSignal());
         if (!pool.stopDueActions(limits).empty() || limits.isInterrupted()) {
             // The pool ends the stopped worker with everything it started.
             return {};
@@ -42,18 +45,12 @@ std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
     }
 }
 
-void writeSummary(Fleet::RunFacts const& facts, nlohmann::ordered_json const& summary) {
-    std::string const text = report::summaryText(summary);
-    if (!Fleet::RunFiles::writeAtomically(facts.options.summaryFile, text)) {
-        std::cerr << "quorvex-survey: cannot write the summary to " << facts.options.summaryFile
-                  << std::endl;
-    }
-}
-
-// The summary and the report of a run that has ended.
-void writeRunFiles(Fleet::Options const& options, Fleet::SurveyRun const& run, int exitStatus,
-                   std::time_t started, std::chrono::steady_clock::time_point startedAt) {
-    Fleet::RunFacts facts;
+// The summary and the report of a run that has ended. What cannot be
+// written is said in messages, one line each.
+void writeRunFiles(fleet::Options const& options, fleet::SurveyRun const& run, int exitStatus,
+                   std::time_t started, std::chrono::steady_clock::time_point startedAt,
+                   std::ostream& messages) {
+    fleet::RunFacts facts;
     facts.options = options;
     // Every unit of work has ended: the host name command may trace here.
     facts.consoleHost = Utility::get_HostName();
@@ -62,23 +59,39 @@ void writeRunFiles(Fleet::Options const& options, Fleet::SurveyRun const& run, i
     facts.elapsedSeconds =
         std::chrono::duration<double>(std::chrono::steady_clock::now() - startedAt).count();
     if (run.interruptingSignal() != 0) {
-        facts.interruptedBy = Fleet::signalName(run.interruptingSignal());
+        facts.interruptedBy = fleet::signalName(run.interruptingSignal());
     }
     facts.exitStatus = exitStatus;
     nlohmann::ordered_json const summary =
-        report::summaryDocument(Fleet::runSummary(facts, run.machines()));
-    if (!options.summaryFile.empty()) {
-        writeSummary(facts, summary);
+        report::summaryDocument(fleet::runSummary(facts, run.machines()));
+    try {
+        if (!options.summaryFile.empty()) {
+            util::writeFileAtomically(options.summaryFile, report::summaryText(summary));
+        }
+    } catch (util::SystemError const& failure) {
+        messages << "quorvex-survey: " << failure.what() << "\n";
     }
     if (!options.reportFolder.empty()) {
-        report::writeRunReport(summary, options.reportFolder, std::cerr);
+        report::writeRunReport(summary, options.reportFolder, messages);
     }
+}
+
+// Diagnostics after the machines' blocks, each on a line of its own,
+// though the last block ends with its code digit and no line end.
+void printAfterBlocks(fleet::SurveyRun const& run, std::string const& messages) {
+    if (messages.empty()) {
+        return;
+    }
+    if (run.endsOnOpenRow()) {
+        std::cerr << "\n";
+    }
+    std::cerr << messages << std::flush;
 }
 
 } // namespace
 
 int main(int argc, char** argv) {
-    auto const parsed = Fleet::CommandLine::parse(argc, argv);
+    auto const parsed = fleet::parseCommandLine(argc, argv);
     if (parsed.exitStatus) {
         return *parsed.exitStatus;
     }
@@ -88,20 +101,22 @@ int main(int argc, char** argv) {
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;
     }
-    if (std::optional<std::string> const failure = Fleet::installSignalPipe()) {
+    if (std::optional<std::string> const failure = fleet::installSignalPipe()) {
         std::cerr << "quorvex-survey: " << *failure << std::endl;
     }
     auto const startedAt = std::chrono::steady_clock::now();
     std::time_t const started = std::time(nullptr);
 
-    Fleet::Options const& options = parsed.options;
+    fleet::Options const& options = parsed.options;
     std::vector<std::string> const identities =
         options.all ? listManagedMachines(options.timeoutSeconds) : options.identities;
-    Fleet::SurveyRun run(options, identities);
+    fleet::SurveyRun run(options, identities);
     int const exitStatus = run.run();
 
+    std::ostringstream messages;
     if (!options.summaryFile.empty() || !options.reportFolder.empty()) {
-        writeRunFiles(options, run, exitStatus, started, startedAt);
+        writeRunFiles(options, run, exitStatus, started, startedAt, messages);
     }
+    printAfterBlocks(run, messages.str());
     return exitStatus;
 }

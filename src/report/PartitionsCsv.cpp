@@ -15,7 +15,7 @@ using Json = nlohmann::ordered_json;
 
 namespace {
 
-constexpr char rowEnd[] = "\r\n";
+constexpr char gc_RowEnd[] = "\r\n";
 
 std::vector<std::string> const& partitionColumns() {
     static std::vector<std::string> const columns = {
@@ -55,7 +55,7 @@ void appendRow(std::string& csv, std::vector<std::string> const& fields) {
         }
         csv += csvField(fields[i]);
     }
-    csv += rowEnd;
+    csv += gc_RowEnd;
 }
 
 } // namespace

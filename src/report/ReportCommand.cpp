@@ -10,14 +10,14 @@ namespace report {
 
 namespace {
 
-constexpr char programName[] = "quorvex-survey";
+constexpr char gc_ProgramName[] = "quorvex-survey";
 
 bool writeReportReporting(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
                           std::string const& folder, std::ostream& errors) {
     try {
         writeReport(summary, vpdFolder, folder);
     } catch (std::exception const& failure) {
-        errors << programName << ": report: " << failure.what() << "\n";
+        errors << gc_ProgramName << ": report: " << failure.what() << "\n";
         return false;
     }
     return true;

@@ -6,8 +6,8 @@ namespace report {
 
 namespace {
 
-constexpr char valueStart[] = "<Value type=\"string\">";
-constexpr char valueEnd[] = "</Value>";
+constexpr char gc_ValueStart[] = "<Value type=\"string\">";
+constexpr char gc_ValueEnd[] = "</Value>";
 
 // Where the value of the property named name starts, or npos.
 std::string::size_type valueOf(std::string const& text, std::string const& name) {
@@ -16,11 +16,11 @@ std::string::size_type valueOf(std::string const& text, std::string const& name)
     if (at == std::string::npos) {
         return std::string::npos;
     }
-    std::string::size_type const value = text.find(valueStart, at + property.size());
+    std::string::size_type const value = text.find(gc_ValueStart, at + property.size());
     if (value == std::string::npos) {
         return std::string::npos;
     }
-    return value + std::string(valueStart).size();
+    return value + std::string(gc_ValueStart).size();
 }
 
 std::optional<std::string> hostOf(std::string const& text) {
@@ -28,7 +28,7 @@ std::optional<std::string> hostOf(std::string const& text) {
     if (start == std::string::npos) {
         return std::nullopt;
     }
-    std::string::size_type const end = text.find(valueEnd, start);
+    std::string::size_type const end = text.find(gc_ValueEnd, start);
     if (end == std::string::npos) {
         return std::nullopt;
     }
@@ -42,7 +42,7 @@ std::optional<std::string> reasonOf(std::string const& text) {
     if (start == std::string::npos) {
         return std::nullopt;
     }
-    std::string::size_type const end = text.rfind(valueEnd);
+    std::string::size_type const end = text.rfind(gc_ValueEnd);
     if (end == std::string::npos || end < start) {
         return std::nullopt;
     }

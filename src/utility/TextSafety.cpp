@@ -6,7 +6,7 @@ namespace util {
 
 namespace {
 
-constexpr char replacementCharacter[] = "\xEF\xBF\xBD";
+constexpr char gc_ReplacementCharacter[] = "\xEF\xBF\xBD";
 
 // Length of the well-formed UTF-8 sequence starting at text[at], 0 when the
 // bytes there do not form one (overlong forms, surrogates and code points
@@ -70,7 +70,7 @@ std::string validUtf8(std::string const& bytes) {
     while (at < bytes.size()) {
         std::size_t const length = sequenceLength(bytes, at);
         if (length == 0) {
-            text += replacementCharacter;
+            text += gc_ReplacementCharacter;
             ++at;
             continue;
         }
