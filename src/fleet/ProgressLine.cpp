@@ -59,6 +59,10 @@ void ProgressLine::erase() {
     _out << "\033[B" << gc_EraseLine << backToOpenRow(_openColumns) << std::flush;
 }
 
+bool ProgressLine::isRowOpen() const {
+    return _openColumns > 0;
+}
+
 void ProgressLine::leaveOpenRow(std::size_t columns) {
     _openColumns = columns;
 }

@@ -33,6 +33,8 @@ public:
     // without a line end (a machine's block ends with its code digit, and
     // the next machine's output continues that row); 0 for an empty row.
     void leaveOpenRow(std::size_t columns);
+    // The output's last row has text and no line end yet.
+    bool isRowOpen() const;
 
 private:
     std::size_t _terminalColumns() const;

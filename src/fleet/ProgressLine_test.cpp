@@ -31,6 +31,17 @@ TEST(ProgressLine, LineBelowAnOpenRowComesBackToJustAfterTheRowsText) {
                          "\033[B\r\033[K\033[A\033[2G");
 }
 
+TEST(ProgressLine, RowIsOpenOnlyWhileOutputLeftItWithoutALineEnd) {
+    std::ostringstream out;
+    ProgressLine line(false, out, gc_NoTerminal);
+    EXPECT_FALSE(line.isRowOpen());
+    line.leaveOpenRow(1);
+    EXPECT_TRUE(line.isRowOpen());
+    line.leaveOpenRow(0);
+    EXPECT_FALSE(line.isRowOpen());
+    EXPECT_EQ(out.str(), "");
+}
+
 TEST(ProgressLine, LineNotShownIsNotErased) {
     std::ostringstream out;
     ProgressLine line(true, out, gc_NoTerminal);

@@ -49,7 +49,7 @@ std::vector<MachineRecord> const& SurveyRun::machines() const {
 }
 
 bool SurveyRun::endsOnOpenRow() const {
-    return _output.writtenCount() > 0;
+    return _progress.isRowOpen();
 }
 
 int SurveyRun::interruptingSignal() const {

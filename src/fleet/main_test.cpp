@@ -3,8 +3,6 @@
 
 #include "QuorvexTest.h"
 
-#include "QuorvexTest.h"
-
 #include <gtest/gtest.h>
 
 #include <string>
@@ -102,6 +100,21 @@ TEST_F(SurveyProgram, HungClientRunIsStoppedAndRecordedAsAnActionThatPrintedNoth
     std::string const json = QuorvexTest::readFile(summary);
     EXPECT_NE(json.find("\"outcome\": \"timed_out\""), std::string::npos);
     EXPECT_NE(json.find("\"action\": \"runCmdOnPartition\""), std::string::npos);
+}
+
+TEST_F(SurveyProgram, SummaryThatCannotBeWrittenIsSaidWithItsCauseOnALineOfItsOwn) {
+    QuorvexTest::SimulatedConsole const console(gc_Console);
+    CommandResult const single = runSingleMachineTool(gc_Machine);
+    QuorvexTest::clearFolder(gc_VPD_Folder);
+    QuorvexTest::TemporaryDirectory const folder;
+    std::string const summary = folder.file("missing/summary.json");
+
+    CommandResult const result = runSurvey({"-q", "--summary", summary, gc_Machine});
+    EXPECT_EQ(result.stdoutText, single.stdoutText);
+    // The machine's block ends with its code digit and no line end.
+    EXPECT_EQ(result.stderrText, single.stderrText + "\nquorvex-survey: cannot write " + summary +
+                                     ": No such file or directory\n");
+    EXPECT_TRUE(QuorvexTest::listFolder(folder.path()).empty());
 }
 
 TEST_F(SurveyProgram, TraceOfEachMachineIsKeptUnderItsOwnNameAndNoPieceIsLeft) {
