@@ -4,10 +4,11 @@ when its VPD folder gives nothing to read, and the partition IDs it takes
 from the names of documents that name no host.
 
 Usage: report_command_test.py QUORVEX_SURVEY SOURCE_ROOT TEST_NAME
-Exit status 0 passed, 1 failed.
+Exit status 0 passed, 1 failed, 77 skipped (the reason is printed).
 """
 import csv
 import os
+import shutil
 import subprocess
 import sys
 import tempfile
@@ -16,13 +17,24 @@ import unittest
 FLEET = ""
 SOURCE_ROOT = ""
 NOTHING_TO_READ = 64
+SKIP = 77
 
 
-def report(vpd_folder, folder):
+def report(vpd_folder, folder, prefix=()):
     """The exit status, standard output and standard error of a report."""
-    run = subprocess.run([FLEET, "report", "--from", vpd_folder, folder],
+    run = subprocess.run([*prefix, FLEET, "report", "--from", vpd_folder, folder],
                          capture_output=True, text=True, check=False)
     return run.returncode, run.stdout, run.stderr
+
+
+def as_unprivileged():
+    """What runs a command as a user that folder modes bind: root reads any
+    folder whatever its mode, so it runs the report as nobody."""
+    if os.geteuid() != 0:
+        return ()
+    if shutil.which("setpriv") is None:
+        return None
+    return ("setpriv", "--reuid=65534", "--regid=65534", "--clear-groups")
 
 
 class ReportCommandTest(unittest.TestCase):
@@ -46,6 +58,19 @@ class ReportCommandTest(unittest.TestCase):
         self.assertEqual(
             (NOTHING_TO_READ, "", f"quorvex-survey: report: cannot read {file}: Not a directory\n"),
             report(file, self.out))
+        self.assertFalse(os.path.exists(self.out))
+
+    def test_unreadable_folder_is_said_on_one_line_and_nothing_is_written(self):
+        prefix = as_unprivileged()
+        if prefix is None:
+            self.skipTest("running as root without setpriv to drop the privilege")
+        os.chmod(self.root.name, 0o777)
+        unreadable = os.path.join(self.root.name, "VPD")
+        os.mkdir(unreadable, 0o000)
+        self.assertEqual(
+            (NOTHING_TO_READ, "",
+             f"quorvex-survey: report: cannot read {unreadable}: Permission denied\n"),
+            report(unreadable, self.out, prefix))
         self.assertFalse(os.path.exists(self.out))
 
     def test_folder_without_status_file_is_said_and_nothing_is_written(self):
@@ -72,6 +97,9 @@ def main():
     FLEET, SOURCE_ROOT = sys.argv[1], sys.argv[2]
     suite = unittest.defaultTestLoader.loadTestsFromName(sys.argv[3], sys.modules[__name__])
     result = unittest.TextTestRunner(verbosity=2).run(suite)
+    if result.skipped and not result.failures and not result.errors:
+        print("skipped:", "; ".join(reason for _, reason in result.skipped))
+        return SKIP
     return 0 if result.wasSuccessful() and result.testsRun > 0 else 1
 
 
