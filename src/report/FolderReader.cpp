@@ -16,7 +16,6 @@
 #include <algorithm>
 #include <chrono>
 #include <filesystem>
-#include <iterator>
 #include <map>
 #include <sstream>
 #include <vector>
@@ -120,22 +119,32 @@ std::vector<StatusLine> readStatusLines(fs::path const& path) {
     return lines;
 }
 
+void addFolderEntry(fs::directory_entry const& entry, FolderFiles& files) {
+    std::string const name = entry.path().filename().string();
+    std::optional<std::string> const identity = VPD::get_IdentityOfStatusFileName(name);
+    bool const document = VPD::get_PartitionTextOfResultName(name).has_value();
+    std::error_code error;
+    if ((!identity && !document) || !entry.is_regular_file(error)) {
+        return;
+    }
+    if (identity) {
+        files.statusFiles.emplace(*identity, entry.path());
+    } else {
+        files.documents.push_back(entry.path());
+    }
+}
+
+// A folder that cannot be listed, wholly, is no run's files: reading it as
+// empty would report a console with no machines.
 FolderFiles listFolder(fs::path const& folder) {
     FolderFiles files;
     std::error_code error;
     for (fs::directory_iterator entry(folder, error), end; !error && entry != end;
          entry.increment(error)) {
-        std::string const name = entry->path().filename().string();
-        std::optional<std::string> const identity = VPD::get_IdentityOfStatusFileName(name);
-        bool const document = VPD::get_PartitionTextOfResultName(name).has_value();
-        if ((!identity && !document) || !entry->is_regular_file(error)) {
-            continue;
-        }
-        if (identity) {
-            files.statusFiles.emplace(*identity, entry->path());
-        } else {
-            files.documents.push_back(entry->path());
-        }
+        addFolderEntry(*entry, files);
+    }
+    if (error) {
+        throw util::SystemError("read", folder.string(), error.value());
     }
     return files;
 }
@@ -208,10 +217,32 @@ void addFailure(PartitionSummary& partition, FailureReason const& failure,
     }
 }
 
-PartitionSummary partitionSummary(StatusLine const& line, MachineDocuments& documents,
+// Each status line's document: first by the host its content names, then,
+// for the lines left without one, a document that names no host, its file
+// name giving the partition's ID.
+std::vector<DocumentFile const*> documentsOfLines(std::vector<StatusLine> const& lines,
+                                                  MachineDocuments& documents) {
+    std::vector<DocumentFile const*> found;
+    std::vector<std::size_t> without;
+    std::vector<std::optional<Outcome>> withoutOutcomes;
+    for (StatusLine const& line : lines) {
+        std::optional<Outcome> const statusOutcome = outcomeOfStatusText(line.statusText);
+        found.push_back(documents.take(line.host, statusOutcome));
+        if (found.back() == nullptr) {
+            without.push_back(found.size() - 1);
+            withoutOutcomes.push_back(statusOutcome);
+        }
+    }
+    std::vector<DocumentFile const*> const unnamed = documents.takeUnnamed(withoutOutcomes);
+    for (std::size_t i = 0; i < without.size(); ++i) {
+        found[without[i]] = unnamed[i];
+    }
+    return found;
+}
+
+PartitionSummary partitionSummary(StatusLine const& line, DocumentFile const* document,
                                   RunTraces& traces) {
     std::optional<Outcome> const statusOutcome = outcomeOfStatusText(line.statusText);
-    DocumentFile const* document = documents.take(line.host, statusOutcome);
     FailureReason const* failure =
         document != nullptr && document->failure ? &*document->failure : nullptr;
     PartitionSummary partition;
@@ -259,9 +290,10 @@ MachineSummary machineSummary(fs::path const& vpdFolder, std::string const& iden
     machine.statusFile = validUtf8(fs::absolute(statusFile).lexically_normal().string());
     machine.traceFile = traceFileOf(vpdFolder, identity);
     std::vector<StatusLine> const lines = readStatusLines(statusFile);
-    std::transform(
-        lines.begin(), lines.end(), std::back_inserter(machine.partitions),
-        [&](StatusLine const& line) { return partitionSummary(line, documents, traces); });
+    std::vector<DocumentFile const*> const found = documentsOfLines(lines, documents);
+    for (std::size_t i = 0; i < lines.size(); ++i) {
+        machine.partitions.push_back(partitionSummary(lines[i], found[i], traces));
+    }
     return machine;
 }
 

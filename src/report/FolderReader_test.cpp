@@ -1,6 +1,7 @@
 #include "report/FolderReader.h"
 
 #include "QuorvexTest.h"
+#include "utility/SystemError.h"
 
 #include <gtest/gtest.h>
 
@@ -288,11 +289,79 @@ TEST(FolderReader, OtherFilesAndOrphanDocumentsAreIgnored) {
     EXPECT_EQ("8", summary["return_code"]);
 }
 
-TEST(FolderReader, MissingFolderGivesAnEmptySummary) {
+// The message of the failure reading folder throws.
+std::string failureReading(std::string const& folder) {
+    try {
+        report::readSummaryFromFolder(folder);
+    } catch (util::SystemError const& failure) {
+        return failure.what();
+    }
+    return "(read)";
+}
+
+TEST(FolderReader, MissingFolderOrAFileIsAFailureNamingItAndItsCause) {
     QuorvexTest::TemporaryDirectory folder;
-    Json const summary = report::readSummaryFromFolder(folder.file("missing"));
-    EXPECT_EQ(0, summary["totals"]["machines"]);
-    EXPECT_EQ(0, summary["totals"]["partitions"]);
+    QuorvexTest::writeFile(folder.file("file"), "x");
+    EXPECT_EQ("cannot read " + folder.file("missing") + ": No such file or directory",
+              failureReading(folder.file("missing")));
+    EXPECT_EQ("cannot read " + folder.file("file") + ": Not a directory",
+              failureReading(folder.file("file")));
+}
+
+TEST(FolderReader, EmptyFolderGivesNoMachine) {
+    QuorvexTest::TemporaryDirectory folder;
+    EXPECT_EQ(0U, report::readSummaryFromFolder(folder.path())["machines"].size());
+}
+
+TEST(FolderReader, SurveyedPartitionWhoseDocumentNamesNoHostGetsTheIdOfItsFileName) {
+    QuorvexTest::TemporaryDirectory folder;
+    copyRun("worked-run", folder);
+    Json const summary = report::readSummaryFromFolder(folder.path());
+    Json const& partitions = summary["machines"][0]["partitions"];
+    ASSERT_EQ(3U, partitions.size());
+    EXPECT_EQ(nullptr, partitions[0]["id"]);
+    EXPECT_EQ("2", partitions[1]["id"]);
+    EXPECT_EQ(
+        R"({"id":"3","host":"host3","ip":"10.1.1.13","active_status":null,)"
+        R"("outcome":"surveyed","status_text":"Ok","return_code":"0","rc":null,)"
+        R"("rc_cmd":null,)"
+        R"("document":"VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-3.VPD.xml",)"
+        R"("reason":null,"seconds":null})",
+        partitions[2].dump());
+}
+
+TEST(FolderReader, EmptyHostNameInTheDocumentNamesNoHost) {
+    QuorvexTest::TemporaryDirectory folder;
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
+                           "aurora [10.0.0.1] - VPD Survey - Ok\n");
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S-12.VPD.xml"),
+                           fetchedDocument(""));
+    Json const summary = report::readSummaryFromFolder(folder.path());
+    EXPECT_EQ("12", summary["machines"][0]["partitions"][0]["id"]);
+}
+
+TEST(FolderReader, SurveyedPartitionsWithDocumentsNamingNoHostGetNoIdWhenTheyCouldBeSwapped) {
+    QuorvexTest::TemporaryDirectory folder;
+    copyRun("all-surveyed", folder);
+    Json const summary = report::readSummaryFromFolder(folder.path());
+    Json const& partitions = summary["machines"][0]["partitions"];
+    ASSERT_EQ(3U, partitions.size());
+    for (Json const& partition : partitions) {
+        EXPECT_EQ("surveyed", partition["outcome"]);
+        EXPECT_EQ(nullptr, partition["id"]);
+        EXPECT_EQ(nullptr, partition["document"]);
+    }
+}
+
+TEST(FolderReader, DocumentNamingAHostNoLineListsIsNotTaken) {
+    QuorvexTest::TemporaryDirectory folder;
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S.status"),
+                           "aurora [10.0.0.1] - VPD Survey - Ok\n");
+    QuorvexTest::writeFile(folder.file(std::string(gc_Prefix) + "1-A_S-4.VPD.xml"),
+                           fetchedDocument("boreas"));
+    Json const summary = report::readSummaryFromFolder(folder.path());
+    EXPECT_EQ(nullptr, summary["machines"][0]["partitions"][0]["id"]);
+    EXPECT_EQ(nullptr, summary["machines"][0]["partitions"][0]["document"]);
 }
 
 TEST(FolderReader, MachinesComeInIdentityOrder) {

@@ -44,6 +44,42 @@ bool fitsOutcome(std::optional<FailureReason> const& failure,
     return true;
 }
 
+// Whether a document fits a partition at all: an inactive one gets none.
+bool fits(DocumentFile const& document, std::optional<Outcome> statusOutcome) {
+    return statusOutcome != Outcome::Inactive && fitsOutcome(document.failure, statusOutcome);
+}
+
+// An empty HN is what a partition that reported no host name gives: it
+// names no host either.
+bool namesNoHost(DocumentFile const& document) {
+    return !document.content.host || document.content.host->empty();
+}
+
+// The one of candidates (indices into documents) that fits statusOutcome;
+// nullopt when none or several do.
+std::optional<std::size_t> onlyFitting(std::vector<DocumentFile> const& documents,
+                                       std::vector<std::size_t> const& candidates,
+                                       std::optional<Outcome> statusOutcome) {
+    std::optional<std::size_t> found;
+    for (std::size_t const i : candidates) {
+        if (fits(documents[i], statusOutcome)) {
+            if (found) {
+                return std::nullopt;
+            }
+            found = i;
+        }
+    }
+    return found;
+}
+
+bool fitsOnlyOne(DocumentFile const& document,
+                 std::vector<std::optional<Outcome>> const& statusOutcomes) {
+    return std::count_if(statusOutcomes.begin(), statusOutcomes.end(),
+                         [&](std::optional<Outcome> statusOutcome) {
+                             return fits(document, statusOutcome);
+                         }) == 1;
+}
+
 } // namespace
 
 MachineDocuments::MachineDocuments(std::vector<DocumentFile> documents)
@@ -71,6 +107,32 @@ DocumentFile const* MachineDocuments::take(std::string const& host,
     }
     _taken[*found] = true;
     return &_documents[*found];
+}
+
+std::vector<DocumentFile const*>
+MachineDocuments::takeUnnamed(std::vector<std::optional<Outcome>> const& statusOutcomes) {
+    std::vector<std::size_t> unnamed;
+    for (std::size_t i = 0; i < _documents.size(); ++i) {
+        if (!_taken[i] && namesNoHost(_documents[i])) {
+            unnamed.push_back(i);
+        }
+    }
+    // Every pairing is decided before any document is taken, so that it does
+    // not depend on the order of the partitions.
+    std::vector<std::optional<std::size_t>> found;
+    for (std::optional<Outcome> const statusOutcome : statusOutcomes) {
+        std::optional<std::size_t> const only = onlyFitting(_documents, unnamed, statusOutcome);
+        bool const sure = only && fitsOnlyOne(_documents[*only], statusOutcomes);
+        found.push_back(sure ? only : std::nullopt);
+    }
+    std::vector<DocumentFile const*> documents;
+    for (std::optional<std::size_t> const i : found) {
+        if (i) {
+            _taken[*i] = true;
+        }
+        documents.push_back(i ? &_documents[*i] : nullptr);
+    }
+    return documents;
 }
 
 } // namespace report

@@ -31,8 +31,21 @@ DocumentFile stoppedBySignal(std::string const& id, std::string const& host) {
     return document;
 }
 
+DocumentFile unnamed(DocumentFile document) {
+    document.content.host = std::nullopt;
+    return document;
+}
+
 std::string idOf(DocumentFile const* document) {
     return document == nullptr ? "(none)" : document->id;
+}
+
+std::string idsOf(std::vector<DocumentFile const*> const& documents) {
+    std::string ids;
+    for (DocumentFile const* document : documents) {
+        ids += (ids.empty() ? "" : " ") + idOf(document);
+    }
+    return ids;
 }
 
 TEST(MachineDocuments, SurveyedPartitionTakesAFetchedDocumentOfItsHost) {
@@ -78,6 +91,44 @@ TEST(MachineDocuments, InactivePartitionAndUnknownHostTakeNothing) {
     EXPECT_EQ("(none)", idOf(documents.take("a", Outcome::Inactive)));
     EXPECT_EQ("(none)", idOf(documents.take("b", Outcome::Surveyed)));
     EXPECT_EQ("1", idOf(documents.take("a", Outcome::Surveyed)));
+}
+
+TEST(MachineDocuments, OnlyUnnamedDocumentOfItsKindGoesToTheOnlyPartitionItFits) {
+    MachineDocuments documents({unnamed(fetched("3", "")), fetched("4", "a")});
+    EXPECT_EQ("3", idsOf(documents.takeUnnamed({Outcome::Surveyed})));
+    EXPECT_EQ("4", idOf(documents.take("a", Outcome::Surveyed)));
+}
+
+TEST(MachineDocuments, TwoAlikePartitionsAndTwoUnnamedDocumentsGetNone) {
+    MachineDocuments documents({unnamed(fetched("1", "")), unnamed(fetched("2", ""))});
+    EXPECT_EQ("(none) (none)",
+              idsOf(documents.takeUnnamed({Outcome::Surveyed, Outcome::Surveyed})));
+}
+
+TEST(MachineDocuments, OneUnnamedDocumentFittingTwoPartitionsGoesToNeither) {
+    MachineDocuments documents({unnamed(failed("5", "", RemoteAction::RunCommand))});
+    EXPECT_EQ("(none) (none)",
+              idsOf(documents.takeUnnamed({Outcome::ChannelFailure, std::nullopt})));
+}
+
+TEST(MachineDocuments, UnnamedDocumentsOfDifferentKindsGoEachToItsPartition) {
+    MachineDocuments documents({unnamed(failed("1", "", RemoteAction::GetFile)),
+                                unnamed(fetched("2", "")), unnamed(stoppedBySignal("3", ""))});
+    EXPECT_EQ("3 2 1 (none)",
+              idsOf(documents.takeUnnamed({Outcome::Interrupted, Outcome::Surveyed,
+                                           Outcome::FetchFailure, Outcome::ClientFailure})));
+}
+
+TEST(MachineDocuments, InactivePartitionTakesNoUnnamedDocumentAndLeavesNoDoubt) {
+    MachineDocuments documents({unnamed(failed("1", "", RemoteAction::RunCommand))});
+    EXPECT_EQ("(none) 1",
+              idsOf(documents.takeUnnamed({Outcome::Inactive, Outcome::ClientFailure})));
+}
+
+TEST(MachineDocuments, DocumentNamingAHostOrAlreadyTakenIsNotGivenByItsFileName) {
+    MachineDocuments documents({fetched("1", "a"), fetched("2", "")});
+    EXPECT_EQ("2", idOf(documents.take("", Outcome::Surveyed)));
+    EXPECT_EQ("(none)", idsOf(documents.takeUnnamed({Outcome::Surveyed})));
 }
 
 } // namespace

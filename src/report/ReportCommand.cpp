@@ -2,8 +2,10 @@
 
 #include "report/FolderReader.h"
 #include "report/ReportWriter.h"
+#include "utility/SystemError.h"
 
 #include <CLI/CLI.hpp>
+#include <optional>
 #include <stdexcept>
 
 namespace report {
@@ -23,15 +25,36 @@ bool writeReportReporting(nlohmann::ordered_json const& summary, std::string con
     return true;
 }
 
+// The summary of the files in vpdFolder; nothing, the reason said on errors,
+// when there is nothing to read: an empty report would look like a console
+// without machines.
+std::optional<nlohmann::ordered_json> readSummaryReporting(std::string const& vpdFolder,
+                                                           std::ostream& errors) {
+    std::optional<nlohmann::ordered_json> summary;
+    try {
+        summary = readSummaryFromFolder(vpdFolder);
+    } catch (util::SystemError const& failure) {
+        errors << gc_ProgramName << ": report: " << failure.what() << "\n";
+        return std::nullopt;
+    }
+    if ((*summary)["machines"].empty()) {
+        errors << gc_ProgramName << ": report: " << vpdFolder
+               << " holds no status file of a survey run\n";
+        return std::nullopt;
+    }
+    return summary;
+}
+
 } // namespace
 
 CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request) {
     CLI::App* const command = app.add_subcommand(
         "report", "write the report (index.html, partitions.csv, summary.json) of the "
                   "survey files earlier runs left into DIR");
+    // Whether the folder can be read is checked when it is read, so that the
+    // default folder and a given one fail alike.
     command->add_option("--from", request.vpdFolder, "folder of the status files and VPD documents")
-        ->capture_default_str()
-        ->check(CLI::ExistingDirectory);
+        ->capture_default_str();
     command->add_option("DIR", request.folder, "folder to write the report into")->required();
     return command;
 }
@@ -42,8 +65,12 @@ CLI::Option* addReportOption(CLI::App& app, std::string& folder) {
 }
 
 int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors) {
-    nlohmann::ordered_json const summary = readSummaryFromFolder(request.vpdFolder);
-    if (!writeReportReporting(summary, request.vpdFolder, request.folder, errors)) {
+    std::optional<nlohmann::ordered_json> const summary =
+        readSummaryReporting(request.vpdFolder, errors);
+    if (!summary) {
+        return gc_ExitNothingToRead;
+    }
+    if (!writeReportReporting(*summary, request.vpdFolder, request.folder, errors)) {
         return 1;
     }
     out << request.folder << "/index.html\n";

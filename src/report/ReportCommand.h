@@ -11,6 +11,12 @@ namespace report {
 // The console's folder of status files and VPD documents.
 inline constexpr char defaultVpdFolder[] = "/var/adm/quorvex/VPD";
 
+// The exit status of "report" when its VPD folder gives nothing to read:
+// missing, not a folder, unreadable, or holding no status file of a survey
+// run. The folder is one of the command's arguments, default or given, so it
+// is the status of a bad command line.
+inline constexpr int gc_ExitNothingToRead = 64;
+
 // What "report [--from VPD_FOLDER] DIR" was given.
 struct ReportRequest {
     std::string vpdFolder = defaultVpdFolder;
@@ -26,8 +32,10 @@ CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request);
 CLI::Option* addReportOption(CLI::App& app, std::string& folder);
 
 // Writes the report of the survey files in request.vpdFolder into
-// request.folder and prints the page's path on out. Returns 0, or 1 with the
-// reason on errors when a file cannot be written.
+// request.folder and prints the page's path on out. Returns 0; 1 with the
+// reason on errors when a file cannot be written; gc_ExitNothingToRead with
+// the reason on errors, writing nothing, when the VPD folder gives nothing
+// to read.
 int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors);
 
 // Writes the report of a run's summary into folder, its documents lying in

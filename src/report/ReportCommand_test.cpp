@@ -5,9 +5,14 @@
 #include <CLI/CLI.hpp>
 #include <gtest/gtest.h>
 
+#include <unistd.h>
+
+#include <filesystem>
 #include <sstream>
 
 namespace {
+
+namespace fs = std::filesystem;
 
 constexpr char statusName[] = "quorvexPYLON_VPD_Survey_ClientPartition_1-A_S.status";
 
@@ -36,14 +41,64 @@ TEST(ReportCommand, SubcommandTakesFrom) {
     EXPECT_EQ("out", request.folder);
 }
 
-TEST(ReportCommand, SubcommandWithoutFolderOrWithMissingFromIsRefused) {
+TEST(ReportCommand, SubcommandWithoutFolderIsRefused) {
     CLI::App app;
     report::ReportRequest request;
     report::addReportSubcommand(app, request);
     EXPECT_THROW(parse(app, {"report"}), CLI::ParseError);
-    CLI::App other;
-    report::addReportSubcommand(other, request);
-    EXPECT_THROW(parse(other, {"report", "--from", "/nonexistent/folder", "out"}), CLI::ParseError);
+}
+
+TEST(ReportCommand, SubcommandLeavesAMissingFromFolderToTheRun) {
+    CLI::App app;
+    report::ReportRequest request;
+    report::addReportSubcommand(app, request);
+    parse(app, {"report", "--from", "/nonexistent/folder", "out"});
+    EXPECT_EQ("/nonexistent/folder", request.vpdFolder);
+}
+
+// What a run that has nothing to read gives: its status, its standard
+// output and error, and whether it wrote into its report folder.
+std::string refusedRun(std::string const& vpdFolder, std::string const& folder) {
+    std::ostringstream out;
+    std::ostringstream errors;
+    int const status = report::runReportSubcommand({vpdFolder, folder}, out, errors);
+    return std::to_string(status) + "|" + out.str() + "|" + errors.str() + "|" +
+           (QuorvexTest::fileExists(folder) ? "written" : "nothing written");
+}
+
+TEST(ReportCommand, RunFromAMissingFolderOrAFileSaysWhyAndWritesNothing) {
+    QuorvexTest::TemporaryDirectory root;
+    QuorvexTest::writeFile(root.file("file"), "x");
+    EXPECT_EQ("64||quorvex-survey: report: cannot read " + root.file("missing") +
+                  ": No such file or directory\n|nothing written",
+              refusedRun(root.file("missing"), root.file("r")));
+    EXPECT_EQ("64||quorvex-survey: report: cannot read " + root.file("file") +
+                  ": Not a directory\n|nothing written",
+              refusedRun(root.file("file"), root.file("r")));
+}
+
+TEST(ReportCommand, RunFromAFolderWithoutStatusFilesSaysSoAndWritesNothing) {
+    QuorvexTest::TemporaryDirectory root;
+    fs::create_directory(root.file("VPD"));
+    QuorvexTest::writeFile(root.file("VPD/quorvexPYLON_VPD_Survey_ClientPartition_1-A_S-1.VPD.xml"),
+                           "x");
+    EXPECT_EQ("64||quorvex-survey: report: " + root.file("VPD") +
+                  " holds no status file of a survey run\n|nothing written",
+              refusedRun(root.file("VPD"), root.file("r")));
+}
+
+TEST(ReportCommand, RunFromAnUnreadableFolderSaysWhyAndWritesNothing) {
+    if (geteuid() == 0) {
+        GTEST_SKIP() << "root reads a folder whatever its mode";
+    }
+    QuorvexTest::TemporaryDirectory root;
+    fs::create_directory(root.file("VPD"));
+    fs::permissions(root.file("VPD"), fs::perms::none);
+    std::string const result = refusedRun(root.file("VPD"), root.file("r"));
+    fs::permissions(root.file("VPD"), fs::perms::owner_all);
+    EXPECT_EQ("64||quorvex-survey: report: cannot read " + root.file("VPD") +
+                  ": Permission denied\n|nothing written",
+              result);
 }
 
 TEST(ReportCommand, ReportOptionTakesTheFolder) {
@@ -67,6 +122,7 @@ TEST(ReportCommand, RunWritesTheReportAndPrintsThePagesPath) {
 
 TEST(ReportCommand, RunThatCannotWriteSaysWhyAndFails) {
     QuorvexTest::TemporaryDirectory root;
+    QuorvexTest::writeFile(root.file(statusName), "h [1] - VPD Survey - Ok\n");
     QuorvexTest::writeFile(root.file("file"), "x");
     std::ostringstream out;
     std::ostringstream errors;
