@@ -8,13 +8,14 @@
 #include <unistd.h>
 
 #include <filesystem>
+#include <iostream>
 #include <sstream>
 
 namespace {
 
 namespace fs = std::filesystem;
 
-constexpr char statusName[] = "quorvexPYLON_VPD_Survey_ClientPartition_1-A_S.status";
+constexpr char gc_StatusName[] = "quorvexPYLON_VPD_Survey_ClientPartition_1-A_S.status";
 
 void parse(CLI::App& app, std::vector<std::string> arguments) {
     std::reverse(arguments.begin(), arguments.end());
@@ -87,18 +88,28 @@ TEST(ReportCommand, RunFromAFolderWithoutStatusFilesSaysSoAndWritesNothing) {
               refusedRun(root.file("VPD"), root.file("r")));
 }
 
+// The user root reads a folder whatever its mode: the run that is refused
+// runs in a child as the unprivileged user nobody.
+constexpr uid_t gc_Nobody = 65534;
+
 TEST(ReportCommand, RunFromAnUnreadableFolderSaysWhyAndWritesNothing) {
-    if (geteuid() == 0) {
-        GTEST_SKIP() << "root reads a folder whatever its mode";
-    }
     QuorvexTest::TemporaryDirectory root;
+    fs::permissions(root.path(),
+                    fs::perms::owner_all | fs::perms::others_read | fs::perms::others_exec);
     fs::create_directory(root.file("VPD"));
     fs::permissions(root.file("VPD"), fs::perms::none);
-    std::string const result = refusedRun(root.file("VPD"), root.file("r"));
+    QuorvexTest::CommandResult const result = QuorvexTest::runInChild([&] {
+        if (geteuid() == 0 && (setgid(gc_Nobody) != 0 || setuid(gc_Nobody) != 0)) {
+            return 2;
+        }
+        std::cout << refusedRun(root.file("VPD"), root.file("r"));
+        return 0;
+    });
     fs::permissions(root.file("VPD"), fs::perms::owner_all);
+    EXPECT_EQ(0, result.exitStatus) << result.stderrText;
     EXPECT_EQ("64||quorvex-survey: report: cannot read " + root.file("VPD") +
                   ": Permission denied\n|nothing written",
-              result);
+              result.stdoutText);
 }
 
 TEST(ReportCommand, ReportOptionTakesTheFolder) {
@@ -111,7 +122,7 @@ TEST(ReportCommand, ReportOptionTakesTheFolder) {
 
 TEST(ReportCommand, RunWritesTheReportAndPrintsThePagesPath) {
     QuorvexTest::TemporaryDirectory root;
-    QuorvexTest::writeFile(root.file(statusName), "h [1] - VPD Survey - Ok\n");
+    QuorvexTest::writeFile(root.file(gc_StatusName), "h [1] - VPD Survey - Ok\n");
     std::ostringstream out;
     std::ostringstream errors;
     EXPECT_EQ(0, report::runReportSubcommand({root.path(), root.file("r")}, out, errors));
@@ -122,7 +133,7 @@ TEST(ReportCommand, RunWritesTheReportAndPrintsThePagesPath) {
 
 TEST(ReportCommand, RunThatCannotWriteSaysWhyAndFails) {
     QuorvexTest::TemporaryDirectory root;
-    QuorvexTest::writeFile(root.file(statusName), "h [1] - VPD Survey - Ok\n");
+    QuorvexTest::writeFile(root.file(gc_StatusName), "h [1] - VPD Survey - Ok\n");
     QuorvexTest::writeFile(root.file("file"), "x");
     std::ostringstream out;
     std::ostringstream errors;
