@@ -71,6 +71,74 @@ private:
     QuorvexTest::TemporaryDirectory _folder;
 };
 
+// A folder, put first in PATH, that lets tools/ensure-deps reach apt-get
+// without touching the host's packages: an id that says root, and an
+// apt-get, given as a shell script body, that records its arguments, one
+// call a line, in the file "calls". Every package counts as missing
+// (QUORVEX_DEPS_ROOT names an empty folder).
+class StandInAptGet {
+public:
+    explicit StandInAptGet(std::string const& body) {
+        _write("id", "echo 0\n");
+        _write("apt-get", "printf '%s\\n' \"$*\" >>'" + calls() + "'\n" + body);
+    }
+
+    std::string calls() const { return _folder.file("calls"); }
+
+    CommandResult runEnsureDeps(std::string const& lockSeconds) const {
+        char const* path = std::getenv("PATH");
+        return runCommand(
+            {"/usr/bin/env",
+             "PATH=" + _folder.path() + ":" + (path != nullptr ? path : "/usr/bin:/bin"),
+             "QUORVEX_DEPS_ROOT=" + _noPackages.path(), "QUORVEX_APT_LOCK_SECONDS=" + lockSeconds,
+             QuorvexTest::sourceRoot() + "/tools/ensure-deps"});
+    }
+
+private:
+    void _write(std::string const& name, std::string const& body) const {
+        QuorvexTest::writeFile(_folder.file(name), "#!/bin/sh\n" + body);
+        ::chmod(_folder.file(name).c_str(), 0755);
+    }
+
+    QuorvexTest::TemporaryDirectory _folder;
+    QuorvexTest::TemporaryDirectory _noPackages;
+};
+
+// What apt-get says when another process holds the lock of its package
+// lists (it does not wait for that one) and of dpkg's frontend (it waits
+// for DPkg::Lock::Timeout seconds, saying so on its standard output).
+constexpr char gc_ListsLockHeld[] =
+    "echo 'Reading package lists...'\n"
+    "echo 'E: Could not get lock /var/lib/apt/lists/lock. It is held by process 812 "
+    "(apt-get)' >&2\n"
+    "echo 'E: Unable to lock directory /var/lib/apt/lists/' >&2\n"
+    "exit 100\n";
+constexpr char gc_FrontendLockHeldOnInstall[] =
+    "case \" $* \" in *' install '*)\n"
+    "  echo 'Waiting for cache lock: Could not get lock /var/lib/dpkg/lock-frontend. It is held "
+    "by process 4030 (unattended-upgr)...'\n"
+    "  echo 'Waiting for cache lock: Could not get lock /var/lib/dpkg/lock-frontend. It is held "
+    "by process 4030 (unattended-upgr)...'\n"
+    "  echo 'E: Unable to acquire the dpkg frontend lock (/var/lib/dpkg/lock-frontend), is "
+    "another process using it?' >&2\n"
+    "  exit 100 ;;\n"
+    "esac\n";
+
+constexpr char gc_Packages[] = "cmake g++ make libgtest-dev util-linux time proot python3 "
+                               "libcli11-dev nlohmann-json3-dev python3-jsonschema";
+
+std::string _waitingLine(std::string const& lock, std::string const& seconds) {
+    return "ensure-deps: another package manager holds apt's lock " + lock +
+           "; waiting for it, up to " + seconds + " s (QUORVEX_APT_LOCK_SECONDS)\n";
+}
+
+std::string _stillHeldLine(std::string const& lock, std::string const& seconds) {
+    return "ensure-deps: apt's lock " + lock + " is still held after " + seconds +
+           " s: another package manager (an automatic upgrade, say) is at work. Let it finish "
+           "and run tools/ensure-deps again, or wait longer with "
+           "QUORVEX_APT_LOCK_SECONDS=SECONDS.\n";
+}
+
 constexpr char gc_SummaryWithSkips[] = "90% tests passed, 0 tests failed out of 10\n"
                                        "\n"
                                        "The following tests did not run:\n"
@@ -162,4 +230,78 @@ TEST(Scripts, TestPassesWithoutSkips) {
 TEST(Scripts, TestFailsWithTheStatusOfFailedTests) {
     CommandResult const run = StandInBuildTools(gc_SummaryWithoutSkips, 8).runTest("1");
     EXPECT_EQ(8, run.exitStatus) << run.stderrText;
+}
+
+TEST(Scripts, EnsureDepsPassesTheLockBoundToAptGetAndNamesAListsLockStillHeld) {
+    StandInAptGet const aptGet(gc_ListsLockHeld);
+    CommandResult const run = aptGet.runEnsureDeps("2");
+    EXPECT_EQ(1, run.exitStatus);
+    std::vector<std::string> const calls =
+        QuorvexTest::linesOf(QuorvexTest::readFile(aptGet.calls()));
+    ASSERT_LE(2U, calls.size());
+    EXPECT_EQ("-o DPkg::Lock::Timeout=2 update -q", calls.front());
+    for (std::string const& call : calls) {
+        EXPECT_TRUE(util::startsWith(call, "-o DPkg::Lock::Timeout=")) << call;
+        EXPECT_TRUE(util::endsWith(call, " update -q")) << call;
+    }
+    std::string const lock = "/var/lib/apt/lists/lock (held by process 812 (apt-get))";
+    EXPECT_EQ(_waitingLine(lock, "2") + _stillHeldLine(lock, "2"), run.stderrText);
+}
+
+TEST(Scripts, EnsureDepsSaysOnceThatItWaitsForTheFrontendLockAndNamesItAfterTheBound) {
+    StandInAptGet const aptGet(gc_FrontendLockHeldOnInstall);
+    CommandResult const run = aptGet.runEnsureDeps("0");
+    EXPECT_EQ(1, run.exitStatus);
+    EXPECT_EQ(std::string("-o DPkg::Lock::Timeout=0 update -q\n"
+                          "-o DPkg::Lock::Timeout=0 install -y -q --no-install-recommends ") +
+                  gc_Packages + "\n",
+              QuorvexTest::readFile(aptGet.calls()));
+    std::string const lock = "/var/lib/dpkg/lock-frontend (held by process 4030 (unattended-upgr))";
+    EXPECT_EQ(_waitingLine(lock, "0") + _stillHeldLine(lock, "0"), run.stderrText);
+    EXPECT_EQ(std::string::npos, run.stdoutText.find("Waiting for cache lock")) << run.stdoutText;
+}
+
+TEST(Scripts, EnsureDepsGoesOnOnceTheLockIsFreed) {
+    // The first call finds the lock held and leaves a mark beside apt-get.
+    StandInAptGet const heldOnce(std::string("if [ ! -e \"${0%/*}/freed\" ]; then\n"
+                                             ": >\"${0%/*}/freed\"\n") +
+                                 gc_ListsLockHeld + "fi\n");
+    CommandResult const run = heldOnce.runEnsureDeps("60");
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    std::vector<std::string> const calls =
+        QuorvexTest::linesOf(QuorvexTest::readFile(heldOnce.calls()));
+    ASSERT_EQ(3U, calls.size());
+    EXPECT_EQ("-o DPkg::Lock::Timeout=60 update -q", calls[0]);
+    EXPECT_TRUE(util::endsWith(calls[1], " update -q")) << calls[1];
+    EXPECT_TRUE(util::endsWith(calls[2], std::string(" install -y -q --no-install-recommends ") +
+                                             gc_Packages))
+        << calls[2];
+    EXPECT_EQ(_waitingLine("/var/lib/apt/lists/lock (held by process 812 (apt-get))", "60"),
+              run.stderrText);
+}
+
+TEST(Scripts, EnsureDepsPassesOnAnAptGetFailureThatIsNotALock) {
+    StandInAptGet const aptGet("echo 'E: The repository is not signed.' >&2\nexit 100\n");
+    CommandResult const run = aptGet.runEnsureDeps("60");
+    EXPECT_EQ(100, run.exitStatus);
+    EXPECT_EQ("-o DPkg::Lock::Timeout=60 update -q\n", QuorvexTest::readFile(aptGet.calls()));
+    EXPECT_EQ("E: The repository is not signed.\n", run.stderrText);
+}
+
+TEST(Scripts, EnsureDepsRefusesALockBoundThatIsNotANumberOfSeconds) {
+    StandInAptGet const aptGet("");
+    CommandResult const run = aptGet.runEnsureDeps("5m");
+    EXPECT_EQ(2, run.exitStatus);
+    EXPECT_EQ("ensure-deps: QUORVEX_APT_LOCK_SECONDS must be a number of seconds, not '5m'\n"
+              "ensure-deps: try 'tools/ensure-deps --help'\n",
+              run.stderrText);
+    EXPECT_FALSE(QuorvexTest::fileExists(aptGet.calls()));
+}
+
+TEST(Scripts, EnsureDepsHelpDocumentsTheLockBoundAndItsDefault) {
+    CommandResult const run =
+        runCommand({QuorvexTest::sourceRoot() + "/tools/ensure-deps", "--help"});
+    EXPECT_NE(std::string::npos, run.stdoutText.find("QUORVEX_APT_LOCK_SECONDS=SECONDS"))
+        << run.stdoutText;
+    EXPECT_NE(std::string::npos, run.stdoutText.find("default 300")) << run.stdoutText;
 }

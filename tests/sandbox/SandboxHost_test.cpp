@@ -98,6 +98,13 @@ std::string _pathMissingOnTheHost(QuorvexTest::TemporaryDirectory const& unique,
     return "/opt/" + std::filesystem::path(unique.path()).filename().string() + rest;
 }
 
+// The warning for a path that names the sandbox's private /tmp.
+std::string _privateTmpWarning(std::string const& path) {
+    return "sandbox: warning: " + path +
+           " is inside the sandbox's private /tmp: it is not seen outside the sandbox; use a "
+           "folder outside /tmp\n";
+}
+
 } // namespace
 
 TEST(SandboxHost, ExitStatusOfTheCommandPassesThrough) {
@@ -512,4 +519,71 @@ TEST(SandboxHost, SeccompHelperRefusesStatxWithEnosys) {
          "print(result, os.strerror(ctypes.get_errno()))\n"});
     EXPECT_EQ(0, run.exitStatus) << run.stderrText;
     EXPECT_EQ("-1 Function not implemented\n", run.stdoutText);
+}
+
+TEST(SandboxHost, CommandArgumentUnderTmpGetsOneWarningLineEach) {
+    CommandResult const run =
+        _sandboxWith({}, {"--", "true", "--report", "/tmp/quorvex-report", "/tmp/survey.json"});
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ(_privateTmpWarning("/tmp/quorvex-report") + _privateTmpWarning("/tmp/survey.json"),
+              run.stderrText);
+}
+
+TEST(SandboxHost, CommandArgumentOutsideTmpGetsNoWarning) {
+    CommandResult const run = _sandboxWith(
+        {}, {"--", "true", "--summary", QuorvexTest::sourceRoot() + "/out/summary.json",
+             "--report=/var/tmp/report", "/tmpfile", "tmp/relative"});
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ("", run.stderrText);
+}
+
+TEST(SandboxHost, OptionWithATmpValueAfterAnEqualsSignGetsAWarning) {
+    CommandResult const run = _sandboxWith({}, {"--", "true", "--summary=/tmp/x.json"});
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ(_privateTmpWarning("/tmp/x.json"), run.stderrText);
+}
+
+TEST(SandboxHost, ScenarioVariableUnderTmpGetsAWarningNamingTheVariable) {
+    CommandResult const run =
+        _sandboxWith({"PYLON_SIM_SCENARIO=/tmp/demo.scn", "PYLON_SIM_LOG="}, {"--", "true"});
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ("sandbox: warning: /tmp/demo.scn (PYLON_SIM_SCENARIO) is inside the sandbox's "
+              "private /tmp: it is not seen outside the sandbox; use a folder outside /tmp\n",
+              run.stderrText);
+}
+
+// A folder under /tmp that is bound into the sandbox, by --bind or as the
+// working folder, is the host's own: paths in it are seen on both sides.
+TEST(SandboxHost, PathInAFolderBoundIntoTheSandboxGetsNoWarning) {
+    QuorvexTest::TemporaryDirectory bound;
+    QuorvexTest::TemporaryDirectory working;
+    CommandResult const run = runCommand(
+        {"/usr/bin/env", "-C", working.path(), "PYLON_SIM_SCENARIO=" + bound.file("demo.scn"),
+         QuorvexTest::sandboxPath(), "--sim", QuorvexTest::simulatorPath(), "--bind",
+         bound.path() + ":" + bound.path(), "--", "true", bound.file("summary.json"),
+         "--report=" + working.file("report")});
+    if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
+        GTEST_SKIP() << run.stderrText;
+    }
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ("", run.stderrText);
+}
+
+TEST(SandboxHost, HelpDescribesTheWarningForPathsUnderTmp) {
+    CommandResult const run = _sandbox({"--help"});
+    EXPECT_NE(std::string::npos, run.stdoutText.find("sandbox: warning: PATH is inside the "
+                                                     "sandbox's private /tmp"))
+        << run.stdoutText;
 }
