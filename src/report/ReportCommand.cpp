@@ -4,6 +4,7 @@
 #include "report/ReportWriter.h"
 
 #include <CLI/CLI.hpp>
+#include <filesystem>
 #include <stdexcept>
 
 namespace report {
@@ -23,22 +24,42 @@ bool writeReportReporting(nlohmann::ordered_json const& summary, std::string con
     return true;
 }
 
+// The folder is checked here rather than by a parser check, so that a
+// refusal says in plain words what is wrong.
+void takeVpdFolder(ReportRequest& request, std::string const& folder) {
+    std::error_code failure;
+    if (!std::filesystem::is_directory(folder, failure)) {
+        throw CLI::ValidationError("--from " + folder + ": no such folder");
+    }
+    request.vpdFolder = folder;
+}
+
 } // namespace
 
 CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request) {
-    CLI::App* const command = app.add_subcommand(
-        "report", "write the report (index.html, partitions.csv, summary.json) of the "
-                  "survey files earlier runs left into DIR");
-    command->add_option("--from", request.vpdFolder, "folder of the status files and VPD documents")
-        ->capture_default_str()
-        ->check(CLI::ExistingDirectory);
-    command->add_option("DIR", request.folder, "folder to write the report into")->required();
+    CLI::App* const command =
+        app.add_subcommand("report", "write into DIR the report of the files earlier runs left");
+    command
+        ->add_option_function<std::string>(
+            "--from", [&request](std::string const& folder) { takeVpdFolder(request, folder); },
+            "where the status files and VPD documents are")
+        ->type_name("VPD_FOLDER")
+        ->default_str(defaultVpdFolder)
+        ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    command->add_option("DIR", request.folder, "folder to write the report into");
     return command;
+}
+
+void checkReportRequest(ReportRequest const& request) {
+    if (request.folder.empty()) {
+        throw CLI::ValidationError("no DIR given (the folder to write the report into)");
+    }
 }
 
 CLI::Option* addReportOption(CLI::App& app, std::string& folder) {
     return app.add_option("--report", folder, "after the run, write its report into DIR")
-        ->type_name("DIR");
+        ->type_name("DIR")
+        ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
 }
 
 int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors) {

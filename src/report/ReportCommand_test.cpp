@@ -36,14 +36,37 @@ TEST(ReportCommand, SubcommandTakesFrom) {
     EXPECT_EQ("out", request.folder);
 }
 
-TEST(ReportCommand, SubcommandWithoutFolderOrWithMissingFromIsRefused) {
+TEST(ReportCommand, SubcommandWithoutFolderIsRefusedInPlainWords) {
     CLI::App app;
     report::ReportRequest request;
     report::addReportSubcommand(app, request);
-    EXPECT_THROW(parse(app, {"report"}), CLI::ParseError);
-    CLI::App other;
-    report::addReportSubcommand(other, request);
-    EXPECT_THROW(parse(other, {"report", "--from", "/nonexistent/folder", "out"}), CLI::ParseError);
+    parse(app, {"report"});
+    try {
+        report::checkReportRequest(request);
+        FAIL() << "no refusal";
+    } catch (CLI::ValidationError const& error) {
+        EXPECT_STREQ("no DIR given (the folder to write the report into)", error.what());
+    }
+}
+
+TEST(ReportCommand, SubcommandWithFolderPassesTheCheck) {
+    CLI::App app;
+    report::ReportRequest request;
+    report::addReportSubcommand(app, request);
+    parse(app, {"report", "out"});
+    EXPECT_NO_THROW(report::checkReportRequest(request));
+}
+
+TEST(ReportCommand, FromThatIsNoFolderIsRefusedInPlainWords) {
+    CLI::App app;
+    report::ReportRequest request;
+    report::addReportSubcommand(app, request);
+    try {
+        parse(app, {"report", "--from", "/nonexistent/folder", "out"});
+        FAIL() << "no refusal";
+    } catch (CLI::ValidationError const& error) {
+        EXPECT_STREQ("--from /nonexistent/folder: no such folder", error.what());
+    }
 }
 
 TEST(ReportCommand, ReportOptionTakesTheFolder) {
