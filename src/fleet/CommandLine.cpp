@@ -6,8 +6,10 @@
 #include <CLI/CLI.hpp>
 
 #include <algorithm>
+#include <array>
 #include <charconv>
 #include <iostream>
+#include <iterator>
 #include <memory>
 #include <set>
 
@@ -35,6 +37,7 @@ constexpr WholeNumber gc_Timeout{"-t,--timeout", "SECONDS", "a whole number of s
 // words come from their limits.
 struct ValueWords {
     char const* valueName;
+    // cppcheck-suppress unusedStructMember ; read by valueWords()
     char const* words;
 };
 constexpr ValueWords gc_TextValues[] = {
@@ -57,17 +60,21 @@ std::string errorName(std::string names) {
 }
 
 std::string valueWords(std::string const& valueName) {
-    for (WholeNumber const& number : {gc_Jobs, gc_Timeout}) {
-        if (valueName == number.valueName) {
-            return numberWords(number);
-        }
+    std::array<WholeNumber, 2> const numbers{gc_Jobs, gc_Timeout};
+    auto const number = std::find_if(numbers.begin(), numbers.end(), [&](WholeNumber const& n) {
+        return valueName == n.valueName;
+    });
+    if (number != numbers.end()) {
+        return numberWords(*number);
     }
-    for (ValueWords const& value : gc_TextValues) {
-        if (valueName == value.valueName) {
-            return value.words;
-        }
-    }
-    return "";
+    auto const text = std::find_if(std::begin(gc_TextValues), std::end(gc_TextValues),
+                                   [&](ValueWords const& v) { return valueName == v.valueName; });
+    return text == std::end(gc_TextValues) ? "" : text->words;
+}
+
+// No identity of the console starts with "-": such a word is an option.
+bool isOptionLike(std::string const& word) {
+    return word.rfind('-', 0) == 0;
 }
 
 // The number in text, or a refusal that says what the option takes.
@@ -122,9 +129,9 @@ void addSurveyOptions(CLI::App& app, Options& options) {
 std::vector<std::string> longOptions(CLI::App const& app) {
     std::vector<std::string> known;
     for (CLI::Option const* option : app.get_options()) {
-        for (std::string const& name : option->get_lnames()) {
-            known.push_back("--" + name);
-        }
+        std::vector<std::string> const& names = option->get_lnames();
+        std::transform(names.begin(), names.end(), std::back_inserter(known),
+                       [](std::string const& name) { return "--" + name; });
     }
     return known;
 }
@@ -138,29 +145,31 @@ std::string unknownOption(CLI::App const& app, std::string const& argument) {
     return reason;
 }
 
-// Whatever the parser could not place. A word that starts with "-" is an
-// option it does not know: no identity of the console starts so.
+// Whatever the parser could not place, an option first: a word after an
+// unknown option may only seem out of place because of it. A "--" left over
+// only marks the words after it as identities.
 void refuseLeftOver(CLI::App const& app) {
-    for (std::string const& argument : app.remaining()) {
-        if (argument.rfind('-', 0) == 0) {
-            throw CLI::ValidationError(unknownOption(app, argument));
-        }
+    std::vector<std::string> leftOver = app.remaining();
+    leftOver.erase(std::remove(leftOver.begin(), leftOver.end(), "--"), leftOver.end());
+    auto const option = std::find_if(leftOver.begin(), leftOver.end(), isOptionLike);
+    if (option != leftOver.end()) {
+        throw CLI::ValidationError(unknownOption(app, *option));
     }
-    if (!app.remaining().empty()) {
-        throw CLI::ValidationError("unexpected argument '" + app.remaining().front() + "'");
+    if (!leftOver.empty()) {
+        throw CLI::ValidationError("unexpected argument '" + leftOver.front() + "'");
     }
 }
 
 // What the parser does not check: a survey needs machines, either --all or
 // identities, and an identity is neither empty nor an option.
 void checkMachines(CLI::App const& app, Options const& options) {
-    for (std::string const& identity : options.identities) {
-        if (identity.rfind('-', 0) == 0) {
-            throw CLI::ValidationError(unknownOption(app, identity));
-        }
-        if (identity.empty()) {
-            throw CLI::ValidationError("an identity must not be empty");
-        }
+    std::vector<std::string> const& identities = options.identities;
+    auto const option = std::find_if(identities.begin(), identities.end(), isOptionLike);
+    if (option != identities.end()) {
+        throw CLI::ValidationError(unknownOption(app, *option));
+    }
+    if (std::find(identities.begin(), identities.end(), "") != identities.end()) {
+        throw CLI::ValidationError("an identity must not be empty");
     }
     if (options.all && !options.identities.empty()) {
         throw CLI::ValidationError(

@@ -116,7 +116,7 @@ TEST(CommandLine, OptionFarFromEveryKnownOneIsNamedAlone) {
 
 TEST(CommandLine, WordStartingWithDashIsNeverAnIdentity) {
     expectRefused({"-5"}, "unknown option -5");
-    expectRefused({"A_1", "--", "-B_2"}, "unknown option --");
+    expectRefused({"A_1", "--", "-B_2"}, "unknown option -B_2");
 }
 
 TEST(CommandLine, JobsOutsideOneTo1024SayWhatJobsTakes) {

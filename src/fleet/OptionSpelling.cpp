@@ -43,7 +43,7 @@ std::optional<std::string> closestOption(std::string const& typed,
     if (typed.size() < 3 || !startsWith(typed, "--")) {
         return std::nullopt;
     }
-    if (std::optional<std::string> const started = onlyOneStartingWith(typed, knownOptions)) {
+    if (std::optional<std::string> started = onlyOneStartingWith(typed, knownOptions)) {
         return started;
     }
     std::optional<std::string> nearest;

@@ -9,6 +9,8 @@
 
 #include <gtest/gtest.h>
 
+#include <ostream>
+
 namespace {
 
 using QuorvexTest::CommandResult;
@@ -33,6 +35,11 @@ struct BadCommandLine {
     // cppcheck-suppress unusedStructMember ; read through GetParam()
     std::string helpCommand = "quorvex-survey";
 };
+
+// The case by its name in test listings, not as the bytes of the struct.
+void PrintTo(BadCommandLine const& badCommandLine, std::ostream* out) {
+    *out << badCommandLine.name;
+}
 
 class FleetBadCommandLine : public ::testing::TestWithParam<BadCommandLine> {};
 
