@@ -106,10 +106,6 @@ void addWholeNumber(CLI::App& app, WholeNumber const& number, Number& target,
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
 }
 
-} // namespace
-
-namespace {
-
 // The survey's options; the report subcommand adds its own.
 void addSurveyOptions(CLI::App& app, Options& options) {
     addWholeNumber(app, gc_Jobs, options.jobs,
@@ -208,6 +204,9 @@ CLI::App const& refusingCommand(CLI::App const& app) {
 // last word names the option without its value ("--summary", or "-qj" for -j).
 std::string missingValue(CLI::App const& command, std::string const& lastArgument,
                          std::string const& parserReason) {
+    if (lastArgument.empty()) {
+        return parserReason;
+    }
     std::string const name = lastArgument.rfind("--", 0) == 0
                                  ? typedOptionName(lastArgument)
                                  : std::string{'-', lastArgument.back()};
@@ -267,6 +266,8 @@ ParsedCommandLine parseCommandLine(int argc, char const* const* argv) {
                  gc_ProgramName};
     app.formatter(std::make_shared<HelpFormatter>(
         std::vector<std::string>{"[options] IDENTITY...", "[options] --all"}));
+    // Words the parser does not know are kept for refuseLeftOver(), which
+    // names them in plain words with the option most likely meant.
     app.allow_extras();
     app.set_help_flag("-h,--help", "print this help and exit");
     app.set_version_flag("--version", versionText(), "print the version and exit");
