@@ -1,9 +1,16 @@
 #include "fleet/CommandLine.h"
 
+#include "fleet/HelpFormatter.h"
+#include "fleet/OptionSpelling.h"
+
 #include <CLI/CLI.hpp>
 
 #include <algorithm>
+#include <array>
+#include <charconv>
 #include <iostream>
+#include <iterator>
+#include <memory>
 #include <set>
 
 namespace fleet {
@@ -11,46 +18,162 @@ namespace fleet {
 namespace {
 
 constexpr char gc_ProgramName[] = "quorvex-survey";
-constexpr std::size_t gc_MostJobs = 1024;
-constexpr unsigned int gc_LongestTimeout = 31536000;
+
+// An option that takes a whole number within limits.
+struct WholeNumber {
+    char const* names;
+    // The value's name in the help.
+    char const* valueName;
+    char const* what;
+    unsigned long long lowest;
+    unsigned long long highest;
+};
+
+constexpr WholeNumber gc_Jobs{"-j,--jobs", "N", "a whole number", 1, 1024};
+constexpr WholeNumber gc_Timeout{"-t,--timeout", "SECONDS", "a whole number of seconds", 0,
+                                 31536000};
+
+// What a value of each name takes, in the words of the errors; the numbers'
+// words come from their limits.
+struct ValueWords {
+    char const* valueName;
+    // cppcheck-suppress unusedStructMember ; read by valueWords()
+    char const* words;
+};
+constexpr ValueWords gc_TextValues[] = {
+    {"FILE", "a file name"}, {"DIR", "a folder name"}, {"VPD_FOLDER", "a folder name"}};
 
 std::string const& versionText() {
     static std::string const text = std::string(gc_ProgramName) + " " + QUORVEX_SURVEY_VERSION;
     return text;
 }
 
+std::string numberWords(WholeNumber const& number) {
+    return std::string(number.what) + " from " + std::to_string(number.lowest) + " to " +
+           std::to_string(number.highest);
+}
+
+// "-j/--jobs" of "-j,--jobs": how errors name an option, every spelling of it.
+std::string errorName(std::string names) {
+    std::replace(names.begin(), names.end(), ',', '/');
+    return names;
+}
+
+std::string valueWords(std::string const& valueName) {
+    std::array<WholeNumber, 2> const numbers{gc_Jobs, gc_Timeout};
+    auto const number = std::find_if(numbers.begin(), numbers.end(), [&](WholeNumber const& n) {
+        return valueName == n.valueName;
+    });
+    if (number != numbers.end()) {
+        return numberWords(*number);
+    }
+    auto const text = std::find_if(std::begin(gc_TextValues), std::end(gc_TextValues),
+                                   [&](ValueWords const& v) { return valueName == v.valueName; });
+    return text == std::end(gc_TextValues) ? "" : text->words;
+}
+
+// No identity of the console starts with "-": such a word is an option.
+bool isOptionLike(std::string const& word) {
+    return word.rfind('-', 0) == 0;
+}
+
+// The number in text, or a refusal that says what the option takes.
+unsigned long long wholeNumber(WholeNumber const& number, std::string const& text) {
+    unsigned long long value = 0;
+    char const* const end = text.data() + text.size();
+    auto const [stop, failure] = std::from_chars(text.data(), end, value);
+    if (text.empty() || failure != std::errc{} || stop != end || value < number.lowest ||
+        value > number.highest) {
+        throw CLI::ValidationError(errorName(number.names) + " takes " + numberWords(number) +
+                                   ", not '" + text + "'");
+    }
+    return value;
+}
+
+// The parser only splits the words; the number is read here, so that a
+// refusal can say what the option takes. Given twice, the last one counts.
+template <typename Number>
+void addWholeNumber(CLI::App& app, WholeNumber const& number, Number& target,
+                    std::string const& description) {
+    app.add_option_function<std::string>(
+           number.names,
+           [&target, number](std::string const& text) {
+               target = static_cast<Number>(wholeNumber(number, text));
+           },
+           description)
+        ->type_name(number.valueName)
+        ->default_str(std::to_string(target))
+        ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+}
+
 // The survey's options; the report subcommand adds its own.
 void addSurveyOptions(CLI::App& app, Options& options) {
-    // Defaults are shown for the numbers only: CLI11 2.1 reads past the end of
-    // an empty list when it captures the identities' default.
-    app.add_option("-j,--jobs", options.jobs,
-                   "Partitions surveyed at the same time, over all machines (1 = one after the "
-                   "other)")
-        ->check(CLI::Range(std::size_t{1}, gc_MostJobs))
-        ->capture_default_str();
-    app.add_option("-t,--timeout", options.timeoutSeconds,
-                   "Time limit in seconds of one remote action (0 = none)")
-        ->check(CLI::Range(0U, gc_LongestTimeout))
-        ->capture_default_str();
-    app.add_option("--summary", options.summaryFile,
-                   "Write a machine-readable summary of the run (JSON) to this file");
-    app.add_flag("-q,--quiet", options.quiet, "No progress display");
-    auto* all = app.add_flag("--all", options.all,
-                             "Every managed machine the console lists with object type 0");
-    auto* identities =
-        app.add_option("IDENTITY", options.identities, "Managed machine (type-model_serial)");
-    identities->excludes(all);
+    addWholeNumber(app, gc_Jobs, options.jobs,
+                   "partitions surveyed at the same time, all machines together");
+    addWholeNumber(app, gc_Timeout, options.timeoutSeconds,
+                   "time limit of one remote action, 0 for none");
+    app.add_option("--summary", options.summaryFile, "write a summary of the run (JSON) to FILE")
+        ->type_name("FILE")
+        ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    app.add_flag("-q,--quiet", options.quiet, "no progress line");
+    app.add_flag("--all", options.all, "every managed machine the console lists");
+    app.add_option("IDENTITY", options.identities, "a managed machine (type-model_serial)");
     report::addReportOption(app, options.reportFolder);
 }
 
-// What CLI11 cannot say: a survey needs machines, and no identity is empty.
-void checkMachines(Options const& options) {
-    if (!options.all && options.identities.empty()) {
-        throw CLI::RequiredError("IDENTITY or --all");
+// The long options app knows, for guessing what a mistyped one meant.
+std::vector<std::string> longOptions(CLI::App const& app) {
+    std::vector<std::string> known;
+    for (CLI::Option const* option : app.get_options()) {
+        std::vector<std::string> const& names = option->get_lnames();
+        std::transform(names.begin(), names.end(), std::back_inserter(known),
+                       [](std::string const& name) { return "--" + name; });
     }
-    if (std::any_of(options.identities.begin(), options.identities.end(),
-                    [](std::string const& identity) { return identity.empty(); })) {
-        throw CLI::ValidationError("IDENTITY", "an identity must not be empty");
+    return known;
+}
+
+std::string unknownOption(CLI::App const& app, std::string const& argument) {
+    std::string const typed = typedOptionName(argument);
+    std::string reason = "unknown option " + typed;
+    if (std::optional<std::string> const meant = closestOption(typed, longOptions(app))) {
+        reason += ": did you mean " + *meant + "?";
+    }
+    return reason;
+}
+
+// Whatever the parser could not place, an option first: a word after an
+// unknown option may only seem out of place because of it. A "--" left over
+// only marks the words after it as identities.
+void refuseLeftOver(CLI::App const& app) {
+    std::vector<std::string> leftOver = app.remaining();
+    leftOver.erase(std::remove(leftOver.begin(), leftOver.end(), "--"), leftOver.end());
+    auto const option = std::find_if(leftOver.begin(), leftOver.end(), isOptionLike);
+    if (option != leftOver.end()) {
+        throw CLI::ValidationError(unknownOption(app, *option));
+    }
+    if (!leftOver.empty()) {
+        throw CLI::ValidationError("unexpected argument '" + leftOver.front() + "'");
+    }
+}
+
+// What the parser does not check: a survey needs machines, either --all or
+// identities, and an identity is neither empty nor an option.
+void checkMachines(CLI::App const& app, Options const& options) {
+    std::vector<std::string> const& identities = options.identities;
+    auto const option = std::find_if(identities.begin(), identities.end(), isOptionLike);
+    if (option != identities.end()) {
+        throw CLI::ValidationError(unknownOption(app, *option));
+    }
+    if (std::find(identities.begin(), identities.end(), "") != identities.end()) {
+        throw CLI::ValidationError("an identity must not be empty");
+    }
+    if (options.all && !options.identities.empty()) {
+        throw CLI::ValidationError(
+            "--all and identities exclude each other: give either --all or identities");
+    }
+    if (!options.all && options.identities.empty()) {
+        throw CLI::ValidationError("no machine to survey: give identities (type-model_serial) "
+                                   "or --all");
     }
 }
 
@@ -71,42 +194,97 @@ void keepFirstOfEach(ParsedCommandLine& parsed) {
     parsed.options.identities = kept;
 }
 
-// The program ends here: --help, --version, or a bad command line.
-ParsedCommandLine endingWith(int exitStatus) {
+// The command a refusal belongs to: the subcommand once it was named.
+CLI::App const& refusingCommand(CLI::App const& app) {
+    std::vector<CLI::App*> const subcommands = app.get_subcommands();
+    return subcommands.empty() ? app : *subcommands.front();
+}
+
+// The parser runs short of words only at the end of the command line: the
+// last word names the option without its value ("--summary", or "-qj" for -j).
+std::string missingValue(CLI::App const& command, std::string const& lastArgument,
+                         std::string const& parserReason) {
+    if (lastArgument.empty()) {
+        return parserReason;
+    }
+    std::string const name = lastArgument.rfind("--", 0) == 0
+                                 ? typedOptionName(lastArgument)
+                                 : std::string{'-', lastArgument.back()};
+    CLI::Option const* const option = command.get_option_no_throw(name);
+    if (option == nullptr || option->get_type_size() == 0) {
+        return parserReason;
+    }
+    std::string const words = valueWords(option->get_type_name());
+    return errorName(option->get_name(false, true)) + " needs a value" +
+           (words.empty() ? "" : " (" + words + ")");
+}
+
+// The reason on one line, then where the whole usage is: the help no longer
+// follows, so that the reason stays on the screen.
+ParsedCommandLine refused(CLI::App const& app, std::string const& reason) {
+    CLI::App const& command = refusingCommand(app);
+    std::string const inCommand = &command == &app ? "" : command.get_name() + ": ";
+    std::string const helpCommand =
+        std::string(gc_ProgramName) + (&command == &app ? "" : " " + command.get_name());
+    std::cerr << gc_ProgramName << ": " << inCommand << reason << "\n"
+              << gc_ProgramName << ": try '" << helpCommand << " --help'\n";
     ParsedCommandLine parsed;
-    parsed.exitStatus = exitStatus;
+    parsed.exitStatus = gc_ExitUsage;
     return parsed;
+}
+
+// The program ends here: --help or --version.
+ParsedCommandLine endingWith(std::string const& text) {
+    std::cout << text;
+    ParsedCommandLine parsed;
+    parsed.exitStatus = 0;
+    return parsed;
+}
+
+// Reads what app was given; throws CLI::ParseError with the reason in plain
+// words when it is refused.
+void readCommandLine(CLI::App& app, CLI::App const& reportCommand, ParsedCommandLine& parsed,
+                     int argc, char const* const* argv) {
+    app.parse(argc, argv);
+    refuseLeftOver(app);
+    if (reportCommand.parsed()) {
+        refuseLeftOver(reportCommand);
+        report::checkReportRequest(*parsed.reportRequest);
+        return;
+    }
+    parsed.reportRequest.reset();
+    checkMachines(app, parsed.options);
+    keepFirstOfEach(parsed);
 }
 
 } // namespace
 
 ParsedCommandLine parseCommandLine(int argc, char const* const* argv) {
     ParsedCommandLine parsed;
-    CLI::App app{"Surveys the client partitions of the PYLON console's managed machines, "
+    CLI::App app{"Surveys the client partitions of the PYLON console's managed machines,\n"
                  "several partitions at a time.",
                  gc_ProgramName};
+    app.formatter(std::make_shared<HelpFormatter>(
+        std::vector<std::string>{"[options] IDENTITY...", "[options] --all"}));
+    // Words the parser does not know are kept for refuseLeftOver(), which
+    // names them in plain words with the option most likely meant.
+    app.allow_extras();
+    app.set_help_flag("-h,--help", "print this help and exit");
+    app.set_version_flag("--version", versionText(), "print the version and exit");
     addSurveyOptions(app, parsed.options);
-    report::ReportRequest reportRequest;
-    CLI::App const* const reportCommand = report::addReportSubcommand(app, reportRequest);
-    app.set_version_flag("--version", versionText());
+    parsed.reportRequest.emplace();
+    CLI::App const* const reportCommand = report::addReportSubcommand(app, *parsed.reportRequest);
     try {
-        app.parse(argc, argv);
-        if (reportCommand->parsed()) {
-            parsed.reportRequest = reportRequest;
-            return parsed;
-        }
-        checkMachines(parsed.options);
+        readCommandLine(app, *reportCommand, parsed, argc, argv);
     } catch (CLI::CallForHelp const&) {
-        std::cout << app.help();
-        return endingWith(0);
+        return endingWith(app.help());
     } catch (CLI::CallForVersion const&) {
-        std::cout << versionText() << "\n";
-        return endingWith(0);
+        return endingWith(versionText() + "\n");
+    } catch (CLI::ArgumentMismatch const& error) {
+        return refused(app, missingValue(refusingCommand(app), argv[argc - 1], error.what()));
     } catch (CLI::ParseError const& error) {
-        std::cerr << gc_ProgramName << ": " << error.what() << "\n" << app.help();
-        return endingWith(gc_ExitUsage);
+        return refused(app, error.what());
     }
-    keepFirstOfEach(parsed);
     return parsed;
 }
 

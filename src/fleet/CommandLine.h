@@ -22,10 +22,10 @@ struct Options {
     std::vector<std::string> identities;
 };
 
-// Reads the command line with CLI11. A bad command line prints its reason
-// and the usage on standard error and ends the program with 64 before
-// anything runs; --help and --version print on standard output and end it
-// with 0.
+// Reads the command line with CLI11. A bad command line prints two lines on
+// standard error, its reason in plain words and where the help is, and ends
+// the program with 64 before anything runs; --help and --version print on
+// standard output and end it with 0.
 struct ParsedCommandLine {
     Options options;
     // Set when the program ends here with this status.

@@ -37,13 +37,16 @@ ParseRun parse(std::vector<std::string> arguments) {
     return run;
 }
 
-void expectUsageError(std::vector<std::string> const& arguments) {
+// The command line is refused with exactly reason and the pointer to the
+// help, on standard error, and the program ends with 64.
+void expectRefused(std::vector<std::string> const& arguments, std::string const& reason,
+                   std::string const& helpCommand = "quorvex-survey") {
     ParseRun const run = parse(arguments);
     ASSERT_TRUE(run.parsed.exitStatus.has_value());
     EXPECT_EQ(*run.parsed.exitStatus, 64);
     EXPECT_EQ(run.out, "");
-    EXPECT_EQ(run.err.rfind("quorvex-survey: ", 0), 0U) << run.err;
-    EXPECT_NE(run.err.find("Usage: quorvex-survey"), std::string::npos) << run.err;
+    EXPECT_EQ(run.err,
+              "quorvex-survey: " + reason + "\nquorvex-survey: try '" + helpCommand + " --help'\n");
 }
 
 TEST(CommandLine, DefaultsAreEightJobsAndHalfAnHour) {
@@ -82,45 +85,166 @@ TEST(CommandLine, IdentityGivenTwiceIsKeptOnceWithOneWarning) {
     EXPECT_EQ(run.err, "");
 }
 
-TEST(CommandLine, NoMachineIsAUsageError) {
-    expectUsageError({});
-    expectUsageError({"-j", "4"});
+TEST(CommandLine, NoMachineSaysToGiveIdentitiesOrAll) {
+    std::string const reason = "no machine to survey: give identities (type-model_serial) or --all";
+    expectRefused({}, reason);
+    expectRefused({"-j", "4"}, reason);
 }
 
-TEST(CommandLine, AllTogetherWithIdentitiesIsAUsageError) {
-    expectUsageError({"--all", "A_1"});
+TEST(CommandLine, AllWithIdentitiesSaysTheyExcludeEachOther) {
+    expectRefused({"--all", "9119-MHE_21ABCDE"},
+                  "--all and identities exclude each other: give either --all or identities");
 }
 
-TEST(CommandLine, UnknownOptionIsAUsageError) {
-    expectUsageError({"--frobnicate", "A_1"});
+TEST(CommandLine, MistypedOptionAfterAllIsNamedWithTheOptionMeant) {
+    expectRefused({"--all", "--job", "4"}, "unknown option --job: did you mean --jobs?");
+    expectRefused({"--all", "--sumary", "x.json"},
+                  "unknown option --sumary: did you mean --summary?");
 }
 
-TEST(CommandLine, JobsOutsideOneTo1024IsAUsageError) {
-    expectUsageError({"-j", "0", "A_1"});
-    expectUsageError({"-j", "1025", "A_1"});
-    expectUsageError({"-j", "many", "A_1"});
-    expectUsageError({"-j", "-3", "A_1"});
+TEST(CommandLine, MistypedOptionBeforeAnIdentityIsNamedWithTheOptionMeant) {
+    expectRefused({"--sumary", "9119-MHE_21ABCDE"},
+                  "unknown option --sumary: did you mean --summary?");
+    expectRefused({"--sumary=x.json", "9119-MHE_21ABCDE"},
+                  "unknown option --sumary: did you mean --summary?");
 }
 
-TEST(CommandLine, NegativeOrTextTimeoutIsAUsageError) {
-    expectUsageError({"-t", "-1", "A_1"});
-    expectUsageError({"-t", "1.5", "A_1"});
-    expectUsageError({"-t", "soon", "A_1"});
+TEST(CommandLine, OptionFarFromEveryKnownOneIsNamedAlone) {
+    expectRefused({"--frobnicate", "A_1"}, "unknown option --frobnicate");
+    expectRefused({"A_1", "-x"}, "unknown option -x");
 }
 
-TEST(CommandLine, OptionWithoutItsValueIsAUsageError) {
-    expectUsageError({"A_1", "--summary"});
+TEST(CommandLine, WordStartingWithDashIsNeverAnIdentity) {
+    expectRefused({"-5"}, "unknown option -5");
+    expectRefused({"A_1", "--", "-B_2"}, "unknown option -B_2");
 }
 
-TEST(CommandLine, EmptyIdentityIsAUsageError) {
-    expectUsageError({""});
+TEST(CommandLine, JobsOutsideOneTo1024SayWhatJobsTakes) {
+    for (std::string const jobs : {"0", "1025", "2000", "many", "-3", "1.5", "+4", ""}) {
+        expectRefused({"-j", jobs, "A_1"},
+                      "-j/--jobs takes a whole number from 1 to 1024, not '" + jobs + "'");
+    }
 }
 
-TEST(CommandLine, HelpGoesToStandardOutputAndEndsWithZero) {
+TEST(CommandLine, TimeoutThatIsNoWholeNumberOfSecondsSaysWhatTimeoutTakes) {
+    for (std::string const timeout : {"1.5", "-1", "soon", "31536001"}) {
+        expectRefused({"-t", timeout, "A_1"}, "-t/--timeout takes a whole number of seconds "
+                                              "from 0 to 31536000, not '" +
+                                                  timeout + "'");
+    }
+}
+
+TEST(CommandLine, NumbersAtTheirLimitsAreTaken) {
+    ParseRun const run = parse({"-j", "1024", "-t", "31536000", "A_1"});
+    EXPECT_FALSE(run.parsed.exitStatus.has_value()) << run.err;
+    EXPECT_EQ(run.parsed.options.jobs, 1024U);
+    EXPECT_EQ(run.parsed.options.timeoutSeconds, 31536000U);
+}
+
+TEST(CommandLine, OptionGivenTwiceTakesTheLastValue) {
+    ParseRun const run =
+        parse({"-j", "4", "--jobs", "6", "--summary", "a", "--summary", "b", "A_1"});
+    EXPECT_FALSE(run.parsed.exitStatus.has_value()) << run.err;
+    EXPECT_EQ(run.parsed.options.jobs, 6U);
+    EXPECT_EQ(run.parsed.options.summaryFile, "b");
+}
+
+TEST(CommandLine, OptionWithoutItsValueSaysWhatValueItNeeds) {
+    expectRefused({"A_1", "--summary"}, "--summary needs a value (a file name)");
+    expectRefused({"A_1", "--summary="}, "--summary needs a value (a file name)");
+    expectRefused({"A_1", "--report"}, "--report needs a value (a folder name)");
+    expectRefused({"A_1", "-j"}, "-j/--jobs needs a value (a whole number from 1 to 1024)");
+    expectRefused({"A_1", "-qj"}, "-j/--jobs needs a value (a whole number from 1 to 1024)");
+    expectRefused({"A_1", "--timeout"},
+                  "-t/--timeout needs a value (a whole number of seconds from 0 to 31536000)");
+}
+
+TEST(CommandLine, EmptyIdentitySaysSo) {
+    expectRefused({""}, "an identity must not be empty");
+}
+
+TEST(CommandLine, ReportWithAMistypedOptionPointsToTheReportsHelp) {
+    expectRefused({"report", "--form", "/tmp", "out"},
+                  "report: unknown option --form: did you mean --from?", "quorvex-survey report");
+    expectRefused({"report", "--bogus", "out"}, "report: unknown option --bogus",
+                  "quorvex-survey report");
+}
+
+TEST(CommandLine, ReportWithoutItsFolderOrWithAWrongOneSaysWhy) {
+    expectRefused({"report"}, "report: no DIR given (the folder to write the report into)",
+                  "quorvex-survey report");
+    expectRefused({"report", "--from"}, "report: --from needs a value (a folder name)",
+                  "quorvex-survey report");
+    expectRefused({"report", "a", "b"}, "report: unexpected argument 'b'", "quorvex-survey report");
+}
+
+TEST(CommandLine, ReportLeavesAMissingFromFolderToTheRunWhichSaysWhy) {
+    ParseRun const run = parse({"report", "--from", "/nonexistent/folder", "out"});
+    EXPECT_FALSE(run.parsed.exitStatus.has_value()) << run.err;
+    ASSERT_TRUE(run.parsed.reportRequest.has_value());
+    EXPECT_EQ(run.parsed.reportRequest->vpdFolder, "/nonexistent/folder");
+}
+
+TEST(CommandLine, ReportTakesItsFolder) {
+    ParseRun const run = parse({"report", "--from", "/tmp", "out"});
+    EXPECT_FALSE(run.parsed.exitStatus.has_value()) << run.err;
+    ASSERT_TRUE(run.parsed.reportRequest.has_value());
+    EXPECT_EQ(run.parsed.reportRequest->vpdFolder, "/tmp");
+    EXPECT_EQ(run.parsed.reportRequest->folder, "out");
+}
+
+TEST(CommandLine, SurveyHasNoReportRequest) {
+    EXPECT_FALSE(parse({"A_1"}).parsed.reportRequest.has_value());
+}
+
+TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
     ParseRun const run = parse({"--help"});
     ASSERT_TRUE(run.parsed.exitStatus.has_value());
     EXPECT_EQ(*run.parsed.exitStatus, 0);
-    EXPECT_NE(run.out.find("--timeout"), std::string::npos);
+    EXPECT_EQ(run.out,
+              "Usage: quorvex-survey [options] IDENTITY...\n"
+              "       quorvex-survey [options] --all\n"
+              "       quorvex-survey report [--from VPD_FOLDER] DIR\n"
+              "\n"
+              "Surveys the client partitions of the PYLON console's managed machines,\n"
+              "several partitions at a time.\n"
+              "\n"
+              "Arguments:\n"
+              "  IDENTITY                a managed machine (type-model_serial)\n"
+              "\n"
+              "Options:\n"
+              "  -h, --help              print this help and exit\n"
+              "  --version               print the version and exit\n"
+              "  -j, --jobs N            partitions surveyed at the same time, all machines "
+              "together (default 8)\n"
+              "  -t, --timeout SECONDS   time limit of one remote action, 0 for none "
+              "(default 1800)\n"
+              "  --summary FILE          write a summary of the run (JSON) to FILE\n"
+              "  -q, --quiet             no progress line\n"
+              "  --all                   every managed machine the console lists\n"
+              "  --report DIR            after the run, write its report into DIR\n"
+              "\n"
+              "Subcommands:\n"
+              "  report                  write into DIR the report of the files earlier runs "
+              "left\n");
+    EXPECT_EQ(run.err, "");
+}
+
+TEST(CommandLine, ReportHelpShowsTheReportsUsageAndOptions) {
+    ParseRun const run = parse({"report", "--help"});
+    ASSERT_TRUE(run.parsed.exitStatus.has_value());
+    EXPECT_EQ(*run.parsed.exitStatus, 0);
+    EXPECT_EQ(run.out, "Usage: quorvex-survey report [--from VPD_FOLDER] DIR\n"
+                       "\n"
+                       "write into DIR the report of the files earlier runs left\n"
+                       "\n"
+                       "Arguments:\n"
+                       "  DIR                     folder to write the report into\n"
+                       "\n"
+                       "Options:\n"
+                       "  -h, --help              print this help and exit\n"
+                       "  --from VPD_FOLDER       where the status files and VPD documents are "
+                       "(default /var/adm/quorvex/VPD)\n");
     EXPECT_EQ(run.err, "");
 }
 

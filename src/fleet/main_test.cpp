@@ -50,14 +50,23 @@ protected:
     }
 };
 
-TEST_F(SurveyProgram, BadCommandLineExits64WithUsageAndRunsNothing) {
-    for (auto const& arguments : std::vector<std::vector<std::string>>{
-             {}, {"-j", "0", gc_Machine}, {"--all", gc_Machine}, {"--bogus", gc_Machine}}) {
+TEST_F(SurveyProgram, BadCommandLineExits64WithItsReasonAndRunsNothing) {
+    struct Refusal {
+        std::vector<std::string> arguments;
+        std::string reason;
+    };
+    for (auto const& refusal : std::vector<Refusal>{
+             {{}, "no machine to survey: give identities (type-model_serial) or --all"},
+             {{"-j", "0", gc_Machine}, "-j/--jobs takes a whole number from 1 to 1024, not '0'"},
+             {{"--all", gc_Machine},
+              "--all and identities exclude each other: give either --all or identities"},
+             {{"--bogus", gc_Machine}, "unknown option --bogus"}}) {
         QuorvexTest::SimulatedConsole const console(gc_Console);
-        CommandResult const result = runSurvey(arguments);
+        CommandResult const result = runSurvey(refusal.arguments);
         EXPECT_EQ(result.exitStatus, 64);
         EXPECT_EQ(result.stdoutText, "");
-        EXPECT_NE(result.stderrText.find("Usage: quorvex-survey"), std::string::npos);
+        EXPECT_EQ(result.stderrText, "quorvex-survey: " + refusal.reason +
+                                         "\nquorvex-survey: try 'quorvex-survey --help'\n");
         EXPECT_TRUE(console.invocations().empty());
         EXPECT_TRUE(QuorvexTest::listFolder(gc_VPD_Folder).empty());
         EXPECT_TRUE(QuorvexTest::listFolder(gc_Trace_Folder).empty());

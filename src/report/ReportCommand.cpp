@@ -48,20 +48,28 @@ std::optional<nlohmann::ordered_json> readSummaryReporting(std::string const& vp
 } // namespace
 
 CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request) {
-    CLI::App* const command = app.add_subcommand(
-        "report", "write the report (index.html, partitions.csv, summary.json) of the "
-                  "survey files earlier runs left into DIR");
+    CLI::App* const command =
+        app.add_subcommand("report", "write into DIR the report of the files earlier runs left");
     // Whether the folder can be read is checked when it is read, so that the
     // default folder and a given one fail alike.
-    command->add_option("--from", request.vpdFolder, "folder of the status files and VPD documents")
-        ->capture_default_str();
-    command->add_option("DIR", request.folder, "folder to write the report into")->required();
+    command->add_option("--from", request.vpdFolder, "where the status files and VPD documents are")
+        ->type_name("VPD_FOLDER")
+        ->default_str(defaultVpdFolder)
+        ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    command->add_option("DIR", request.folder, "folder to write the report into");
     return command;
+}
+
+void checkReportRequest(ReportRequest const& request) {
+    if (request.folder.empty()) {
+        throw CLI::ValidationError("no DIR given (the folder to write the report into)");
+    }
 }
 
 CLI::Option* addReportOption(CLI::App& app, std::string& folder) {
     return app.add_option("--report", folder, "after the run, write its report into DIR")
-        ->type_name("DIR");
+        ->type_name("DIR")
+        ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
 }
 
 int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors) {

@@ -25,8 +25,14 @@ struct ReportRequest {
 
 // Registers the subcommand "report [--from VPD_FOLDER] DIR" on app, filling
 // request when it is given; returns the subcommand, so that the caller can
-// ask whether it was parsed.
+// ask whether it was parsed. A --from that is no folder is refused while
+// parsing with a CLI::ValidationError whose text is the whole reason.
 CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request);
+
+// Throws a CLI::ValidationError with the reason in plain words when the
+// parsed subcommand lacks its DIR. Called once the caller has refused what
+// the parser could not place, so that a mistyped option is named first.
+void checkReportRequest(ReportRequest const& request);
 
 // Registers the option "--report DIR" on app, filling folder when given.
 CLI::Option* addReportOption(CLI::App& app, std::string& folder);

@@ -42,11 +42,25 @@ TEST(ReportCommand, SubcommandTakesFrom) {
     EXPECT_EQ("out", request.folder);
 }
 
-TEST(ReportCommand, SubcommandWithoutFolderIsRefused) {
+TEST(ReportCommand, SubcommandWithoutFolderIsRefusedInPlainWords) {
     CLI::App app;
     report::ReportRequest request;
     report::addReportSubcommand(app, request);
-    EXPECT_THROW(parse(app, {"report"}), CLI::ParseError);
+    parse(app, {"report"});
+    try {
+        report::checkReportRequest(request);
+        FAIL() << "no refusal";
+    } catch (CLI::ValidationError const& error) {
+        EXPECT_STREQ("no DIR given (the folder to write the report into)", error.what());
+    }
+}
+
+TEST(ReportCommand, SubcommandWithFolderPassesTheCheck) {
+    CLI::App app;
+    report::ReportRequest request;
+    report::addReportSubcommand(app, request);
+    parse(app, {"report", "out"});
+    EXPECT_NO_THROW(report::checkReportRequest(request));
 }
 
 TEST(ReportCommand, SubcommandLeavesAMissingFromFolderToTheRun) {

@@ -1,5 +1,6 @@
-// The command line of quorvex-survey: a bad one is refused with status 64 and
-// a usage message before anything runs; help and version need no console.
+// The command line of quorvex-survey: a bad one is refused with status 64,
+// its reason on one line and where the help is on the next, before anything
+// runs; help and version need no console.
 // Runs inside the sandbox, so "nothing runs" is seen in the console's
 // invocation log and the empty result folders.
 
@@ -8,8 +9,7 @@
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
-#include <cctype>
+#include <ostream>
 
 namespace {
 
@@ -25,47 +25,91 @@ CommandResult runSurvey(std::vector<std::string> const& arguments) {
     return QuorvexTest::runCommand(argv);
 }
 
-std::string lowerCase(std::string text) {
-    std::transform(text.begin(), text.end(), text.begin(),
-                   [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
-    return text;
-}
-
 struct BadCommandLine {
     // cppcheck-suppress unusedStructMember ; read by the test name generator
     std::string name;
     // cppcheck-suppress unusedStructMember ; read through GetParam()
     std::vector<std::string> arguments;
+    // cppcheck-suppress unusedStructMember ; read through GetParam()
+    std::string reason;
+    // cppcheck-suppress unusedStructMember ; read through GetParam()
+    std::string helpCommand = "quorvex-survey";
 };
+
+// The case by its name in test listings, not as the bytes of the struct.
+void PrintTo(BadCommandLine const& badCommandLine, std::ostream* out) {
+    *out << badCommandLine.name;
+}
 
 class FleetBadCommandLine : public ::testing::TestWithParam<BadCommandLine> {};
 
-TEST_P(FleetBadCommandLine, IsRefusedWithUsageAndRunsNothing) {
+TEST_P(FleetBadCommandLine, IsRefusedWithItsReasonAndWhereTheHelpIsAndRunsNothing) {
     QuorvexTest::clearFolder(QuorvexTest::gc_VPD_Folder);
     QuorvexTest::clearFolder(QuorvexTest::gc_TraceFolder);
     SimulatedConsole const console(gc_Console);
     CommandResult const result = runSurvey(GetParam().arguments);
     EXPECT_EQ(result.exitStatus, 64);
     EXPECT_EQ(result.stdoutText, "");
-    EXPECT_NE(lowerCase(result.stderrText).find("usage"), std::string::npos)
-        << "no usage message: " << result.stderrText;
+    EXPECT_EQ(result.stderrText, "quorvex-survey: " + GetParam().reason +
+                                     "\nquorvex-survey: try '" + GetParam().helpCommand +
+                                     " --help'\n");
     EXPECT_EQ(console.invocations(), std::vector<QuorvexTest::Invocation>{}) << "console called";
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_VPD_Folder), std::vector<std::string>{});
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_TraceFolder), std::vector<std::string>{});
 }
 
+constexpr char gc_Machine[] = "1234-ABC_10ABCDE";
+constexpr char gc_NoMachine[] =
+    "no machine to survey: give identities (type-model_serial) or --all";
+constexpr char gc_JobsTake[] = "-j/--jobs takes a whole number from 1 to 1024, not ";
+constexpr char gc_TimeoutTakes[] =
+    "-t/--timeout takes a whole number of seconds from 0 to 31536000, not ";
+
 INSTANTIATE_TEST_SUITE_P(
     Cases, FleetBadCommandLine,
-    ::testing::Values(BadCommandLine{"NoIdentityAndNoAll", {}},
-                      BadCommandLine{"OnlyOptions", {"-j", "4", "-q"}},
-                      BadCommandLine{"UnknownOption", {"--frobnicate", "1234-ABC_10ABCDE"}},
-                      BadCommandLine{"ZeroJobs", {"-j", "0", "1234-ABC_10ABCDE"}},
-                      BadCommandLine{"JobsNotANumber", {"--jobs", "many", "1234-ABC_10ABCDE"}},
-                      BadCommandLine{"JobsWithoutValue", {"1234-ABC_10ABCDE", "-j"}},
-                      BadCommandLine{"NegativeTimeout", {"-t", "-1", "1234-ABC_10ABCDE"}},
-                      BadCommandLine{"TimeoutNotANumber",
-                                     {"--timeout", "soon", "1234-ABC_10ABCDE"}},
-                      BadCommandLine{"SummaryWithoutFile", {"1234-ABC_10ABCDE", "--summary"}}),
+    ::testing::Values(
+        BadCommandLine{"NoIdentityAndNoAll", {}, gc_NoMachine},
+        BadCommandLine{"OnlyOptions", {"-j", "4", "-q"}, gc_NoMachine},
+        BadCommandLine{"AllWithIdentity",
+                       {"--all", "9119-MHE_21ABCDE"},
+                       "--all and identities exclude each other: give either --all or identities"},
+        BadCommandLine{"MistypedJobsAfterAll",
+                       {"--all", "--job", "4"},
+                       "unknown option --job: did you mean --jobs?"},
+        BadCommandLine{"MistypedSummaryAfterAll",
+                       {"--all", "--sumary", "x.json"},
+                       "unknown option --sumary: did you mean --summary?"},
+        BadCommandLine{"MistypedSummaryWithIdentity",
+                       {"--sumary", gc_Machine},
+                       "unknown option --sumary: did you mean --summary?"},
+        BadCommandLine{
+            "UnknownOption", {"--frobnicate", gc_Machine}, "unknown option --frobnicate"},
+        BadCommandLine{"ZeroJobs", {"-j", "0", gc_Machine}, std::string(gc_JobsTake) + "'0'"},
+        BadCommandLine{
+            "TooManyJobs", {"-j", "2000", gc_Machine}, std::string(gc_JobsTake) + "'2000'"},
+        BadCommandLine{
+            "JobsNotANumber", {"--jobs", "many", gc_Machine}, std::string(gc_JobsTake) + "'many'"},
+        BadCommandLine{"JobsWithoutValue",
+                       {gc_Machine, "-j"},
+                       "-j/--jobs needs a value (a whole number from 1 to 1024)"},
+        BadCommandLine{
+            "FractionalTimeout", {"-t", "1.5", gc_Machine}, std::string(gc_TimeoutTakes) + "'1.5'"},
+        BadCommandLine{
+            "NegativeTimeout", {"-t", "-1", gc_Machine}, std::string(gc_TimeoutTakes) + "'-1'"},
+        BadCommandLine{"TimeoutNotANumber",
+                       {"--timeout", "soon", gc_Machine},
+                       std::string(gc_TimeoutTakes) + "'soon'"},
+        BadCommandLine{"SummaryWithoutFile",
+                       {gc_Machine, "--summary"},
+                       "--summary needs a value (a file name)"},
+        BadCommandLine{"ReportWithUnknownOption",
+                       {"report", "--bogus", "/tmp/report"},
+                       "report: unknown option --bogus",
+                       "quorvex-survey report"},
+        BadCommandLine{"ReportWithoutFolder",
+                       {"report"},
+                       "report: no DIR given (the folder to write the report into)",
+                       "quorvex-survey report"}),
     [](::testing::TestParamInfo<BadCommandLine> const& info) { return info.param.name; });
 
 TEST(FleetCommandLine, HelpNamesEveryOptionAndRunsNothing) {
@@ -77,6 +121,30 @@ TEST(FleetCommandLine, HelpNamesEveryOptionAndRunsNothing) {
         EXPECT_NE(result.stdoutText.find(option), std::string::npos) << option << " not in:\n"
                                                                      << result.stdoutText;
     }
+    EXPECT_EQ(console.invocations(), std::vector<QuorvexTest::Invocation>{});
+}
+
+TEST(FleetCommandLine, HelpHasNoParserNotation) {
+    CommandResult const result = runSurvey({"--help"});
+    EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
+    EXPECT_EQ(result.stdoutText.rfind("Usage: quorvex-survey [options] IDENTITY...\n", 0), 0U)
+        << result.stdoutText;
+    EXPECT_NE(result.stdoutText.find("-j, --jobs N "), std::string::npos) << result.stdoutText;
+    EXPECT_NE(result.stdoutText.find("(default 8)"), std::string::npos) << result.stdoutText;
+    for (char const* notation : {"UINT", "TEXT", "in [", "=8", "Excludes"}) {
+        EXPECT_EQ(result.stdoutText.find(notation), std::string::npos) << notation << " in:\n"
+                                                                       << result.stdoutText;
+    }
+    EXPECT_EQ(result.stderrText, "");
+}
+
+TEST(FleetCommandLine, ReportHelpIsPrintedAndNothingRuns) {
+    SimulatedConsole const console(gc_Console);
+    CommandResult const result = runSurvey({"report", "--help"});
+    EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
+    EXPECT_EQ(result.stdoutText.rfind("Usage: quorvex-survey report [--from VPD_FOLDER] DIR\n", 0),
+              0U)
+        << result.stdoutText;
     EXPECT_EQ(console.invocations(), std::vector<QuorvexTest::Invocation>{});
 }
 
