@@ -15,9 +15,9 @@
 
 namespace fleet {
 
-namespace {
+using report::gc_ProgramName;
 
-constexpr char gc_ProgramName[] = "quorvex-survey";
+namespace {
 
 // An option that takes a whole number within limits.
 struct WholeNumber {

@@ -1,5 +1,7 @@
 #include "fleet/OptionSpelling.h"
 
+#include "utility/TextChecks.h"
+
 #include <algorithm>
 #include <numeric>
 
@@ -10,15 +12,11 @@ namespace {
 // A typo further than this from every option is not guessed at.
 constexpr std::size_t gc_FarthestSuggestion = 2;
 
-bool startsWith(std::string const& text, std::string const& start) {
-    return text.compare(0, start.size(), start) == 0;
-}
-
 std::optional<std::string> onlyOneStartingWith(std::string const& typed,
                                                std::vector<std::string> const& knownOptions) {
     std::optional<std::string> found;
     for (std::string const& option : knownOptions) {
-        if (startsWith(option, typed)) {
+        if (util::startsWith(option, typed)) {
             if (found) {
                 return std::nullopt;
             }
@@ -31,7 +29,7 @@ std::optional<std::string> onlyOneStartingWith(std::string const& typed,
 } // namespace
 
 std::string typedOptionName(std::string const& argument) {
-    if (!startsWith(argument, "--")) {
+    if (!util::startsWith(argument, "--")) {
         return argument;
     }
     return argument.substr(0, argument.find('='));
@@ -40,7 +38,7 @@ std::string typedOptionName(std::string const& argument) {
 std::optional<std::string> closestOption(std::string const& typed,
                                          std::vector<std::string> const& knownOptions) {
     // "--" alone or a short option: too little to guess from.
-    if (typed.size() < 3 || !startsWith(typed, "--")) {
+    if (typed.size() < 3 || !util::startsWith(typed, "--")) {
         return std::nullopt;
     }
     if (std::optional<std::string> started = onlyOneStartingWith(typed, knownOptions)) {

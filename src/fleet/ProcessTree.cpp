@@ -23,16 +23,6 @@ namespace {
 constexpr int gc_KillRounds = 1000;
 constexpr auto gc_PauseBetweenRounds = std::chrono::milliseconds(1);
 
-// A /proc file of a process that has ended, or ends while it is read, reads
-// as empty: the process then has no children, command line or age to report.
-std::string readProcFile(std::string const& path) {
-    try {
-        return util::readWholeFile(path);
-    } catch (util::SystemError const&) {
-        return "";
-    }
-}
-
 std::string procPath(pid_t pid, char const* name) {
     return "/proc/" + std::to_string(pid) + "/" + name;
 }
@@ -49,7 +39,7 @@ std::vector<std::string> threadsOf(pid_t pid) {
 
 // The fields of /proc/<pid>/stat after the command name; nullopt when gone.
 std::optional<std::string> statFields(pid_t pid) {
-    std::string const stat = readProcFile(procPath(pid, "stat"));
+    std::string const stat = util::readWholeFileOrEmpty(procPath(pid, "stat"));
     // The command name in parentheses may hold blanks and parentheses itself.
     std::size_t const end = stat.rfind(')');
     if (end == std::string::npos || end + 2 > stat.size()) {
@@ -69,7 +59,8 @@ double secondsSinceBoot() {
 std::vector<pid_t> childrenOf(pid_t pid) {
     std::vector<pid_t> children;
     for (auto const& thread : threadsOf(pid)) {
-        std::istringstream list(readProcFile(procPath(pid, "task/") + thread + "/children"));
+        std::istringstream list(
+            util::readWholeFileOrEmpty(procPath(pid, "task/") + thread + "/children"));
         pid_t child = 0;
         while (list >> child) {
             children.push_back(child);
@@ -88,7 +79,7 @@ std::vector<pid_t> descendantsOf(pid_t pid) {
 }
 
 std::string commandLineOf(pid_t pid) {
-    std::string text = readProcFile(procPath(pid, "cmdline"));
+    std::string text = util::readWholeFileOrEmpty(procPath(pid, "cmdline"));
     std::replace(text.begin(), text.end(), '\0', ' ');
     return text;
 }

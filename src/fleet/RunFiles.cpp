@@ -1,15 +1,12 @@
 #include "fleet/RunFiles.h"
 
 #include "survey/Survey_Files.h"
-#include "utility/AtomicFile.h"
+#include "utility/FileText.h"
 #include "utility/SystemError.h"
 
 #include <unistd.h>
 
 #include <cstdio>
-#include <fstream>
-#include <sstream>
-#include <stdexcept>
 
 namespace fleet {
 
@@ -35,20 +32,18 @@ std::string tracePiecePath(std::string const& identity, std::size_t slot) {
 }
 
 std::optional<std::string> takeTracePiece(std::string const& piece) {
-    std::ifstream input(piece, std::ios::binary);
-    if (!input) {
+    std::string text;
+    try {
+        text = util::readWholeFile(piece);
+    } catch (util::SystemError const&) {
+        // The unit wrote no trace.
         return std::nullopt;
     }
-    std::ostringstream text;
-    if (input.peek() != std::ifstream::traits_type::eof()) {
-        text << input.rdbuf();
-    }
-    input.close();
     if (truncate(piece.c_str(), 0) != 0) {
         // A piece that cannot be emptied must not reach the slot's next unit.
         std::remove(piece.c_str());
     }
-    return text.str();
+    return text;
 }
 
 } // namespace fleet

@@ -8,8 +8,6 @@ namespace fleet {
 // Where a run puts each machine's files: the status file the single-machine
 // tool writes, and a trace per machine named after the tool's one trace with
 // the identity before ".Trace", so that no machine's trace replaces another's.
-// Files that readers pick up are written under a temporary name in the same
-// folder and renamed, so a reader never sees half of one.
 std::string statusFilePath(std::string const& identity);
 std::string traceFilePath(std::string const& identity);
 // The temporary piece of a machine's trace that the unit of work running

@@ -6,10 +6,8 @@ namespace fleet {
 
 namespace {
 
-constexpr char gc_NotSurveyedCode[] = "8";
-
 void markInterrupted(PartitionRecord& record) {
-    record.result.returnCode = gc_NotSurveyedCode;
+    record.result.returnCode = report::gc_NotSurveyedCode;
     record.result.statusText = report::gc_InterruptedStatusText;
     record.outcome = report::Outcome::Interrupted;
 }

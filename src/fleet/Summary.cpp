@@ -1,6 +1,7 @@
 #include "fleet/Summary.h"
 
 #include "fleet/RunFiles.h"
+#include "report/ReportCommand.h"
 
 #include <algorithm>
 #include <iterator>
@@ -8,8 +9,6 @@
 namespace fleet {
 
 namespace {
-
-constexpr char gc_ToolName[] = "quorvex-survey";
 
 template <typename T> std::optional<long long> widened(std::optional<T> const& value) {
     return value ? std::optional<long long>(*value) : std::nullopt;
@@ -65,7 +64,7 @@ report::SummaryOptions summaryOptions(Options const& options) {
 
 report::RunSummary runSummary(RunFacts const& facts, std::vector<MachineRecord> const& machines) {
     report::RunSummary summary;
-    summary.tool = gc_ToolName;
+    summary.tool = report::gc_ProgramName;
     summary.consoleHost = facts.consoleHost;
     summary.started = facts.started;
     summary.ended = facts.ended;

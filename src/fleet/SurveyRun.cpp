@@ -4,6 +4,7 @@
 #include "fleet/RunFiles.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/WorkUnits.h"
+#include "report/StatusText.h"
 #include "survey/calculate_ReturnCode.h"
 
 #include <unistd.h>
@@ -15,13 +16,10 @@ namespace fleet {
 
 namespace {
 
-constexpr char gc_NotSurveyedCode[] = "8";
-constexpr char gc_NotStarted[] = "Failed - not started";
-
 Quorvex::PYLON::VPD::PartitionOutcome notStartedOutcome() {
     Quorvex::PYLON::VPD::PartitionOutcome outcome;
-    outcome.returnCode = gc_NotSurveyedCode;
-    outcome.statusText = gc_NotStarted;
+    outcome.returnCode = report::gc_NotSurveyedCode;
+    outcome.statusText = report::gc_NotStartedStatusText;
     outcome.kind = Quorvex::PYLON::VPD::PartitionOutcomeKind::ChannelFailure;
     return outcome;
 }
@@ -222,7 +220,8 @@ ProgressFigures SurveyRun::_progressFigures() const {
         figures.partitions += machine.partitions.size();
         for (auto const& record : machine.partitions) {
             if (record.outcome) {
-                ++(record.result.returnCode == "0" ? figures.surveyed : figures.failed);
+                ++(record.result.returnCode == report::gc_SurveyedCode ? figures.surveyed
+                                                                       : figures.failed);
             }
         }
     }

@@ -1,5 +1,4 @@
 #include "fleet/CommandLine.h"
-#include "fleet/RunFiles.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
@@ -29,7 +28,8 @@ std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
     fleet::TimeLimits limits(timeoutSeconds);
     if (std::optional<std::string> const failure =
             pool.start(0, fleet::UnitKind::MachineListing, &fleet::listMachines)) {
-        std::cerr << "quorvex-survey: cannot list the managed machines: " << *failure << std::endl;
+        std::cerr << report::gc_ProgramName << ": cannot list the managed machines: " << *failure
+                  << std::endl;
         return {};
     }
     while (true) {
@@ -69,7 +69,7 @@ void writeRunFiles(fleet::Options const& options, fleet::SurveyRun const& run, i
             util::writeFileAtomically(options.summaryFile, report::summaryText(summary));
         }
     } catch (util::SystemError const& failure) {
-        messages << "quorvex-survey: " << failure.what() << "\n";
+        messages << report::gc_ProgramName << ": " << failure.what() << "\n";
     }
     if (!options.reportFolder.empty()) {
         report::writeRunReport(summary, options.reportFolder, messages);
@@ -102,7 +102,7 @@ int main(int argc, char** argv) {
         std::cerr << warning << std::endl;
     }
     if (std::optional<std::string> const failure = fleet::installSignalPipe()) {
-        std::cerr << "quorvex-survey: " << *failure << std::endl;
+        std::cerr << report::gc_ProgramName << ": " << *failure << std::endl;
     }
     auto const startedAt = std::chrono::steady_clock::now();
     std::time_t const started = std::time(nullptr);

@@ -22,8 +22,6 @@
 
 namespace report {
 
-using util::endsWith;
-using util::isDigits;
 using util::localTimeText;
 using util::startsWith;
 using util::validUtf8;
@@ -39,8 +37,6 @@ constexpr char gc_StatusSeparator[] = "] - VPD Survey - ";
 // Between the machine identity and the partition ID in a partition text.
 constexpr char gc_PartitionIdSeparator[] = "-";
 // The survey's codes of a partition.
-constexpr char gc_SurveyedCode[] = "0";
-constexpr char gc_NotSurveyedCode[] = "8";
 
 struct StatusLine {
     std::string host;
@@ -64,16 +60,6 @@ struct RunTraces {
     // The signal that stopped a partition's action, if one did.
     std::optional<std::string> interruptedBy;
 };
-
-// A file that is gone or unreadable since the folder was listed reads as
-// empty: a run may still be writing there, and the rest is still reported.
-std::string readText(fs::path const& path) {
-    try {
-        return util::readWholeFile(path.string());
-    } catch (util::SystemError const&) {
-        return "";
-    }
-}
 
 void noteFileTime(fs::path const& path, RunTraces& traces) {
     std::error_code error;
@@ -105,7 +91,7 @@ std::optional<StatusLine> parseStatusLine(std::string const& line) {
 }
 
 std::vector<StatusLine> readStatusLines(fs::path const& path) {
-    std::istringstream text(readText(path));
+    std::istringstream text(util::readWholeFileOrEmpty(path.string()));
     std::vector<StatusLine> lines;
     std::string line;
     while (std::getline(text, line)) {
@@ -164,7 +150,7 @@ std::string const* ownerOf(std::string const& partitionText,
 }
 
 DocumentFile readDocument(fs::path const& path, std::string partitionText, std::string id) {
-    VpdDocument content = parseVpdDocument(readText(path));
+    VpdDocument content = parseVpdDocument(util::readWholeFileOrEmpty(path.string()));
     std::optional<FailureReason> failure;
     if (content.reason) {
         failure = parseFailureReason(*content.reason);

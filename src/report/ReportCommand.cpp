@@ -12,8 +12,6 @@ namespace report {
 
 namespace {
 
-constexpr char gc_ProgramName[] = "quorvex-survey";
-
 bool writeReportReporting(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
                           std::string const& folder, std::ostream& errors) {
     try {
@@ -54,7 +52,7 @@ CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request) {
     // default folder and a given one fail alike.
     command->add_option("--from", request.vpdFolder, "where the status files and VPD documents are")
         ->type_name("VPD_FOLDER")
-        ->default_str(defaultVpdFolder)
+        ->default_str(gc_DefaultVpdFolder)
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
     command->add_option("DIR", request.folder, "folder to write the report into");
     return command;
@@ -85,9 +83,10 @@ int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::os
     return 0;
 }
 
-bool writeRunReport(nlohmann::ordered_json const& summary, std::string const& folder,
+void writeRunReport(nlohmann::ordered_json const& summary, std::string const& folder,
                     std::ostream& errors) {
-    return writeReportReporting(summary, defaultVpdFolder, folder, errors);
+    // Its failure is said on errors and leaves the run's exit status as it is.
+    static_cast<void>(writeReportReporting(summary, gc_DefaultVpdFolder, folder, errors));
 }
 
 } // namespace report

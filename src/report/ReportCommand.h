@@ -9,7 +9,9 @@
 namespace report {
 
 // The console's folder of status files and VPD documents.
-inline constexpr char defaultVpdFolder[] = "/var/adm/quorvex/VPD";
+inline constexpr char gc_DefaultVpdFolder[] = "/var/adm/quorvex/VPD";
+// The name quorvex-survey says its messages under and writes into its summary.
+inline constexpr char gc_ProgramName[] = "quorvex-survey";
 
 // The exit status of "report" when its VPD folder gives nothing to read:
 // missing, not a folder, unreadable, or holding no status file of a survey
@@ -19,7 +21,7 @@ inline constexpr int gc_ExitNothingToRead = 64;
 
 // What "report [--from VPD_FOLDER] DIR" was given.
 struct ReportRequest {
-    std::string vpdFolder = defaultVpdFolder;
+    std::string vpdFolder = gc_DefaultVpdFolder;
     std::string folder;
 };
 
@@ -46,9 +48,9 @@ int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::os
 
 // Writes the report of a run's summary into folder, its documents lying in
 // the console's VPD folder; prints nothing on success, so that the run's
-// standard output stays what the survey prints. Returns false with the
-// reason on errors when a file cannot be written.
-bool writeRunReport(nlohmann::ordered_json const& summary, std::string const& folder,
+// standard output stays what the survey prints. A file that cannot be
+// written is said on errors with its reason.
+void writeRunReport(nlohmann::ordered_json const& summary, std::string const& folder,
                     std::ostream& errors);
 
 } // namespace report

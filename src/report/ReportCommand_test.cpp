@@ -160,9 +160,19 @@ TEST(ReportCommand, RunThatCannotWriteSaysWhyAndFails) {
 TEST(ReportCommand, RunReportPrintsNothingOnSuccess) {
     QuorvexTest::TemporaryDirectory root;
     std::ostringstream errors;
-    EXPECT_TRUE(report::writeRunReport(nlohmann::ordered_json::object(), root.file("r"), errors));
+    report::writeRunReport(nlohmann::ordered_json::object(), root.file("r"), errors);
     EXPECT_EQ("", errors.str());
     EXPECT_TRUE(QuorvexTest::fileExists(root.file("r/summary.json")));
+}
+
+TEST(ReportCommand, RunReportThatCannotBeWrittenSaysWhyOnItsOwnLine) {
+    QuorvexTest::TemporaryDirectory root;
+    QuorvexTest::writeFile(root.file("file"), "x");
+    std::ostringstream errors;
+    report::writeRunReport(nlohmann::ordered_json::object(), root.file("file/r"), errors);
+    EXPECT_EQ("quorvex-survey: report: cannot create " + root.file("file/r") +
+                  ": Not a directory\n",
+              errors.str());
 }
 
 } // namespace

@@ -4,6 +4,7 @@
 #include "report/Outcome.h"
 #include "report/PageAssets.h"
 #include "report/PageSkeleton.h"
+#include "report/ReportCommand.h"
 #include "utility/TextSafety.h"
 
 #include <cstdio>
@@ -90,7 +91,7 @@ std::string urlPath(std::string const& path) {
 }
 
 std::string optionsText(Json const& summary) {
-    if (htmlText(member(summary, "tool")) != "quorvex-survey") {
+    if (htmlText(member(summary, "tool")) != gc_ProgramName) {
         return "read from the files earlier runs left";
     }
     Json const& options = member(summary, "options");

@@ -10,6 +10,11 @@ namespace report {
 // The status text of a partition whose survey a signal to quorvex-survey
 // stopped or kept from starting; the survey itself never writes it.
 inline constexpr char gc_InterruptedStatusText[] = "Interrupted - not surveyed";
+// The status text of a partition whose worker could not be started.
+inline constexpr char gc_NotStartedStatusText[] = "Failed - not started";
+// A partition's code, as the survey prints it: surveyed, or not.
+inline constexpr char gc_SurveyedCode[] = "0";
+inline constexpr char gc_NotSurveyedCode[] = "8";
 
 // The outcome a survey's status text stands for (any but TimedOut), or
 // nothing for a text the survey never writes. A timed-out partition carries

@@ -75,4 +75,12 @@ std::string readWholeFile(std::string const& path) {
     }
 }
 
+std::string readWholeFileOrEmpty(std::string const& path) {
+    try {
+        return readWholeFile(path);
+    } catch (SystemError const&) {
+        return "";
+    }
+}
+
 } // namespace util

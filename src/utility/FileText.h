@@ -17,5 +17,8 @@ namespace util {
 // Throws SystemError ("read", path, errno) when the file cannot be opened or
 // read.
 std::string readWholeFile(std::string const& path);
+// The same, for a file that may be gone by the time it is read (a process's
+// /proc file, a survey file a run is replacing): such a file reads as empty.
+std::string readWholeFileOrEmpty(std::string const& path);
 
 } // namespace util

@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include <cerrno>
+#include <cstdio>
 #include <fcntl.h>
 #include <optional>
 #include <thread>
@@ -68,6 +69,16 @@ TEST(FileText, ReadWholeFileOfAnEmptyFileIsEmpty) {
 
 TEST(FileText, ReadWholeFileReadsProcFilesWhoseSizeIsUnknown) {
     EXPECT_EQ(0U, util::readWholeFile("/proc/self/stat").find(std::to_string(::getpid()) + " ("));
+}
+
+TEST(FileText, FileThatMayBeGoneReadsWholeWhileThereAndEmptyOnceGone) {
+    QuorvexTest::TemporaryDirectory const folder;
+    std::string const path = folder.file("piece");
+    QuorvexTest::writeFile(path, std::string("a\0b\n", 4));
+    EXPECT_EQ(util::readWholeFileOrEmpty(path), std::string("a\0b\n", 4));
+    std::remove(path.c_str());
+    EXPECT_EQ(util::readWholeFileOrEmpty(path), "");
+    EXPECT_EQ(util::readWholeFileOrEmpty(folder.path()), "");
 }
 
 TEST(FileText, ReadingAMissingFileThrowsReadWithThePathAndEnoent) {
