@@ -67,7 +67,7 @@ TEST(ChildProcess, StartedChildHasNoStartFailure) {
 }
 
 TEST(ChildProcess, ChildWithoutAResultPipeSaysWhichOperationFailedAndWhy) {
-    std::optional<std::string> failure;
+    std::optional<util::SystemError> failure;
     bool started = true;
     {
         QuorvexTest::NoFreeDescriptors const exhausted;
@@ -76,8 +76,9 @@ TEST(ChildProcess, ChildWithoutAResultPipeSaysWhichOperationFailedAndWhy) {
         failure = worker.startFailure();
     }
     EXPECT_FALSE(started);
-    EXPECT_EQ(failure, std::optional<std::string>("cannot create the result pipe: Too many open "
-                                                  "files"));
+    ASSERT_TRUE(failure.has_value());
+    EXPECT_STREQ(failure->what(), "cannot create the result pipe: Too many open files");
+    EXPECT_EQ(failure->errorNumber(), EMFILE);
 }
 
 TEST(ChildProcess, ResultIsHandedOverOnce) {

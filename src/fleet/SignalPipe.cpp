@@ -5,7 +5,6 @@
 
 #include <cerrno>
 #include <csignal>
-#include <cstring>
 
 namespace fleet {
 
@@ -24,16 +23,12 @@ void handleSignal(int signalNumber) {
     errno = savedErrno;
 }
 
-std::string failure(char const* operation) {
-    return std::string(operation) + ": " + std::strerror(errno);
-}
-
 } // namespace
 
-std::optional<std::string> installSignalPipe() {
+std::optional<util::SystemError> installSignalPipe() {
     int ends[2];
     if (pipe2(ends, O_CLOEXEC | O_NONBLOCK) != 0) {
-        return failure("cannot create the signal pipe");
+        return util::SystemError("create", "the signal pipe", errno);
     }
     gs_ReadEnd = ends[0];
     gs_WriteEnd = ends[1];
@@ -42,7 +37,7 @@ std::optional<std::string> installSignalPipe() {
     sigemptyset(&action.sa_mask);
     action.sa_flags = SA_RESTART;
     if (sigaction(SIGINT, &action, nullptr) != 0 || sigaction(SIGTERM, &action, nullptr) != 0) {
-        return failure("cannot handle SIGINT and SIGTERM");
+        return util::SystemError("handle", "SIGINT and SIGTERM", errno);
     }
     return std::nullopt;
 }
