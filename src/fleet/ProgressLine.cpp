@@ -39,12 +39,12 @@ void ProgressLine::draw(std::string const& line, Clock::time_point now) {
     }
     _lastDraw = now;
     _shown = true;
-    std::string const shown = fitToWidth(line, _terminalColumns());
+    std::string const fitted = fitToWidth(line, _terminalColumns());
     if (_openColumns == 0) {
-        _out << gc_EraseLine << shown << std::flush;
+        _out << gc_EraseLine << fitted << std::flush;
         return;
     }
-    _out << "\n\r" << shown << "\033[K" << backToOpenRow(_openColumns) << std::flush;
+    _out << "\n\r" << fitted << "\033[K" << backToOpenRow(_openColumns) << std::flush;
 }
 
 void ProgressLine::erase() {

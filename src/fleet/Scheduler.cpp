@@ -34,18 +34,21 @@ void Scheduler::_takeFromMachine(std::size_t index, std::vector<Unit>& units) {
         units.push_back({index, std::nullopt});
         return;
     }
-    for (std::size_t p = 0; p < machine.partitions.size() && _hasCapacity(); ++p) {
-        if (machine.partitions[p] == State::Waiting && !_hasEarlierUnfinished(machine, p)) {
-            machine.partitions[p] = State::Running;
+    for (std::size_t partition = 0; partition < machine.partitions.size() && _hasCapacity();
+         ++partition) {
+        if (machine.partitions[partition] == State::Waiting &&
+            !_hasEarlierUnfinished(machine, partition)) {
+            machine.partitions[partition] = State::Running;
             ++_running;
-            units.push_back({index, p});
+            units.push_back({index, partition});
         }
     }
 }
 
 bool Scheduler::_hasEarlierUnfinished(Machine const& machine, std::size_t index) const {
-    for (std::size_t p = 0; p < index; ++p) {
-        if (machine.ids[p] == machine.ids[index] && machine.partitions[p] != State::Done) {
+    for (std::size_t earlier = 0; earlier < index; ++earlier) {
+        if (machine.ids[earlier] == machine.ids[index] &&
+            machine.partitions[earlier] != State::Done) {
             return true;
         }
     }

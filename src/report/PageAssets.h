@@ -10,10 +10,10 @@ namespace report {
 
 // report.html: the page without its data; reportPage() fills each
 // <!--{{name}}--> placeholder.
-extern std::string_view const pageSkeleton;
+extern std::string_view const gc_PageSkeleton;
 // report.css, written inline into the page's <style>.
-extern std::string_view const pageStyle;
+extern std::string_view const gc_PageStyle;
 // report.js, written inline into the page's <script>.
-extern std::string_view const pageScript;
+extern std::string_view const gc_PageScript;
 
 } // namespace report

@@ -23,9 +23,9 @@ std::string pageFile(std::string const& name) {
 TEST(PageAssets, EmbeddedPageFilesAreTheSourceFilesByteForByte) {
     std::string const skeleton = pageFile("report.html");
     ASSERT_FALSE(skeleton.empty());
-    EXPECT_EQ(skeleton, report::pageSkeleton);
-    EXPECT_EQ(pageFile("report.css"), report::pageStyle);
-    EXPECT_EQ(pageFile("report.js"), report::pageScript);
+    EXPECT_EQ(skeleton, report::gc_PageSkeleton);
+    EXPECT_EQ(pageFile("report.css"), report::gc_PageStyle);
+    EXPECT_EQ(pageFile("report.js"), report::gc_PageScript);
 }
 
 std::string lowerCase(std::string_view text) {
@@ -39,8 +39,8 @@ std::string lowerCase(std::string_view text) {
 // The page writes them inline: an end tag inside would end the element
 // early and show the rest as text.
 TEST(PageAssets, InlineStyleAndScriptHoldNoEndTagOfTheirElement) {
-    EXPECT_EQ(std::string::npos, lowerCase(report::pageStyle).find("</style"));
-    EXPECT_EQ(std::string::npos, lowerCase(report::pageScript).find("</script"));
+    EXPECT_EQ(std::string::npos, lowerCase(report::gc_PageStyle).find("</style"));
+    EXPECT_EQ(std::string::npos, lowerCase(report::gc_PageScript).find("</script"));
 }
 
 } // namespace

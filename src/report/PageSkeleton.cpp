@@ -1,6 +1,7 @@
 #include "report/PageSkeleton.h"
 
 #include <algorithm>
+#include <functional>
 #include <stdexcept>
 
 namespace report {
@@ -25,24 +26,31 @@ std::string_view nameAt(std::string_view skeleton, std::size_t opening, std::siz
     return skeleton.substr(nameStart, end - gc_Closing.size() - nameStart);
 }
 
+// Calls visit with where each placeholder starts and ends and its name, in
+// the order they appear.
+void forEachPlaceholder(
+    std::string_view skeleton,
+    std::function<void(std::size_t, std::size_t, std::string_view)> const& visit) {
+    for (std::size_t opening = skeleton.find(gc_Opening); opening != std::string_view::npos;) {
+        std::size_t const end = endOfPlaceholder(skeleton, opening);
+        visit(opening, end, nameAt(skeleton, opening, end));
+        opening = skeleton.find(gc_Opening, end);
+    }
+}
+
 } // namespace
 
 std::vector<std::string_view> placeholderNames(std::string_view skeleton) {
     std::vector<std::string_view> names;
-    for (std::size_t opening = skeleton.find(gc_Opening); opening != std::string_view::npos;) {
-        std::size_t const end = endOfPlaceholder(skeleton, opening);
-        names.push_back(nameAt(skeleton, opening, end));
-        opening = skeleton.find(gc_Opening, end);
-    }
+    forEachPlaceholder(
+        skeleton, [&](std::size_t, std::size_t, std::string_view name) { names.push_back(name); });
     return names;
 }
 
 void fillSkeleton(std::string& page, std::string_view skeleton,
                   std::vector<Placeholder> const& placeholders) {
     std::size_t copied = 0;
-    for (std::size_t opening = skeleton.find(gc_Opening); opening != std::string_view::npos;) {
-        std::size_t const end = endOfPlaceholder(skeleton, opening);
-        std::string_view const name = nameAt(skeleton, opening, end);
+    forEachPlaceholder(skeleton, [&](std::size_t opening, std::size_t end, std::string_view name) {
         auto const found =
             std::find_if(placeholders.begin(), placeholders.end(),
                          [&](Placeholder const& placeholder) { return placeholder.name == name; });
@@ -53,8 +61,7 @@ void fillSkeleton(std::string& page, std::string_view skeleton,
         page.append(skeleton.substr(copied, opening - copied));
         found->fill(page);
         copied = end;
-        opening = skeleton.find(gc_Opening, end);
-    }
+    });
     page.append(skeleton.substr(copied));
 }
 

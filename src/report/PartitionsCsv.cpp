@@ -29,9 +29,9 @@ std::string csvField(std::string const& text) {
         return text;
     }
     std::string quoted = "\"";
-    for (char const c : text) {
-        quoted += c;
-        if (c == '"') {
+    for (char const character : text) {
+        quoted += character;
+        if (character == '"') {
             quoted += '"';
         }
     }

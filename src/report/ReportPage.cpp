@@ -74,13 +74,13 @@ long long countOf(Json const& counts, char const* name) {
 // file name with "#", "?", "%", spaces or markup still names its file.
 std::string urlPath(std::string const& path) {
     std::string encoded;
-    for (char const c : path) {
-        auto const byte = static_cast<unsigned char>(c);
+    for (char const character : path) {
+        auto const byte = static_cast<unsigned char>(character);
         bool const plain = (byte >= 'a' && byte <= 'z') || (byte >= 'A' && byte <= 'Z') ||
-                           (byte >= '0' && byte <= '9') || c == '-' || c == '_' || c == '.' ||
-                           c == '~' || c == '/';
+                           (byte >= '0' && byte <= '9') || character == '-' || character == '_' ||
+                           character == '.' || character == '~' || character == '/';
         if (plain) {
-            encoded += c;
+            encoded += character;
         } else {
             char hex[4] = {};
             std::snprintf(hex, sizeof hex, "%%%02X", byte);
@@ -272,8 +272,8 @@ std::vector<Placeholder> runPlaceholders(Json const& summary) {
         {"outcome-totals", [&totals](std::string& page) { appendOutcomeTotals(page, totals); }},
         textPlaceholder("tool", htmlText(member(summary, "tool"))),
         textPlaceholder("version", htmlText(member(summary, "version"))),
-        textPlaceholder("style", std::string(pageStyle)),
-        textPlaceholder("script", std::string(pageScript)),
+        textPlaceholder("style", std::string(gc_PageStyle)),
+        textPlaceholder("script", std::string(gc_PageScript)),
     };
 }
 
@@ -294,7 +294,7 @@ std::string reportPage(Json const& summary, std::string const& documentFolder) {
                             }});
     std::string page;
     page.reserve(expectedSize(summary));
-    fillSkeleton(page, pageSkeleton, placeholders);
+    fillSkeleton(page, gc_PageSkeleton, placeholders);
     return page;
 }
 

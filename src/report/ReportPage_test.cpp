@@ -164,7 +164,7 @@ TEST(ReportPage, SummaryWithFieldsMissingStillGivesAPage) {
 TEST(ReportPage, EveryPlaceholderOfTheSkeletonIsFilled) {
     std::string const full = page(Json::array({partitionEntry("1", "a", "surveyed")}));
     std::string const empty = report::reportPage(Json::object(), "../VPD");
-    EXPECT_FALSE(report::placeholderNames(report::pageSkeleton).empty());
+    EXPECT_FALSE(report::placeholderNames(report::gc_PageSkeleton).empty());
     EXPECT_EQ(std::string::npos, full.find("<!--{{"));
     EXPECT_EQ(std::string::npos, empty.find("<!--{{"));
 }
@@ -172,16 +172,16 @@ TEST(ReportPage, EveryPlaceholderOfTheSkeletonIsFilled) {
 TEST(ReportPage, StyleAndScriptAreTheEmbeddedPageFiles) {
     std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
     EXPECT_NE(std::string::npos,
-              html.find("<style>" + std::string(report::pageStyle) + "</style>"));
+              html.find("<style>" + std::string(report::gc_PageStyle) + "</style>"));
     EXPECT_NE(std::string::npos,
-              html.find("<script>" + std::string(report::pageScript) + "</script>"));
+              html.find("<script>" + std::string(report::gc_PageScript) + "</script>"));
 }
 
 // The outcome table gives each outcome its page class; the style sheet gives
 // the class its colour. A new outcome, or a renamed class, without its rule
 // would show uncoloured.
 TEST(ReportPage, StyleSheetGivesEveryOutcomesPageClassItsColour) {
-    std::string const style(report::pageStyle);
+    std::string const style(report::gc_PageStyle);
     for (report::OutcomeText const& outcome : report::outcomeTable()) {
         std::regex const rule(std::string(R"((^|[\s,}])\.)") + outcome.pageClass +
                               R"(\s*\{[^}]*--outcome-colour\s*:\s*#[0-9a-fA-F]{3,6}\s*;)");

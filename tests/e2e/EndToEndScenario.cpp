@@ -1,5 +1,7 @@
 #include "EndToEndScenario.h"
 
+#include "Lines.h"
+
 #include <algorithm>
 #include <cstdlib>
 #include <ctime>
@@ -26,10 +28,6 @@ std::vector<std::string> u_read_Lines(std::string const& path) {
         lines.push_back(line);
     }
     return lines;
-}
-
-bool u_contains(std::vector<std::string> const& texts, std::string const& text) {
-    return std::find(texts.begin(), texts.end(), text) != texts.end();
 }
 
 // Points the simulated console at a scenario file and an invocation log for
@@ -112,10 +110,10 @@ void EndToEndScenario::_placeEarlierFiles() const {
 // the scenario leaves them missing.
 std::vector<std::string> EndToEndScenario::_sandboxOptions() const {
     std::vector<std::string> options = u_read_Lines(_scenarioFile("sandbox-options"));
-    if (!u_contains(options, "--no-vpd-dir")) {
+    if (!QuorvexTest::contains(options, "--no-vpd-dir")) {
         options.insert(options.end(), {"--vpd", _vpdFolder.path()});
     }
-    if (!u_contains(options, "--no-trace-dir")) {
+    if (!QuorvexTest::contains(options, "--no-trace-dir")) {
         options.insert(options.end(), {"--trace", _traceFolder.path()});
     }
     return options;

@@ -1,5 +1,7 @@
 #include "FaultRun.h"
 
+#include "Lines.h"
+
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -28,10 +30,6 @@ constexpr char gc_CommandTail[] = "\n\"$@\" 3>&- 4>&-\n"
                                   "ls -A /tmp >&3\n"
                                   "ls -A /var/adm/quorvex >&4\n"
                                   "exit $status\n";
-
-bool u_contains(std::vector<std::string> const& texts, std::string const& text) {
-    return std::find(texts.begin(), texts.end(), text) != texts.end();
-}
 
 void u_skip(std::string const& reason) {
     GTEST_SKIP() << reason;
@@ -156,7 +154,7 @@ std::vector<std::string> FaultRun::_toolPlacement() const {
         options = {"--sim", simulator};
     }
     for (char const* tool : gc_ConsoleTools) {
-        if (!_removedTools.empty() && !u_contains(_removedTools, tool)) {
+        if (!_removedTools.empty() && !QuorvexTest::contains(_removedTools, tool)) {
             options.insert(options.end(), {"--bind", simulator + ":" + tool});
         }
     }
@@ -169,10 +167,10 @@ std::vector<std::string> FaultRun::_toolPlacement() const {
 
 std::vector<std::string> FaultRun::_resultFolders() const {
     std::vector<std::string> options;
-    if (!u_contains(_sandboxOptions, "--no-vpd-dir")) {
+    if (!QuorvexTest::contains(_sandboxOptions, "--no-vpd-dir")) {
         options.insert(options.end(), {"--vpd", _vpdFolder.path()});
     }
-    if (!u_contains(_sandboxOptions, "--no-trace-dir")) {
+    if (!QuorvexTest::contains(_sandboxOptions, "--no-trace-dir")) {
         options.insert(options.end(), {"--trace", _traceFolder.path()});
     }
     return options;

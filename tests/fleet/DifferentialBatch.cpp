@@ -1,6 +1,7 @@
 #include "DifferentialBatch.h"
 
 #include "FleetTools.h"
+#include "Lines.h"
 
 #include <algorithm>
 #include <ctime>
@@ -27,10 +28,6 @@ std::string joined(std::vector<int> const& numbers) {
         text += (text.empty() ? "" : ",") + std::to_string(number);
     }
     return text;
-}
-
-bool contains(std::vector<std::string> const& texts, std::string const& text) {
-    return std::find(texts.begin(), texts.end(), text) != texts.end();
 }
 
 } // namespace
@@ -69,10 +66,10 @@ QuorvexTest::CommandResult DifferentialBatch::run(std::vector<int> const& jobCou
     command.insert(command.end(), _caseFolders.begin(), _caseFolders.end());
     _first = static_cast<long>(std::time(nullptr));
     std::vector<std::string> options{"--bind", _folder.path() + ":" + _folder.path()};
-    if (!contains(sandboxOptions, "--no-vpd-dir")) {
+    if (!QuorvexTest::contains(sandboxOptions, "--no-vpd-dir")) {
         options.insert(options.end(), {"--vpd", _vpd.path()});
     }
-    if (!contains(sandboxOptions, "--no-trace-dir")) {
+    if (!QuorvexTest::contains(sandboxOptions, "--no-trace-dir")) {
         options.insert(options.end(), {"--trace", _trace.path()});
     }
     options.insert(options.end(), sandboxOptions.begin(), sandboxOptions.end());

@@ -1,5 +1,6 @@
 #include "Lines.h"
 
+#include <algorithm>
 #include <sstream>
 
 namespace QuorvexTest {
@@ -12,6 +13,10 @@ std::vector<std::string> linesOf(std::string const& text) {
         lines.push_back(line);
     }
     return lines;
+}
+
+bool contains(std::vector<std::string> const& lines, std::string const& line) {
+    return std::find(lines.begin(), lines.end(), line) != lines.end();
 }
 
 } // namespace QuorvexTest

@@ -18,4 +18,11 @@ TEST(Lines, EmptyTextHasNoLines) {
     EXPECT_EQ(QuorvexTest::linesOf(""), Lines{});
 }
 
+TEST(Lines, ContainsOnlyWholeLines) {
+    Lines const lines{"--no-vpd-dir", "b"};
+    EXPECT_TRUE(QuorvexTest::contains(lines, "--no-vpd-dir"));
+    EXPECT_FALSE(QuorvexTest::contains(lines, "--no-vpd"));
+    EXPECT_FALSE(QuorvexTest::contains(Lines{}, "b"));
+}
+
 } // namespace

@@ -195,7 +195,7 @@
         return Array.prototype.slice.call(filterForm.querySelectorAll("input[data-outcome]"));
     }
 
-    // The page classes of the outcomes whose boxes are ticked.
+    // Every outcome's page class with whether its box is ticked.
     function chosenOutcomeClasses() {
         var chosen = {};
         outcomeBoxes().forEach(function (box) { chosen[box.value] = box.checked; });
