@@ -22,14 +22,6 @@ using fleet::ChildProcess;
 // never end, and SIGALRM ends the process that runs the work instead.
 constexpr unsigned int gc_HangSeconds = 20;
 
-std::string readToEnd(ChildProcess& child) {
-    while (child.readAvailable()) {
-        pollfd descriptor{child.resultDescriptor(), POLLIN, 0};
-        poll(&descriptor, 1, 1000);
-    }
-    return child.result();
-}
-
 std::string sleepLong() {
     std::system("sleep 300");
     return "went on";
@@ -45,7 +37,8 @@ TEST(ChildProcess, StopNoteLeftByTheParentIsReadInTheChild) {
     });
     ASSERT_TRUE(worker.isStarted());
     worker.setStopNote("Stopped by the time limit of 2 s after 2.0 s.");
-    EXPECT_EQ(readToEnd(worker), "Stopped by the time limit of 2 s after 2.0 s.");
+    EXPECT_EQ(QuorvexTest::readResultToEnd(worker),
+              "Stopped by the time limit of 2 s after 2.0 s.");
 }
 
 TEST(ChildProcess, NoNoteOutsideAChild) {
@@ -55,7 +48,7 @@ TEST(ChildProcess, NoNoteOutsideAChild) {
 TEST(ChildProcess, ChildRunsInAProcessGroupOfItsOwn) {
     ChildProcess worker([] { return std::to_string(getpgrp()) + " " + std::to_string(getpid()); });
     ASSERT_TRUE(worker.isStarted());
-    std::string const text = readToEnd(worker);
+    std::string const text = QuorvexTest::readResultToEnd(worker);
     std::string const pid = std::to_string(worker.pid());
     EXPECT_EQ(text, pid + " " + pid);
 }
@@ -84,7 +77,7 @@ TEST(ChildProcess, ChildWithoutAResultPipeSaysWhichOperationFailedAndWhy) {
 TEST(ChildProcess, ResultIsHandedOverOnce) {
     ChildProcess worker([] { return std::string("done"); });
     ASSERT_TRUE(worker.isStarted());
-    EXPECT_EQ(readToEnd(worker), "done");
+    EXPECT_EQ(QuorvexTest::readResultToEnd(worker), "done");
     EXPECT_EQ(worker.takeResult(), "done");
     EXPECT_EQ(worker.result(), "");
 }
@@ -98,12 +91,12 @@ TEST(ChildProcess, StoppedChildGoesOnToItsEndOnceResumed) {
     EXPECT_TRUE(worker.isStopped());
     worker.resume();
     EXPECT_FALSE(worker.isStopped());
-    EXPECT_EQ(readToEnd(worker), "went on");
+    EXPECT_EQ(QuorvexTest::readResultToEnd(worker), "went on");
 }
 
 TEST(ChildProcess, ChildThatEndedIsReapedInsteadOfStopped) {
     ChildProcess worker([] { return std::string("done"); });
-    readToEnd(worker);
+    QuorvexTest::readResultToEnd(worker);
     while (!fleet::hasEnded(worker.pid())) {
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }

@@ -2,6 +2,8 @@
 
 #include "fleet/ChildProcess.h"
 
+#include "QuorvexTest.h"
+
 #include <gtest/gtest.h>
 
 #include <poll.h>
@@ -58,14 +60,6 @@ std::string waitForCommandLine(pid_t pid, std::string const& text) {
     return line;
 }
 
-std::string readToEnd(ChildProcess& child) {
-    while (child.readAvailable()) {
-        pollfd descriptor{child.resultDescriptor(), POLLIN, 0};
-        poll(&descriptor, 1, 1000);
-    }
-    return child.result();
-}
-
 TEST(ProcessTree, TreeOfSleepingShellsIsKilledAndTheWorkerGoesOn) {
     ChildProcess worker(&runSleepingTree);
     ASSERT_TRUE(worker.isStarted());
@@ -80,7 +74,7 @@ TEST(ProcessTree, TreeOfSleepingShellsIsKilledAndTheWorkerGoesOn) {
     }
     worker.resume();
 
-    EXPECT_EQ(readToEnd(worker).rfind("survived ", 0), 0U) << worker.result();
+    EXPECT_EQ(QuorvexTest::readResultToEnd(worker).rfind("survived ", 0), 0U) << worker.result();
     while (!worker.reap()) {
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }
@@ -92,7 +86,7 @@ TEST(ProcessTree, TreeOfSleepingShellsIsKilledAndTheWorkerGoesOn) {
 TEST(ProcessTree, KillingWithoutDescendantsSendsNothing) {
     ChildProcess worker([] { return std::string("done"); });
     ASSERT_TRUE(worker.isStarted());
-    EXPECT_EQ(readToEnd(worker), "done");
+    EXPECT_EQ(QuorvexTest::readResultToEnd(worker), "done");
     EXPECT_EQ(fleet::killDescendants(worker.pid()), 0U);
 }
 

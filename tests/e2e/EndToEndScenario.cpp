@@ -21,13 +21,7 @@ std::string u_read_Optional(std::string const& path) {
 
 // The lines of a file, each without its line end; none for a missing file.
 std::vector<std::string> u_read_Lines(std::string const& path) {
-    std::vector<std::string> lines;
-    std::istringstream text(u_read_Optional(path));
-    std::string line;
-    while (std::getline(text, line)) {
-        lines.push_back(line);
-    }
-    return lines;
+    return QuorvexTest::linesOf(u_read_Optional(path));
 }
 
 // Points the simulated console at a scenario file and an invocation log for

@@ -11,6 +11,7 @@
 //   Lines.h              a text cut into its lines
 //   TextDifference.h     where two texts part, for failure messages
 //   Thrown.h             the exception a piece of code throws
+//   ResultReading.h      a forked worker's whole result, waited for
 //   TraceCapture.h       what the shared trace records
 //   TracedTest.h         a test fixture whose trace is open before it runs
 //   ModelText.h          one-line texts of model objects
@@ -23,6 +24,7 @@
 #include "Lines.h"
 #include "ModelText.h"
 #include "Normalise.h"
+#include "ResultReading.h"
 #include "Sandbox.h"
 #include "SimulatedConsole.h"
 #include "TemporaryFiles.h"
