@@ -38,14 +38,14 @@ ChildProcess::ChildProcess(Body const& body) {
         // cppcheck-suppress invalidFunctionArg
         mmap(nullptr, sizeof(Slot), PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0);
     if (memory == MAP_FAILED) {
-        _fail("map", "the stop note slot");
+        _fail("cannot map the stop note slot");
         return;
     }
     _slot = new (memory) Slot{};
     int ends[2];
     // Close-on-exec: the commands the child runs must not hold the pipe open.
     if (pipe2(ends, O_CLOEXEC) != 0) {
-        _fail("create", "the result pipe");
+        _fail("cannot create the result pipe");
         return;
     }
     // Nothing buffered in the parent may be written twice by a child.
@@ -57,7 +57,7 @@ ChildProcess::ChildProcess(Body const& body) {
         _runChild(body, ends[1]);
     }
     if (_pid < 0) {
-        _fail("fork", "a worker");
+        _fail("cannot fork");
         close(ends[0]);
         close(ends[1]);
         return;
@@ -68,8 +68,8 @@ ChildProcess::ChildProcess(Body const& body) {
 }
 
 // errno is read before anything else can change it.
-void ChildProcess::_fail(char const* operation, char const* object) {
-    _startFailure = util::SystemError(operation, object, errno);
+void ChildProcess::_fail(char const* operation) {
+    _startFailure = std::string(operation) + ": " + std::strerror(errno);
 }
 
 void ChildProcess::_runChild(Body const& body, int writeEnd) {
@@ -105,7 +105,7 @@ bool ChildProcess::isStarted() const {
     return _pid > 0;
 }
 
-std::optional<util::SystemError> ChildProcess::startFailure() const {
+std::optional<std::string> ChildProcess::startFailure() const {
     return _startFailure;
 }
 

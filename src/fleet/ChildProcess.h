@@ -1,7 +1,5 @@
 #pragma once
 
-#include "utility/SystemError.h"
-
 #include <sys/types.h>
 
 #include <atomic>
@@ -30,8 +28,8 @@ public:
 
     bool isStarted() const;
     // What kept the child from starting, with errno's text, for example
-    // "cannot fork a worker: Resource temporarily unavailable"; nullopt once started.
-    std::optional<util::SystemError> startFailure() const;
+    // "cannot fork: Resource temporarily unavailable"; nullopt once started.
+    std::optional<std::string> startFailure() const;
     pid_t pid() const;
     // The reading end of the result pipe, non-blocking; -1 once at its end.
     int resultDescriptor() const;
@@ -67,10 +65,10 @@ private:
     static Slot* ms_ownSlot;
 
     [[noreturn]] void _runChild(Body const& body, int writeEnd);
-    void _fail(char const* operation, char const* object);
+    void _fail(char const* operation);
 
     pid_t _pid = -1;
-    std::optional<util::SystemError> _startFailure;
+    std::optional<std::string> _startFailure;
     int _readEnd = -1;
     Slot* _slot = nullptr;
     std::string _result;

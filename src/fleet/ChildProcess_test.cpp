@@ -60,7 +60,7 @@ TEST(ChildProcess, StartedChildHasNoStartFailure) {
 }
 
 TEST(ChildProcess, ChildWithoutAResultPipeSaysWhichOperationFailedAndWhy) {
-    std::optional<util::SystemError> failure;
+    std::optional<std::string> failure;
     bool started = true;
     {
         QuorvexTest::NoFreeDescriptors const exhausted;
@@ -69,9 +69,8 @@ TEST(ChildProcess, ChildWithoutAResultPipeSaysWhichOperationFailedAndWhy) {
         failure = worker.startFailure();
     }
     EXPECT_FALSE(started);
-    ASSERT_TRUE(failure.has_value());
-    EXPECT_STREQ(failure->what(), "cannot create the result pipe: Too many open files");
-    EXPECT_EQ(failure->errorNumber(), EMFILE);
+    EXPECT_EQ(failure, std::optional<std::string>("cannot create the result pipe: Too many open "
+                                                  "files"));
 }
 
 TEST(ChildProcess, ResultIsHandedOverOnce) {

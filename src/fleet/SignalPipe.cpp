@@ -5,6 +5,7 @@
 
 #include <cerrno>
 #include <csignal>
+#include <cstring>
 
 namespace fleet {
 
@@ -23,12 +24,16 @@ void handleSignal(int signalNumber) {
     errno = savedErrno;
 }
 
+std::string failure(char const* operation) {
+    return std::string(operation) + ": " + std::strerror(errno);
+}
+
 } // namespace
 
-std::optional<util::SystemError> installSignalPipe() {
+std::optional<std::string> installSignalPipe() {
     int ends[2];
     if (pipe2(ends, O_CLOEXEC | O_NONBLOCK) != 0) {
-        return util::SystemError("create", "the signal pipe", errno);
+        return failure("cannot create the signal pipe");
     }
     gs_ReadEnd = ends[0];
     gs_WriteEnd = ends[1];
@@ -37,7 +42,7 @@ std::optional<util::SystemError> installSignalPipe() {
     sigemptyset(&action.sa_mask);
     action.sa_flags = SA_RESTART;
     if (sigaction(SIGINT, &action, nullptr) != 0 || sigaction(SIGTERM, &action, nullptr) != 0) {
-        return util::SystemError("handle", "SIGINT and SIGTERM", errno);
+        return failure("cannot handle SIGINT and SIGTERM");
     }
     return std::nullopt;
 }

@@ -1,7 +1,5 @@
 #pragma once
 
-#include "utility/SystemError.h"
-
 #include <optional>
 #include <string>
 
@@ -13,7 +11,7 @@ namespace fleet {
 // Makes the pipe and handles both signals through it. What failed, with
 // errno's text, when it could not ("cannot create the signal pipe: Too many
 // open files"); the signals then keep their default action.
-[[nodiscard]] std::optional<util::SystemError> installSignalPipe();
+[[nodiscard]] std::optional<std::string> installSignalPipe();
 // The pipe's reading end, -1 while there is none.
 int signalPipeDescriptor();
 // The first signal received so far, 0 when none; drains the pipe.

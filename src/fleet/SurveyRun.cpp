@@ -120,9 +120,9 @@ void SurveyRun::_startUnit(Scheduler::Unit const& unit) {
         body = [identity, piece] { return listPartitions(identity, piece); };
     }
     UnitKind const kind = unit.partition ? UnitKind::Survey : UnitKind::PartitionListing;
-    if (std::optional<util::SystemError> const failure = _pool.start(slot, kind, body)) {
+    if (std::optional<std::string> const failure = _pool.start(slot, kind, body)) {
         _output.releaseSlot(slot);
-        _notStarted(unit, failure->what());
+        _notStarted(unit, *failure);
         return;
     }
     if (_inFlight.size() <= slot) {

@@ -16,11 +16,11 @@ constexpr int gc_EndingPollMilliseconds = 1;
 
 WorkerPool::WorkerPool(int wakeDescriptor) : _wakeDescriptor(wakeDescriptor) {}
 
-std::optional<util::SystemError> WorkerPool::start(std::size_t tag, UnitKind kind,
-                                                   ChildProcess::Body const& body) {
+std::optional<std::string> WorkerPool::start(std::size_t tag, UnitKind kind,
+                                             ChildProcess::Body const& body) {
     Worker worker{tag, kind, nullptr, secondsSinceBoot()};
     worker.child = std::make_unique<ChildProcess>(body);
-    if (std::optional<util::SystemError> failure = worker.child->startFailure()) {
+    if (std::optional<std::string> failure = worker.child->startFailure()) {
         return failure;
     }
     _workers.push_back(std::move(worker));

@@ -49,8 +49,8 @@ public:
 
     // Starts body in a worker named tag, which no other worker of the pool
     // in flight may have. What kept it from starting, nullopt once started.
-    [[nodiscard]] std::optional<util::SystemError> start(std::size_t tag, UnitKind kind,
-                                                         ChildProcess::Body const& body);
+    [[nodiscard]] std::optional<std::string> start(std::size_t tag, UnitKind kind,
+                                                   ChildProcess::Body const& body);
     std::size_t size() const;
     // Waits up to gc_PollMilliseconds for a result pipe or the wake
     // descriptor, reads the pipes found ready and reports the workers that

@@ -26,9 +26,9 @@ namespace {
 std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
     fleet::WorkerPool pool(fleet::signalPipeDescriptor());
     fleet::TimeLimits limits(timeoutSeconds);
-    if (std::optional<util::SystemError> const failure =
+    if (std::optional<std::string> const failure =
             pool.start(0, fleet::UnitKind::MachineListing, &fleet::listMachines)) {
-        std::cerr << report::gc_ProgramName << ": listing the managed machines: " << failure->what()
+        std::cerr << report::gc_ProgramName << ": cannot list the managed machines: " << *failure
                   << std::endl;
         return {};
     }
@@ -101,8 +101,8 @@ int main(int argc, char** argv) {
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;
     }
-    if (std::optional<util::SystemError> const failure = fleet::installSignalPipe()) {
-        std::cerr << report::gc_ProgramName << ": " << failure->what() << std::endl;
+    if (std::optional<std::string> const failure = fleet::installSignalPipe()) {
+        std::cerr << report::gc_ProgramName << ": " << *failure << std::endl;
     }
     auto const startedAt = std::chrono::steady_clock::now();
     std::time_t const started = std::time(nullptr);
