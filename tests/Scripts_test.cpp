@@ -80,7 +80,7 @@ class StandInAptGet {
 public:
     explicit StandInAptGet(std::string const& body) {
         _write("id", "echo 0\n");
-        _write("apt-get", "printf '%s\\n' \"$*\" >>'" + calls() + "'\n" + body);
+        _write("apt-get", R"(printf '%s\n' "$*" >>')" + calls() + "'\n" + body);
     }
 
     std::string calls() const { return _folder.file("calls"); }

@@ -5,6 +5,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <iterator>
+
 namespace {
 
 using fleet::MachineRecord;
@@ -84,10 +87,10 @@ Json document(RunFacts const& run, std::vector<MachineRecord> const& machines) {
 
 TEST(Summary, PartitionOutcomesAreTheRecordsOutcomes) {
     Json const summary = document(facts(), everyOutcome());
+    Json const& partitions = summary["machines"][0]["partitions"];
     std::vector<std::string> outcomes;
-    for (Json const& partition : summary["machines"][0]["partitions"]) {
-        outcomes.push_back(partition["outcome"]);
-    }
+    std::transform(partitions.begin(), partitions.end(), std::back_inserter(outcomes),
+                   [](Json const& partition) { return partition["outcome"].get<std::string>(); });
     EXPECT_EQ(outcomes,
               (std::vector<std::string>{"surveyed", "inactive", "channel_failure", "client_failure",
                                         "fetch_failure", "timed_out", "interrupted"}));

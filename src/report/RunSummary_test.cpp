@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <iterator>
+
 namespace {
 
 using Json = nlohmann::ordered_json;
@@ -27,9 +30,9 @@ report::RunSummary oneMachine(std::vector<PartitionSummary> partitions) {
 
 std::vector<std::string> keysOf(Json const& object) {
     std::vector<std::string> keys;
-    for (auto const& item : object.items()) {
-        keys.push_back(item.key());
-    }
+    auto const items = object.items();
+    std::transform(items.begin(), items.end(), std::back_inserter(keys),
+                   [](auto const& item) { return item.key(); });
     return keys;
 }
 

@@ -42,11 +42,13 @@ TEST(FileText, WriteAllDeliversMoreThanAPipeHoldsAtOnce) {
 
 TEST(FileText, WriteAllToAReadOnlyDescriptorIsFalseWithEbadf) {
     int const descriptor = ::open("/dev/null", O_RDONLY | O_CLOEXEC);
-    ASSERT_GE(descriptor, 0);
+    EXPECT_GE(descriptor, 0);
     errno = 0;
-    EXPECT_FALSE(util::writeAll(descriptor, "x"));
-    EXPECT_EQ(EBADF, errno);
+    bool const written = util::writeAll(descriptor, "x");
+    int const error = errno;
     ::close(descriptor);
+    EXPECT_FALSE(written);
+    EXPECT_EQ(EBADF, error);
 }
 
 TEST(FileText, WriteAllOfNothingWritesNothingAndSucceeds) {
