@@ -110,18 +110,21 @@ std::string timeElement(Json const& value) {
     return "<time datetime=\"" + htmlText(value) + "\">" + timeText(value) + "</time>";
 }
 
+// Each option with its value, and each identity, is kept whole on its line
+// (a line may break after the "-" of "-j" or inside "9119-MHE_21ABCDE");
+// lines break between them.
 std::string optionsText(Json const& summary) {
     if (htmlText(member(summary, "tool")) != gc_ProgramName) {
         return "read from the files earlier runs left";
     }
     Json const& options = member(summary, "options");
-    std::string text = "-j " + htmlText(member(options, "jobs")) + " -t " +
-                       htmlText(member(options, "timeout_seconds"));
+    std::string text = "<span>-j " + htmlText(member(options, "jobs")) + "</span> <span>-t " +
+                       htmlText(member(options, "timeout_seconds")) + "</span>";
     if (member(options, "all").is_boolean() && member(options, "all").get<bool>()) {
-        return text + " --all";
+        return text + " <span>--all</span>";
     }
     for (Json const& identity : member(options, "identities")) {
-        text += " " + htmlText(identity);
+        text += " <span>" + htmlText(identity) + "</span>";
     }
     return text;
 }
