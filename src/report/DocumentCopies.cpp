@@ -54,10 +54,11 @@ std::optional<std::string> documentFileName(std::string const& document) {
 std::set<std::string> copyDocuments(nlohmann::ordered_json const& summary,
                                     std::string const& vpdFolder, std::string const& reportFolder) {
     std::set<std::string> copied;
-    std::string const copies = reportFolder + "/" + gc_DocumentFolder;
+    std::string const from = vpdFolder + "/";
+    std::string const to = reportFolder + "/" + gc_DocumentFolder + "/";
     for (std::string const& document : namedDocuments(summary)) {
         std::string const file = *documentFileName(document);
-        if (copyDocument(vpdFolder + "/" + file, copies + "/" + file)) {
+        if (copyDocument(from + file, to + file)) {
             copied.insert(document);
         }
     }

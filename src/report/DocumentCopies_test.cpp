@@ -6,8 +6,10 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <filesystem>
+#include <iterator>
 
 namespace {
 
@@ -16,9 +18,10 @@ using Json = nlohmann::ordered_json;
 
 Json summaryNaming(Json documents) {
     Json partitions = Json::array();
-    for (Json& document : documents) {
-        partitions.push_back({{"outcome", "surveyed"}, {"document", std::move(document)}});
-    }
+    std::transform(documents.begin(), documents.end(), std::back_inserter(partitions),
+                   [](Json const& document) -> Json {
+                       return {{"outcome", "surveyed"}, {"document", document}};
+                   });
     return {{"machines", Json::array({{{"identity", "1-A_S"}, {"partitions", partitions}}})}};
 }
 

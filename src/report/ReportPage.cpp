@@ -161,11 +161,11 @@ std::string barOf(Json const& counts) {
         char width[32] = {};
         std::snprintf(width, sizeof width, "%.3f%%",
                       100.0 * static_cast<double>(count) / static_cast<double>(partitions));
-        std::string const pageClass(outcome.pageClass);
         std::string const text = std::to_string(count) + " " + outcome.label;
-        bar += "<i class=\"" + pageClass + "\" style=\"width:" + width + "\" title=\"" + text +
-               "\"></i>";
-        described += "<span><span class=\"key " + pageClass + "\"></span>" + text + "</span> ";
+        bar += "<i class=\"" + std::string(outcome.pageClass) + "\" style=\"width:" + width +
+               "\" title=\"" + text + "\"></i>";
+        described += "<span><span class=\"key " + std::string(outcome.pageClass) + "\"></span>" +
+                     text + "</span> ";
     }
     return bar + "</div><p class=\"counts\">" +
            (described.empty() ? "none listed" : described.substr(0, described.size() - 1)) + "</p>";

@@ -99,7 +99,8 @@ TEST(ReportPage, HeaderShowsConsoleTimesOptionsAndTotals) {
     EXPECT_NE(std::string::npos,
               html.find("<title>Partition survey of console&lt;1&gt;, Mon 23 Nov 2026 14:05:09 "
                         "UTC+01:00</title>"));
-    EXPECT_NE(std::string::npos, html.find("options: <b class=\"options\"><span>-j 8</span> <span>-t 1800</span> <span>--all</span></b>"));
+    EXPECT_NE(std::string::npos, html.find("options: <b class=\"options\"><span>-j 8</span> "
+                                           "<span>-t 1800</span> <span>--all</span></b>"));
     EXPECT_NE(
         std::string::npos,
         html.find("<li class=\"c\" data-outcome=\"channel_failure\"><b>1</b>channel failure"));
