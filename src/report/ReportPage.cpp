@@ -214,13 +214,14 @@ void appendMachineRows(std::string& page, Json const& machines) {
     }
 }
 
-// The outcomes' keys, and the mark of a machine whose listing failed.
+// The outcomes' keys, and the mark of a machine whose listing failed, each
+// key kept on the line of its name.
 void appendOutcomeKeys(std::string& page) {
     for (OutcomeText const& outcome : outcomeTable()) {
-        page +=
-            "<span class=\"key " + std::string(outcome.pageClass) + "\"></span>" + outcome.label;
+        page += "<span><span class=\"key " + std::string(outcome.pageClass) + "\"></span>" +
+                outcome.label + "</span> ";
     }
-    page += R"(<span class="key listing-failed"></span>listing failed)";
+    page += R"(<span><span class="key listing-failed"></span>listing failed</span>)";
 }
 
 // The filter's boxes: the value is the class of the rows a box keeps.

@@ -95,7 +95,7 @@ TEST(ReportPage, HeaderShowsConsoleTimesOptionsAndTotals) {
               html.find("Started <b><time datetime=\"2026-11-23T14:05:09+01:00\">Mon 23 Nov 2026 "
                         "14:05:09 UTC+01:00</time></b>, ended <b><time "
                         "datetime=\"2026-11-23T14:06:10+01:00\">Mon 23 Nov 2026 14:06:10 "
-                        "UTC+01:00</time></b> (61.0 s)"));
+                        "UTC+01:00</time></b> (61.0&nbsp;s)"));
     EXPECT_NE(std::string::npos,
               html.find("<title>Partition survey of console&lt;1&gt;, Mon 23 Nov 2026 14:05:09 "
                         "UTC+01:00</title>"));

@@ -343,11 +343,11 @@ WORDS = "h1, h2, .run, .totals li, .machines th, .machines td, #reading dt, #rea
         "#filters label, #parts th, #parts td"
 # Texts that must stay on one line: headings of columns, a partition's cells
 # (of a reason, its summary: its text is laid out even while closed), a
-# machine's identity, code and count, each outcome count, a total, a time,
-# an option.
+# machine's identity, code and count, each outcome count, each key with its
+# name, a total, a time, an option.
 ONE_LINE = "#parts thead th, #parts tbody td:not(:has(details)), #parts summary, .machines th, " \
-           ".machines td.code, .machines td.number, .counts > span, .totals li b, time, " \
-           ".options span, #reading dt"
+           ".machines td.code, .machines td.number, .counts > span, .keys > span, .totals li b, " \
+           "time, .options span, #reading dt"
 # Boxes whose content must not be cut off: headings and the cells.
 NOT_CUT = "h1, h2, th, td, #reading dt, .totals li"
 
