@@ -209,6 +209,15 @@ TEST(InventoryDocumentReader, MarkupAndQuotesInAttributesAreReadAsWritten) {
     EXPECT_EQ("a&b<c\"d\">e", reading.components.at(1).valueOf("HN"));
 }
 
+TEST(InventoryDocumentReader, HostNameThatLooksLikeTheDocumentsOwnTagsIsReadAsWritten) {
+    std::string const hostName = "<Property name=\"x\"><Value type=\"string\">";
+    DocumentReading const reading = readDocument(inventoryDocument(hostName, "Zeph"));
+    EXPECT_FALSE(reading.isUnreadable()) << reading.unreadableText();
+    EXPECT_EQ(hostName, reading.components.at(1).displayName);
+    EXPECT_EQ(hostName, reading.components.at(1).valueOf("HN"));
+    EXPECT_EQ(3u, reading.components.at(1).keywords.size());
+}
+
 TEST(InventoryDocumentReader, TextThatLooksEscapedIsTakenAsWritten) {
     DocumentReading const reading = readDocument(inventoryDocument("aurora", "&amp; &#60; &lt;"));
     EXPECT_EQ("&amp; &#60; &lt;", componentNamed(reading, "aurora").valueOf("OS"));
@@ -361,6 +370,54 @@ TEST(InventoryDocumentReader, RandomBytesAreUnreadableNeverACrash) {
         auto const lineEnds = std::count_if(bytes.begin(), bytes.end(),
                                             [](char c) { return c == '\n' || c == '\r'; });
         EXPECT_LE(reading.stop->line, static_cast<unsigned long>(lineEnds) + 1) << round;
+    }
+}
+
+// The documents the end-to-end scenarios expect the survey tool to write or
+// fetch, and the simulated console's client documents.
+std::vector<std::string> scenarioDocuments() {
+    std::vector<std::string> documents;
+    std::string const root = QuorvexTest::sourceRoot();
+    for (std::string const& scenario : QuorvexTest::listFolder(root + "/tests/e2e/scenarios")) {
+        std::string const folder = root + "/tests/e2e/scenarios/" + scenario + "/expected/VPD";
+        if (!QuorvexTest::fileExists(folder)) {
+            continue;
+        }
+        for (std::string const& name : QuorvexTest::listFolder(folder)) {
+            if (name.size() > 8 && name.compare(name.size() - 8, 8, ".VPD.xml") == 0) {
+                documents.push_back(folder + "/" + name);
+            }
+        }
+    }
+    for (std::string const& name : QuorvexTest::listFolder(root + "/sim/scenarios/documents")) {
+        documents.push_back(root + "/sim/scenarios/documents/" + name);
+    }
+    return documents;
+}
+
+TEST(InventoryDocumentReader, EveryDefaultDocumentOfTheScenariosIsRecognisedAndReadWhole) {
+    unsigned defaults = 0;
+    for (std::string const& path : scenarioDocuments()) {
+        if (QuorvexTest::readFile(path).find("name=\"VD\"") == std::string::npos) {
+            continue;
+        }
+        DocumentReading const reading = inventory::readDocumentFile(path);
+        EXPECT_TRUE(reading.isDefaultDocument()) << path;
+        EXPECT_FALSE(reading.isUnreadable()) << path << ": " << reading.unreadableText();
+        EXPECT_FALSE(reading.failureReason.empty()) << path;
+        ++defaults;
+    }
+    EXPECT_LT(20u, defaults);
+}
+
+TEST(InventoryDocumentReader, EveryClientDocumentOfTheSimulatedConsoleReadsWhole) {
+    for (std::string const& name :
+         QuorvexTest::listFolder(QuorvexTest::sourceRoot() + "/sim/scenarios/documents")) {
+        DocumentReading const reading = inventory::readDocumentFile(
+            QuorvexTest::sourceRoot() + "/sim/scenarios/documents/" + name);
+        EXPECT_EQ(DocumentReading::Kind::Inventory, reading.kind) << name;
+        EXPECT_FALSE(reading.isUnreadable()) << name << ": " << reading.unreadableText();
+        EXPECT_LE(4u, reading.components.size()) << name;
     }
 }
 

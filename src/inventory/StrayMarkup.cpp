@@ -13,6 +13,8 @@ constexpr std::array<std::string_view, 7> gc_ElementNames = {
     "com.zor.inventory", "ResourceSet", "Resource", "ResourceList",
     "PropertyGroup",     "Property",    "Value"};
 constexpr std::string_view gc_ValueElement = "Value";
+constexpr std::string_view gc_ResourceElement = "Resource";
+constexpr std::string_view gc_DisplayNameAttribute = "displayName";
 constexpr std::string_view gc_ValueEndTag = "</Value>";
 constexpr std::string_view gc_PropertyEndTag = "</Property>";
 constexpr std::string_view gc_Declaration = "<?xml";
@@ -45,6 +47,8 @@ class Scan {
     std::string_view _in;
     std::size_t _at = 0;
     std::string _out;
+    // The raw display name of the begin tag copied last.
+    std::string_view _displayName;
 
     std::size_t _nameEnd(std::size_t from) const;
     bool _copyDeclaration();
@@ -55,6 +59,7 @@ class Scan {
     bool _isFollowedByAttribute(std::size_t from) const;
     bool _isLineTagEnd(std::size_t at) const;
     void _copyValueText();
+    void _copyNameLine();
     std::size_t _valueEnd() const;
     void _escape(std::size_t end);
 };
@@ -107,6 +112,7 @@ bool Scan::_copyEndTag() {
 bool Scan::_copyStartTag() {
     std::size_t const end = _nameEnd(_at + 1);
     std::string_view const name = _in.substr(_at + 1, end - _at - 1);
+    _displayName = {};
     if (!isElementName(name) || (end < _in.size() && !isBlank(_in[end]) && _in[end] != '>')) {
         return false;
     }
@@ -119,9 +125,25 @@ bool Scan::_copyStartTag() {
         ++_at;
         if (name == gc_ValueElement) {
             _copyValueText();
+        } else if (name == gc_ResourceElement) {
+            _copyNameLine();
         }
     }
     return true;
+}
+
+// The writer repeats a resource's display name on the line after its begin
+// tag; that line is text, whatever it holds.
+void Scan::_copyNameLine() {
+    if (_in.substr(_at, 1) != "\n") {
+        return;
+    }
+    std::size_t const lineEnd = std::min(_in.find('\n', _at + 1), _in.size());
+    std::string_view const line = _in.substr(_at + 1, lineEnd - _at - 1);
+    std::size_t const indentation = line.find_first_not_of(' ');
+    if (line.substr(std::min(indentation, line.size())) == _displayName) {
+        _escape(lineEnd);
+    }
 }
 
 bool Scan::_copyAttribute(std::string_view element) {
@@ -135,6 +157,9 @@ bool Scan::_copyAttribute(std::string_view element) {
     std::size_t const valueEnd = _attributeValueEnd(nameEnd + 2, element);
     if (valueEnd == gc_None) {
         return false;
+    }
+    if (_in.substr(nameStart, nameEnd - nameStart) == gc_DisplayNameAttribute) {
+        _displayName = _in.substr(nameEnd + 2, valueEnd - nameEnd - 2);
     }
     _out.append(_in.substr(_at, nameEnd + 2 - _at));
     _at = nameEnd + 2;
