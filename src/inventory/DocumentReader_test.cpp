@@ -210,7 +210,7 @@ TEST(InventoryDocumentReader, MarkupAndQuotesInAttributesAreReadAsWritten) {
 }
 
 TEST(InventoryDocumentReader, HostNameThatLooksLikeTheDocumentsOwnTagsIsReadAsWritten) {
-    std::string const hostName = "<Property name=\"x\"><Value type=\"string\">";
+    std::string const hostName = "  <Property name=\"x\"><Value type=\"string\">";
     DocumentReading const reading = readDocument(inventoryDocument(hostName, "Zeph"));
     EXPECT_FALSE(reading.isUnreadable()) << reading.unreadableText();
     EXPECT_EQ(hostName, reading.components.at(1).displayName);

@@ -140,8 +140,10 @@ void Scan::_copyNameLine() {
     }
     std::size_t const lineEnd = std::min(_in.find('\n', _at + 1), _in.size());
     std::string_view const line = _in.substr(_at + 1, lineEnd - _at - 1);
-    std::size_t const indentation = line.find_first_not_of(' ');
-    if (line.substr(std::min(indentation, line.size())) == _displayName) {
+    bool const isNameLine = line.size() >= _displayName.size() &&
+                            line.substr(line.size() - _displayName.size()) == _displayName &&
+                            line.find_first_not_of(' ') >= line.size() - _displayName.size();
+    if (isNameLine) {
         _escape(lineEnd);
     }
 }
