@@ -40,19 +40,21 @@ void u_check_Stop(DocumentReading const& reading, std::string const& bytes) {
                                 reading.stop->line <= static_cast<unsigned long>(lineEnds) + 1,
                             "reading stops at a line of the document", bytes);
     Fuzz_Utility::u_require(!reading.stop->reason.empty() &&
-                                reading.unreadableText() ==
-                                    "document unreadable at line " +
-                                        std::to_string(reading.stop->line) + ": " +
-                                        reading.stop->reason,
+                                reading.unreadableText() == "document unreadable at line " +
+                                                                std::to_string(reading.stop->line) +
+                                                                ": " + reading.stop->reason,
                             "an unreadable document says where and why", bytes);
 }
 
 // The key a component must have, without its occurrence number.
 ComponentKey u_expected_Key(Component const& component) {
-    for (inventory::Keyword const& keyword : component.keywords) {
-        if (keyword.name == inventory::gc_LocationCodeKeyword && !keyword.value.empty()) {
-            return {ComponentKey::Kind::LocationCode, keyword.value};
-        }
+    auto const location = std::find_if(
+        component.keywords.begin(), component.keywords.end(),
+        [](inventory::Keyword const& keyword) {
+            return keyword.name == inventory::gc_LocationCodeKeyword && !keyword.value.empty();
+        });
+    if (location != component.keywords.end()) {
+        return {ComponentKey::Kind::LocationCode, location->value};
     }
     if (!component.uniqueId.empty()) {
         return {ComponentKey::Kind::UniqueId, component.uniqueId};
@@ -76,8 +78,8 @@ void u_check_Components(DocumentReading const& reading, std::string const& bytes
     }
 }
 
-std::string u_written(std::string const& host, std::string const& system,
-                      std::string const& serial, std::string const& location) {
+std::string u_written(std::string const& host, std::string const& system, std::string const& serial,
+                      std::string const& location) {
     Quorvex::VPD::Resource adapter("ent0", "M-1-ent0");
     adapter.insert_Property(Quorvex::VPD::Property("SN", serial));
     adapter.insert_Property(Quorvex::VPD::Property("YL", location));
@@ -97,8 +99,8 @@ std::string u_written(std::string const& host, std::string const& system,
 // Printable ASCII without the closing value tag reads back as written; a
 // host name, which is also an attribute value, without a quote as well.
 bool u_is_Recoverable(std::string const& value, bool isAttribute) {
-    bool const printable = std::all_of(value.begin(), value.end(),
-                                       [](char c) { return c >= ' ' && c <= '~'; });
+    bool const printable =
+        std::all_of(value.begin(), value.end(), [](char c) { return c >= ' ' && c <= '~'; });
     return printable && value.find("</Value>") == std::string::npos &&
            (!isAttribute || value.find('"') == std::string::npos);
 }

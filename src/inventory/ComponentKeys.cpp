@@ -1,5 +1,6 @@
 #include "inventory/ComponentKeys.h"
 
+#include <algorithm>
 #include <map>
 #include <utility>
 
@@ -8,12 +9,11 @@ namespace inventory {
 namespace {
 
 std::string firstLocationCode(Component const& component) {
-    for (Keyword const& keyword : component.keywords) {
-        if (keyword.name == gc_LocationCodeKeyword && !keyword.value.empty()) {
-            return keyword.value;
-        }
-    }
-    return {};
+    auto const found = std::find_if(
+        component.keywords.begin(), component.keywords.end(), [](Keyword const& keyword) {
+            return keyword.name == gc_LocationCodeKeyword && !keyword.value.empty();
+        });
+    return found == component.keywords.end() ? std::string() : found->value;
 }
 
 ComponentKey keyWithoutOccurrence(Component const& component) {

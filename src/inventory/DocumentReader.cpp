@@ -57,7 +57,7 @@ Element elementOf(std::string_view name) {
 
 // Follows expat's events and builds the reading from them.
 class ExpatReading {
-  public:
+public:
     ExpatReading();
 
     DocumentReading read(std::string const& escaped);
@@ -65,7 +65,7 @@ class ExpatReading {
     void end();
     void text(std::string_view text);
 
-  private:
+private:
     std::unique_ptr<XML_ParserStruct, decltype(&XML_ParserFree)> _parser;
     DocumentReading _reading;
     std::vector<Element> _open;
@@ -177,7 +177,8 @@ void ExpatReading::_startResource(XML_Char const** attributes) {
     if (!_resources.empty()) {
         component.parent = _resources.back();
     }
-    bool const isListed = !_open.empty() && _open.back() == Element::ResourceList && !_lists.empty();
+    bool const isListed =
+        !_open.empty() && _open.back() == Element::ResourceList && !_lists.empty();
     component.list = isListed ? _lists.back() : std::string();
     _resources.push_back(_reading.components.size());
     _reading.components.push_back(std::move(component));
@@ -187,7 +188,9 @@ void ExpatReading::_startProperty(XML_Char const** attributes) {
     if (_resources.empty()) {
         return;
     }
-    _keyword = Keyword{attribute(attributes, "name"), attribute(attributes, "displayName"), {},
+    _keyword = Keyword{attribute(attributes, "name"),
+                       attribute(attributes, "displayName"),
+                       {},
                        _groups.empty() ? std::string() : _groups.back()};
     if (_keyword->name == gc_ReasonKeyword) {
         _reading.kind = DocumentReading::Kind::DefaultDocument;

@@ -34,8 +34,7 @@ std::string written(Resource const& machine) {
     return out.str();
 }
 
-Resource adapter(std::string const& name, std::string const& serial,
-                 std::string const& location) {
+Resource adapter(std::string const& name, std::string const& serial, std::string const& location) {
     Resource resource(name, "1234-ABC-10ABCDE-1-" + name);
     resource.insert_Property(Property("PN", "01FT739"));
     resource.insert_Property(Property("SN", serial));
@@ -80,10 +79,9 @@ std::string defaultDocument(std::string const& reason) {
 }
 
 std::vector<std::string> identities(DocumentReading const& reading) {
-    std::vector<std::string> result;
-    for (Component const& component : reading.components) {
-        result.push_back(component.key.identity());
-    }
+    std::vector<std::string> result(reading.components.size());
+    std::transform(reading.components.begin(), reading.components.end(), result.begin(),
+                   [](Component const& component) { return component.key.identity(); });
     return result;
 }
 
@@ -110,10 +108,10 @@ TEST(InventoryDocumentReader, WrittenDocumentGivesEveryResourceInDocumentOrder) 
     DocumentReading const reading = readDocument(inventoryDocument());
     EXPECT_FALSE(reading.isUnreadable()) << reading.unreadableText();
     EXPECT_EQ(DocumentReading::Kind::Inventory, reading.kind);
-    EXPECT_EQ((std::vector<std::string>{"1234-ABC-10ABCDE", "1234-ABC-10ABCDE-1",
-                                        "U78D5.ND1-P1-C6-T1", "U78D5.ND1-P1-C3-T1",
-                                        "U78D5.ND1-P1-C17"}),
-              identities(reading));
+    EXPECT_EQ(
+        (std::vector<std::string>{"1234-ABC-10ABCDE", "1234-ABC-10ABCDE-1", "U78D5.ND1-P1-C6-T1",
+                                  "U78D5.ND1-P1-C3-T1", "U78D5.ND1-P1-C17"}),
+        identities(reading));
     EXPECT_EQ("", reading.unreadableText());
 }
 
@@ -210,7 +208,7 @@ TEST(InventoryDocumentReader, MarkupAndQuotesInAttributesAreReadAsWritten) {
 }
 
 TEST(InventoryDocumentReader, HostNameThatLooksLikeTheDocumentsOwnTagsIsReadAsWritten) {
-    std::string const hostName = "  <Property name=\"x\"><Value type=\"string\">";
+    std::string const hostName = R"(  <Property name="x"><Value type="string">)";
     DocumentReading const reading = readDocument(inventoryDocument(hostName, "Zeph"));
     EXPECT_FALSE(reading.isUnreadable()) << reading.unreadableText();
     EXPECT_EQ(hostName, reading.components.at(1).displayName);
@@ -310,9 +308,9 @@ TEST(InventoryDocumentReader, TruncatedDocumentKeepsTheComponentsBeforeTheCut) {
                   std::to_string(linesOf(document.substr(0, document.find("fcs0")))) +
                   ": not well-formed (invalid token)",
               reading.unreadableText());
-    EXPECT_EQ((std::vector<std::string>{"1234-ABC-10ABCDE", "1234-ABC-10ABCDE-1",
-                                        "U78D5.ND1-P1-C6-T1"}),
-              identities(reading));
+    EXPECT_EQ(
+        (std::vector<std::string>{"1234-ABC-10ABCDE", "1234-ABC-10ABCDE-1", "U78D5.ND1-P1-C6-T1"}),
+        identities(reading));
 }
 
 TEST(InventoryDocumentReader, DocumentCutInAValueDropsOnlyThatKeyword) {
@@ -363,7 +361,8 @@ TEST(InventoryDocumentReader, RandomBytesAreUnreadableNeverACrash) {
     std::uniform_int_distribution<int> byte(0, 255);
     for (int round = 0; round < 200; ++round) {
         std::string bytes(static_cast<std::size_t>(round * 7), '\0');
-        std::generate(bytes.begin(), bytes.end(), [&] { return static_cast<char>(byte(generator)); });
+        std::generate(bytes.begin(), bytes.end(),
+                      [&] { return static_cast<char>(byte(generator)); });
         DocumentReading const reading = readDocument(bytes);
         EXPECT_TRUE(reading.isUnreadable()) << round;
         // Expat counts a carriage return as a line end too.
@@ -373,24 +372,27 @@ TEST(InventoryDocumentReader, RandomBytesAreUnreadableNeverACrash) {
     }
 }
 
+std::string inFolder(std::string folder, std::string const& name) {
+    folder += '/';
+    folder += name;
+    return folder;
+}
+
 // The documents the end-to-end scenarios expect the survey tool to write or
-// fetch, and the simulated console's client documents.
+// fetch.
 std::vector<std::string> scenarioDocuments() {
     std::vector<std::string> documents;
-    std::string const root = QuorvexTest::sourceRoot();
-    for (std::string const& scenario : QuorvexTest::listFolder(root + "/tests/e2e/scenarios")) {
-        std::string const folder = root + "/tests/e2e/scenarios/" + scenario + "/expected/VPD";
+    std::string const scenarios = QuorvexTest::sourceRoot() + "/tests/e2e/scenarios";
+    for (std::string const& scenario : QuorvexTest::listFolder(scenarios)) {
+        std::string const folder = inFolder(inFolder(scenarios, scenario), "expected/VPD");
         if (!QuorvexTest::fileExists(folder)) {
             continue;
         }
         for (std::string const& name : QuorvexTest::listFolder(folder)) {
             if (name.size() > 8 && name.compare(name.size() - 8, 8, ".VPD.xml") == 0) {
-                documents.push_back(folder + "/" + name);
+                documents.push_back(inFolder(folder, name));
             }
         }
-    }
-    for (std::string const& name : QuorvexTest::listFolder(root + "/sim/scenarios/documents")) {
-        documents.push_back(root + "/sim/scenarios/documents/" + name);
     }
     return documents;
 }

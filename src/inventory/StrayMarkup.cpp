@@ -36,14 +36,14 @@ bool isElementName(std::string_view name) {
 
 // Scans the document once, copying markup and escaping the text around it.
 class Scan {
-  public:
+public:
     explicit Scan(std::string_view document) : _in(document) {
         _out.reserve(document.size() + document.size() / 8);
     }
 
     std::string run();
 
-  private:
+private:
     std::string_view _in;
     std::size_t _at = 0;
     std::string _out;
@@ -98,7 +98,8 @@ bool Scan::_copyEndTag() {
         return false;
     }
     std::size_t const end = _nameEnd(_at + 2);
-    if (end >= _in.size() || _in[end] != '>' || !isElementName(_in.substr(_at + 2, end - _at - 2))) {
+    if (end >= _in.size() || _in[end] != '>' ||
+        !isElementName(_in.substr(_at + 2, end - _at - 2))) {
         return false;
     }
     _out.append(_in.substr(_at, end + 1 - _at));
@@ -149,9 +150,9 @@ void Scan::_copyNameLine() {
 }
 
 bool Scan::_copyAttribute(std::string_view element) {
-    std::size_t const nameStart = std::find_if_not(_in.begin() + static_cast<std::ptrdiff_t>(_at),
-                                                   _in.end(), isBlank) -
-                                  _in.begin();
+    std::size_t const nameStart =
+        std::find_if_not(_in.begin() + static_cast<std::ptrdiff_t>(_at), _in.end(), isBlank) -
+        _in.begin();
     std::size_t const nameEnd = _nameEnd(nameStart);
     if (nameEnd == nameStart || _in.substr(nameEnd, 2) != "=\"") {
         return false;
@@ -240,11 +241,20 @@ std::size_t Scan::_valueEnd() const {
 void Scan::_escape(std::size_t end) {
     for (; _at < end; ++_at) {
         switch (_in[_at]) {
-        case '&': _out.append("&amp;"); break;
-        case '<': _out.append("&lt;"); break;
-        case '>': _out.append("&gt;"); break;
-        case '"': _out.append("&quot;"); break;
-        default: _out += _in[_at];
+        case '&':
+            _out.append("&amp;");
+            break;
+        case '<':
+            _out.append("&lt;");
+            break;
+        case '>':
+            _out.append("&gt;");
+            break;
+        case '"':
+            _out.append("&quot;");
+            break;
+        default:
+            _out += _in[_at];
         }
     }
 }
