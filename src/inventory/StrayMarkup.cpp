@@ -30,6 +30,23 @@ bool isBlank(char c) {
     return c == ' ' || c == '\t' || c == '\n' || c == '\r';
 }
 
+bool isEscaped(char c) {
+    return c == '&' || c == '<' || c == '>' || c == '"';
+}
+
+std::string_view escapeOf(char special) {
+    switch (special) {
+    case '&':
+        return "&amp;";
+    case '<':
+        return "&lt;";
+    case '>':
+        return "&gt;";
+    default:
+        return "&quot;";
+    }
+}
+
 bool isElementName(std::string_view name) {
     return std::find(gc_ElementNames.begin(), gc_ElementNames.end(), name) != gc_ElementNames.end();
 }
@@ -67,10 +84,10 @@ private:
 std::string Scan::run() {
     _copyDeclaration();
     while (_at < _in.size()) {
-        if (_in[_at] == '<' && (_copyEndTag() || _copyStartTag())) {
-            continue;
+        _escape(std::min(_in.find('<', _at), _in.size()));
+        if (_at < _in.size() && !_copyEndTag() && !_copyStartTag()) {
+            _escape(_at + 1);
         }
-        _escape(_at + 1);
     }
     return std::move(_out);
 }
@@ -238,23 +255,19 @@ std::size_t Scan::_valueEnd() const {
     return _in.size();
 }
 
+// Runs of plain bytes are copied whole: most of a document is plain.
 void Scan::_escape(std::size_t end) {
-    for (; _at < end; ++_at) {
-        switch (_in[_at]) {
-        case '&':
-            _out.append("&amp;");
-            break;
-        case '<':
-            _out.append("&lt;");
-            break;
-        case '>':
-            _out.append("&gt;");
-            break;
-        case '"':
-            _out.append("&quot;");
-            break;
-        default:
-            _out += _in[_at];
+    while (_at < end) {
+        std::size_t const special =
+            static_cast<std::size_t>(std::find_if(_in.begin() + static_cast<std::ptrdiff_t>(_at),
+                                                  _in.begin() + static_cast<std::ptrdiff_t>(end),
+                                                  [](char c) { return isEscaped(c); }) -
+                                     _in.begin());
+        _out.append(_in.substr(_at, special - _at));
+        _at = special;
+        if (_at < end) {
+            _out.append(escapeOf(_in[_at]));
+            ++_at;
         }
     }
 }
