@@ -258,11 +258,10 @@ std::size_t Scan::_valueEnd() const {
 // Runs of plain bytes are copied whole: most of a document is plain.
 void Scan::_escape(std::size_t end) {
     while (_at < end) {
-        std::size_t const special =
-            static_cast<std::size_t>(std::find_if(_in.begin() + static_cast<std::ptrdiff_t>(_at),
-                                                  _in.begin() + static_cast<std::ptrdiff_t>(end),
-                                                  [](char c) { return isEscaped(c); }) -
-                                     _in.begin());
+        std::size_t special = _at;
+        while (special < end && !isEscaped(_in[special])) {
+            ++special;
+        }
         _out.append(_in.substr(_at, special - _at));
         _at = special;
         if (_at < end) {
