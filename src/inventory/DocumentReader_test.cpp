@@ -249,6 +249,26 @@ TEST(InventoryDocumentReader, PropertyWithoutValueHasAnEmptyValue) {
     EXPECT_EQ("", componentNamed(reading, "aurora").valueOf("CL"));
 }
 
+// The writer writes one value per property: what looks like a second one is
+// the text of the first, which runs to the end tag before the property's.
+TEST(InventoryDocumentReader, ValueRunsToTheEndTagBeforeThePropertysEnd) {
+    DocumentReading const reading = readDocument(
+        "<com.zor.inventory>\n<Resource displayName=\"r\">\n<Property name=\"SN\">\n"
+        "<Value type=\"string\">ab</Value>\n<Value type=\"string\">cd</Value>\n</Property>\n"
+        "</Resource>\n</com.zor.inventory>");
+    EXPECT_FALSE(reading.isUnreadable()) << reading.unreadableText();
+    EXPECT_EQ("ab</Value>\n<Value type=\"string\">cd", componentNamed(reading, "r").valueOf("SN"));
+}
+
+TEST(InventoryDocumentReader, PropertyOutsideAnyResourceIsIgnored) {
+    DocumentReading const reading = readDocument(
+        "<com.zor.inventory>\n<Property name=\"VD\">\n<Value type=\"string\">x</Value>\n"
+        "</Property>\n</com.zor.inventory>");
+    EXPECT_FALSE(reading.isUnreadable()) << reading.unreadableText();
+    EXPECT_EQ(DocumentReading::Kind::Inventory, reading.kind);
+    EXPECT_TRUE(reading.components.empty());
+}
+
 TEST(InventoryDocumentReader, DuplicateLocationCodesAreNumberedInDocumentOrder) {
     Resource partition("twins", "1234-ABC-10ABCDE-2");
     partition.insert_Resource("Adapters", adapter("ent0", "A1", "U1-P1-C1"));
@@ -319,6 +339,11 @@ TEST(InventoryDocumentReader, DocumentCutInAValueDropsOnlyThatKeyword) {
     ASSERT_TRUE(reading.isUnreadable());
     EXPECT_EQ((std::vector<Keyword>{{"PN", "PartNumber of assembly", "01FT739", ""}}),
               componentNamed(reading, "ent0").keywords);
+}
+
+TEST(InventoryDocumentReader, DeclarationCutShortIsUnreadable) {
+    EXPECT_EQ("document unreadable at line 1: unclosed token",
+              readDocument("<?xml version=\"1.0\"").unreadableText());
 }
 
 TEST(InventoryDocumentReader, EmptyDocumentIsUnreadableAtLineOne) {

@@ -15,6 +15,6 @@ namespace inventory {
 // writer never escapes, so "&amp;" in a document stands for those five
 // characters. Line ends are neither added nor removed: a line of the result
 // is the same line of the document.
-std::string escapeStrayMarkup(std::string_view document);
+[[nodiscard]] std::string escapeStrayMarkup(std::string_view document);
 
 } // namespace inventory
