@@ -260,6 +260,16 @@ TEST(InventoryDocumentReader, ValueRunsToTheEndTagBeforeThePropertysEnd) {
     EXPECT_EQ("ab</Value>\n<Value type=\"string\">cd", componentNamed(reading, "r").valueOf("SN"));
 }
 
+TEST(InventoryDocumentReader, EmptyElementFormsRead) {
+    DocumentReading const reading =
+        readDocument("<com.zor.inventory>\n<Resource displayName=\"r\" uniqueId=\"u\"/>\n"
+                     "<Resource displayName=\"s\">\n<Property name=\"SN\">\n"
+                     "<Value type=\"string\"/>\n</Property>\n</Resource>\n</com.zor.inventory>");
+    EXPECT_FALSE(reading.isUnreadable()) << reading.unreadableText();
+    EXPECT_EQ((std::vector<std::string>{"u", "s"}), identities(reading));
+    EXPECT_EQ("", componentNamed(reading, "s").valueOf("SN"));
+}
+
 TEST(InventoryDocumentReader, PropertyOutsideAnyResourceIsIgnored) {
     DocumentReading const reading = readDocument(
         "<com.zor.inventory>\n<Property name=\"VD\">\n<Value type=\"string\">x</Value>\n"

@@ -68,7 +68,7 @@ private:
     std::string_view _displayName;
 
     std::size_t _nameEnd(std::size_t from) const;
-    bool _copyDeclaration();
+    void _copyDeclaration();
     bool _copyEndTag();
     bool _copyStartTag();
     bool _copyAttribute(std::string_view element);
@@ -100,14 +100,13 @@ std::size_t Scan::_nameEnd(std::size_t from) const {
 }
 
 // Only at the very start, where the writer puts it.
-bool Scan::_copyDeclaration() {
+void Scan::_copyDeclaration() {
     if (_in.substr(0, gc_Declaration.size()) != gc_Declaration) {
-        return false;
+        return;
     }
     std::size_t const end = _in.find(gc_DeclarationEnd);
     _at = end == gc_None ? _in.size() : end + gc_DeclarationEnd.size();
     _out.append(_in.substr(0, _at));
-    return true;
 }
 
 bool Scan::_copyEndTag() {
@@ -131,14 +130,19 @@ bool Scan::_copyStartTag() {
     std::size_t const end = _nameEnd(_at + 1);
     std::string_view const name = _in.substr(_at + 1, end - _at - 1);
     _displayName = {};
-    if (!isElementName(name) || (end < _in.size() && !isBlank(_in[end]) && _in[end] != '>')) {
+    if (!isElementName(name) ||
+        (end < _in.size() && !isBlank(_in[end]) && _in[end] != '>' && _in[end] != '/')) {
         return false;
     }
     _out.append(_in.substr(_at, end - _at));
     _at = end;
     while (_copyAttribute(name)) {
     }
-    if (_at < _in.size() && _in[_at] == '>') {
+    // The writer never writes the empty-element form; another writer may.
+    if (_in.substr(_at, 2) == "/>") {
+        _out.append("/>");
+        _at += 2;
+    } else if (_at < _in.size() && _in[_at] == '>') {
         _out += '>';
         ++_at;
         if (name == gc_ValueElement) {
@@ -202,8 +206,9 @@ std::size_t Scan::_attributeValueEnd(std::size_t from, std::string_view element)
         if (_isFollowedByAttribute(quote + 1)) {
             return quote;
         }
-        if (quote + 1 < _in.size() && _in[quote + 1] == '>') {
-            if (element == gc_ValueElement || _isLineTagEnd(quote + 1)) {
+        std::size_t const tagEnd = _in.substr(quote + 1, 2) == "/>" ? quote + 2 : quote + 1;
+        if (tagEnd < _in.size() && _in[tagEnd] == '>') {
+            if (element == gc_ValueElement || _isLineTagEnd(tagEnd)) {
                 return quote;
             }
             anyTagEnd = std::min(anyTagEnd, quote);
