@@ -125,8 +125,10 @@ bool ExpatReading::_parse(std::string const& escaped) {
 }
 
 void ExpatReading::start(std::string_view name, XML_Char const** attributes) {
+    // Expat may still report the refused element's end: it is kept open.
     if (_open.empty() && name != gc_RootElement) {
         _refuseRoot(name);
+        _open.push_back(Element::Other);
         return;
     }
     Element const element = elementOf(name);

@@ -373,6 +373,12 @@ TEST(InventoryDocumentReader, OtherXmlDocumentIsNotAnInventoryDocument) {
               reading.unreadableText());
 }
 
+TEST(InventoryDocumentReader, OtherXmlDocumentOfOneEmptyElementIsNotAnInventoryDocument) {
+    EXPECT_EQ("document unreadable at line 1: not an inventory document: its root element is "
+              "<Resource>",
+              readDocument("<Resource/>").unreadableText());
+}
+
 TEST(InventoryDocumentReader, BytesThatAreNotUtf8StopTheReadingAtTheirLine) {
     std::string const document = inventoryDocument("aurora", "Zeph \xff");
     DocumentReading const reading = readDocument(document);
