@@ -209,14 +209,21 @@ void SurveyRun::_drawProgress() {
     if (_output.isAllWritten() || !_progress.isDue(Clock::now())) {
         return;
     }
-    _progress.draw(formatProgress(_progressFigures()), Clock::now());
+    _progress.draw(formatProgress(_progressFigures(), _progress.columns()), Clock::now());
 }
 
-ProgressFigures SurveyRun::_progressFigures() const {
-    ProgressFigures figures;
-    figures.machinesDone = _output.writtenCount();
+// The name a person knows a partition by; its identity when it has none.
+std::string SurveyRun::_shownName(Scheduler::Unit const& unit) const {
+    Quorvex::System::Partition const& partition = _record(unit).partition;
+    return partition.get_HostName().empty() ? std::string(partition) : partition.get_HostName();
+}
+
+void SurveyRun::_countMachines(ProgressFigures& figures) const {
     figures.machines = _machines.size();
-    for (auto const& machine : _machines) {
+    for (std::size_t index = 0; index < _machines.size(); ++index) {
+        MachineRecord const& machine = _machines[index];
+        figures.listingsPending += machine.listed ? 0 : 1;
+        figures.machinesDone += _scheduler.isMachineDone(index) ? 1 : 0;
         figures.partitions += machine.partitions.size();
         for (auto const& record : machine.partitions) {
             if (record.outcome) {
@@ -225,19 +232,27 @@ ProgressFigures SurveyRun::_progressFigures() const {
             }
         }
     }
+}
+
+ProgressFigures SurveyRun::_progressFigures() const {
+    ProgressFigures figures;
+    _countMachines(figures);
+    RunningSurveys surveys;
+    surveys.timeoutSeconds = _options.timeoutSeconds;
     for (auto const& running : _inFlight) {
         if (!running || !running->unit.partition) {
             continue;
         }
         ++figures.running;
         double const seconds = secondsSince(running->started);
+        surveys.seconds.push_back(seconds);
         if (seconds >= figures.longestSeconds) {
             figures.longestSeconds = seconds;
-            figures.longestName = std::string(_record(running->unit).partition);
+            figures.longestName = _shownName(running->unit);
         }
     }
     figures.elapsedSeconds = secondsSince(_start);
-    figures.leftSeconds = estimateLeft(figures);
+    figures.leftSeconds = estimateLeft(figures, surveys);
     return figures;
 }
 

@@ -61,6 +61,8 @@ private:
     void _recordStop(InFlight& running, WorkerEvent const& event);
     void _drawProgress();
     ProgressFigures _progressFigures() const;
+    void _countMachines(ProgressFigures& figures) const;
+    std::string _shownName(Scheduler::Unit const& unit) const;
     PartitionRecord& _record(Scheduler::Unit const& unit);
     PartitionRecord const& _record(Scheduler::Unit const& unit) const;
 
