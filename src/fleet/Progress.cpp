@@ -25,13 +25,33 @@ std::string partitionsField(ProgressFigures const& figures) {
     // While a machine is still being listed, more partitions may come.
     std::string const total =
         std::to_string(figures.partitions) + (figures.listingsPending > 0 ? "+" : "");
-    return std::to_string(figures.surveyed + figures.failed) + "/" + total +
+    return std::to_string(figures.endedWithoutFailure + figures.failed) + "/" + total +
            " partitions done, " + std::to_string(figures.failed) + " failed, " +
            std::to_string(figures.running) + " running";
 }
 
-std::string leftField(std::optional<double> const& left) {
-    return left ? "~" + clockText(*left) + " left" : std::string("time left unknown");
+// "40 s", "7 min" or "2 h 5 min": a time left is read at a glance, and
+// an estimate has no precision to show. Rounded up when it is a limit.
+std::string durationText(double seconds, bool roundUp) {
+    auto const whole = [roundUp](double value) {
+        return static_cast<long>(roundUp ? std::ceil(value) : std::round(value));
+    };
+    if (seconds < 100) {
+        return std::to_string(whole(seconds)) + " s";
+    }
+    long const minutes = whole(seconds / 60);
+    if (minutes < 100) {
+        return std::to_string(minutes) + " min";
+    }
+    return std::to_string(minutes / 60) + " h " + std::to_string(minutes % 60) + " min";
+}
+
+std::string leftField(std::optional<TimeLeft> const& left) {
+    if (!left) {
+        return "time left unknown";
+    }
+    return (left->isTimeLimit ? "up to " : "~") + durationText(left->seconds, left->isTimeLimit) +
+           " left";
 }
 
 std::string longestField(ProgressFigures const& figures) {
@@ -46,7 +66,7 @@ std::array<std::string, FieldCount> fieldsOf(ProgressFigures const& figures) {
     return {partitionsField(figures),
             std::to_string(figures.machinesDone) + "/" + std::to_string(figures.machines) +
                 " machines done",
-            clockText(figures.elapsedSeconds) + " elapsed", leftField(figures.leftSeconds),
+            clockText(figures.elapsedSeconds) + " elapsed", leftField(figures.left),
             longestField(figures)};
 }
 
@@ -76,16 +96,21 @@ std::string clockText(double seconds) {
     return text;
 }
 
-std::optional<double> estimateLeft(ProgressFigures const& figures, RunningSurveys const& running) {
-    std::size_t const finished = figures.surveyed + figures.failed;
+std::optional<TimeLeft> estimateLeft(ProgressFigures const& figures,
+                                     RunningSurveys const& running) {
+    std::size_t const finished = figures.endedWithoutFailure + figures.failed;
     if (figures.listingsPending > 0 || finished == 0 || figures.partitions < finished) {
         return std::nullopt;
     }
-    double left = figures.elapsedSeconds / static_cast<double>(finished) *
-                  static_cast<double>(figures.partitions - finished);
+    TimeLeft left;
+    left.seconds = figures.elapsedSeconds / static_cast<double>(finished) *
+                   static_cast<double>(figures.partitions - finished);
     if (running.timeoutSeconds > 0) {
         for (double const seconds : running.seconds) {
-            left = std::max(left, worstLeft(seconds, running.timeoutSeconds));
+            double const worst = worstLeft(seconds, running.timeoutSeconds);
+            if (worst > left.seconds) {
+                left = TimeLeft{worst, true};
+            }
         }
     }
     return left;

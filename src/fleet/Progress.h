@@ -7,6 +7,14 @@
 
 namespace fleet {
 
+// The estimate of the time left.
+struct TimeLeft {
+    double seconds = 0;
+    // The time a running partition may still take under the time limit,
+    // longer than the pace so far foretells: "up to" it, not "about".
+    bool isTimeLimit = false;
+};
+
 // The figures of the live progress line and the text made of them; the
 // line on the terminal is ProgressLine's.
 struct ProgressFigures {
@@ -15,14 +23,15 @@ struct ProgressFigures {
     std::size_t machines = 0;
     // Machines not listed yet: their partitions are still to be counted.
     std::size_t listingsPending = 0;
-    std::size_t surveyed = 0;
+    // Partitions ended: surveyed or inactive, or failed (report::isFailure).
+    std::size_t endedWithoutFailure = 0;
     std::size_t failed = 0;
     std::size_t running = 0;
     // Partitions listed so far.
     std::size_t partitions = 0;
     double elapsedSeconds = 0;
-    // The estimate of the time left; nullopt while there is none.
-    std::optional<double> leftSeconds;
+    // nullopt while there is no estimate.
+    std::optional<TimeLeft> left;
     // The partition that has been running longest, by host name, and for
     // how long.
     std::string longestName;
@@ -50,7 +59,8 @@ std::string formatProgress(ProgressFigures const& figures, std::size_t columns =
 // partition may still take under the time limit (with no limit, the pace
 // alone). nullopt while a listing is
 // pending (the count of partitions is not known) or before one finished.
-std::optional<double> estimateLeft(ProgressFigures const& figures, RunningSurveys const& running);
+std::optional<TimeLeft> estimateLeft(ProgressFigures const& figures,
+                                     RunningSurveys const& running);
 // "HH:MM:SS"
 std::string clockText(double seconds);
 // The line cut to fit a terminal of this many columns, one column left free:

@@ -25,10 +25,6 @@ std::size_t tablePlace(report::Outcome outcome) {
     return static_cast<std::size_t>(row - table.begin());
 }
 
-bool isFailure(report::Outcome outcome) {
-    return outcome != report::Outcome::Surveyed && outcome != report::Outcome::Inactive;
-}
-
 // The console's own words in a failed action's reason ("[RetStr1] = timeout").
 std::string consoleMessage(std::string const& reason) {
     static std::regex const line(R"((?:^|\n)\[RetStr1\] = ([^\n]+))");
@@ -120,7 +116,7 @@ void Recap::_count(PartitionRecord const& record) {
     // A partition still unsettled at the end was cut short by the run's end.
     report::Outcome const outcome = record.outcome.value_or(report::Outcome::Interrupted);
     ++_outcomeCounts[tablePlace(outcome)];
-    if (isFailure(outcome)) {
+    if (report::isFailure(outcome)) {
         _addFailure(report::textOf(outcome).label, reasonOf(record), shownName(record.partition));
     }
     if (record.seconds) {

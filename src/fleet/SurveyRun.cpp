@@ -227,8 +227,7 @@ void SurveyRun::_countMachines(ProgressFigures& figures) const {
         figures.partitions += machine.partitions.size();
         for (auto const& record : machine.partitions) {
             if (record.outcome) {
-                ++(record.result.returnCode == report::gc_SurveyedCode ? figures.surveyed
-                                                                       : figures.failed);
+                ++(report::isFailure(*record.outcome) ? figures.failed : figures.endedWithoutFailure);
             }
         }
     }
@@ -252,7 +251,7 @@ ProgressFigures SurveyRun::_progressFigures() const {
         }
     }
     figures.elapsedSeconds = secondsSince(_start);
-    figures.leftSeconds = estimateLeft(figures, surveys);
+    figures.left = estimateLeft(figures, surveys);
     return figures;
 }
 
