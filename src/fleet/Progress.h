@@ -59,8 +59,7 @@ std::string formatProgress(ProgressFigures const& figures, std::size_t columns =
 // partition may still take under the time limit (with no limit, the pace
 // alone). nullopt while a listing is
 // pending (the count of partitions is not known) or before one finished.
-std::optional<TimeLeft> estimateLeft(ProgressFigures const& figures,
-                                     RunningSurveys const& running);
+std::optional<TimeLeft> estimateLeft(ProgressFigures const& figures, RunningSurveys const& running);
 // "HH:MM:SS"
 std::string clockText(double seconds);
 // The line cut to fit a terminal of this many columns, one column left free:

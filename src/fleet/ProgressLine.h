@@ -40,7 +40,6 @@ public:
     std::size_t columns() const;
 
 private:
-
     bool _enabled;
     std::ostream& _out;
     int _descriptor;

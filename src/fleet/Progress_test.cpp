@@ -87,10 +87,10 @@ TEST(Progress, TimeLimitEstimateSaysUpTo) {
 TEST(Progress, TimeLeftIsInSecondsMinutesOrHours) {
     ProgressFigures figures;
     std::vector<std::pair<fleet::TimeLeft, std::string>> const cases = {
-        {{99.4, false}, "~99 s left"},         {{99.4, true}, "up to 100 s left"},
-        {{100, false}, "~2 min left"},         {{3580, true}, "up to 60 min left"},
-        {{5939, false}, "~99 min left"},      {{5999, false}, "~1 h 40 min left"},     {{7500, false}, "~2 h 5 min left"},
-        {{0, true}, "up to 0 s left"}};
+        {{99.4, false}, "~99 s left"},      {{99.4, true}, "up to 100 s left"},
+        {{100, false}, "~2 min left"},      {{3580, true}, "up to 60 min left"},
+        {{5939, false}, "~99 min left"},    {{5999, false}, "~1 h 40 min left"},
+        {{7500, false}, "~2 h 5 min left"}, {{0, true}, "up to 0 s left"}};
     for (auto const& [left, text] : cases) {
         figures.left = left;
         std::string const line = fleet::formatProgress(figures);

@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <cmath>
 #include <regex>
+#include <string_view>
 
 namespace fleet {
 
@@ -16,6 +17,7 @@ namespace {
 constexpr std::size_t gc_ColumnsWhenUnknown = 80;
 constexpr std::size_t gc_LongestShown = 3;
 constexpr char gc_Indent[] = "  ";
+constexpr std::string_view gc_ListSeparator = ", ";
 
 std::size_t tablePlace(report::Outcome outcome) {
     auto const& table = report::outcomeTable();
@@ -81,10 +83,10 @@ std::string listFitting(std::string const& prefix, std::vector<std::string> cons
         std::size_t const restAfter = items.size() - shown - 1;
         std::string const more =
             restAfter == 0 ? "" : " and " + std::to_string(restAfter) + " more";
-        if ((line + ", " + items[shown] + more).size() >= columns) {
+        if (line.size() + gc_ListSeparator.size() + items[shown].size() + more.size() >= columns) {
             break;
         }
-        line += ", " + items[shown];
+        line.append(gc_ListSeparator).append(items[shown]);
     }
     if (shown < items.size()) {
         line += " and " + std::to_string(items.size() - shown) + " more";
@@ -105,10 +107,9 @@ Recap::Recap(std::vector<MachineRecord> const& machines)
                      [](FailureGroup const& one, FailureGroup const& other) {
                          return one.names.size() > other.names.size();
                      });
-    std::stable_sort(_durations.begin(), _durations.end(),
-                     [](Duration const& one, Duration const& other) {
-                         return one.seconds > other.seconds;
-                     });
+    std::stable_sort(
+        _durations.begin(), _durations.end(),
+        [](Duration const& one, Duration const& other) { return one.seconds > other.seconds; });
 }
 
 void Recap::_count(PartitionRecord const& record) {

@@ -21,8 +21,8 @@ struct RecapEnding {
 // The few lines a person reads at the end of a run: the partitions counted
 // per outcome (every row of report::outcomeTable() that occurs, in its
 // order), the failures grouped by outcome and reason with a count and the
-// first host names (partitions without one by their identity), the longest-running partitions, where the summary and
-// the report are, and whether a signal interrupted the run. Made from the
+// first host names (partitions without one by their identity), the longest-running partitions,
+// where the summary and the report are, and whether a signal interrupted the run. Made from the
 // run's records alone, so that an outcome added to the table shows here as
 // it is.
 class Recap {
@@ -47,8 +47,7 @@ private:
     };
 
     void _count(PartitionRecord const& record);
-    void _addFailure(std::string const& label, std::string const& reason,
-                     std::string const& name);
+    void _addFailure(std::string const& label, std::string const& reason, std::string const& name);
     std::string _headline(RecapEnding const& ending) const;
     std::string _totalsLine() const;
     std::string _failureLines(std::size_t columns) const;

@@ -51,14 +51,15 @@ MachineRecord machine(std::string const& identity, std::vector<PartitionRecord> 
 // Two machines: five surveyed, one inactive, two timed out, one channel
 // failure and one client failure.
 std::vector<MachineRecord> mixedRun() {
-    return {machine("9119-MHE_21ABCDE",
-                    {partition("host1", Outcome::Surveyed, 2.5), timedOut("host2", 30.2),
-                     partition("host3", Outcome::Surveyed, 3), partition("", Outcome::Inactive, 0.1),
-                     failed("host5", Outcome::ChannelFailure, gc_ClientRunFailure)}),
-            machine("8286-42A_10FGHIJ",
-                    {partition("db1", Outcome::Surveyed, 4), timedOut("db2", 30.1),
-                     failed("db3", Outcome::ClientFailure, gc_ClientFailure),
-                     partition("db4", Outcome::Surveyed, 1), partition("db5", Outcome::Surveyed, 1)})};
+    return {
+        machine("9119-MHE_21ABCDE",
+                {partition("host1", Outcome::Surveyed, 2.5), timedOut("host2", 30.2),
+                 partition("host3", Outcome::Surveyed, 3), partition("", Outcome::Inactive, 0.1),
+                 failed("host5", Outcome::ChannelFailure, gc_ClientRunFailure)}),
+        machine("8286-42A_10FGHIJ",
+                {partition("db1", Outcome::Surveyed, 4), timedOut("db2", 30.1),
+                 failed("db3", Outcome::ClientFailure, gc_ClientFailure),
+                 partition("db4", Outcome::Surveyed, 1), partition("db5", Outcome::Surveyed, 1)})};
 }
 
 RecapEnding endingAfter(double seconds) {
@@ -143,9 +144,10 @@ TEST(Recap, HostListIsCutShortToTheWidthWithHowManyMore) {
 
 TEST(Recap, WiderTerminalShowsEveryHostThatFits) {
     std::string const text = Recap(twelveFailing()).text(endingAfter(5), 200);
-    EXPECT_NE(text.find("\n      lpar10, lpar11, lpar12, lpar13, lpar14, lpar15, lpar16, lpar17, lpar18, "
-                        "lpar19, lpar20, lpar21\n"),
-              std::string::npos)
+    EXPECT_NE(
+        text.find("\n      lpar10, lpar11, lpar12, lpar13, lpar14, lpar15, lpar16, lpar17, lpar18, "
+                  "lpar19, lpar20, lpar21\n"),
+        std::string::npos)
         << text;
 }
 
@@ -173,12 +175,12 @@ TEST(Recap, PathsAreKeptWholeOnANarrowTerminal) {
 
 TEST(Recap, LargerGroupsComeFirstAndEqualOnesInRunOrder) {
     std::vector<MachineRecord> run = {
-        machine("9119-MHE_21ABCDE",
-                {failed("a1", Outcome::ClientFailure, gc_ClientFailure),
-                 failed("a2", Outcome::ChannelFailure, gc_ClientRunFailure),
-                 failed("a3", Outcome::ChannelFailure, gc_ClientRunFailure),
-                 failed("a4", Outcome::FetchFailure, "Unable to get File From Partition : \n"
-                                                      "\n[     Rc] = 2\n")})};
+        machine("9119-MHE_21ABCDE", {failed("a1", Outcome::ClientFailure, gc_ClientFailure),
+                                     failed("a2", Outcome::ChannelFailure, gc_ClientRunFailure),
+                                     failed("a3", Outcome::ChannelFailure, gc_ClientRunFailure),
+                                     failed("a4", Outcome::FetchFailure,
+                                            "Unable to get File From Partition : \n"
+                                            "\n[     Rc] = 2\n")})};
     std::string const text = Recap(run).text(endingAfter(1), 200);
     EXPECT_NE(text.find("  failed, by reason:\n"
                         "    2 channel failure: runCmdOnPartition failed, Rc 1, RcCmd 0: timeout\n"

@@ -227,7 +227,8 @@ void SurveyRun::_countMachines(ProgressFigures& figures) const {
         figures.partitions += machine.partitions.size();
         for (auto const& record : machine.partitions) {
             if (record.outcome) {
-                ++(report::isFailure(*record.outcome) ? figures.failed : figures.endedWithoutFailure);
+                ++(report::isFailure(*record.outcome) ? figures.failed
+                                                      : figures.endedWithoutFailure);
             }
         }
     }

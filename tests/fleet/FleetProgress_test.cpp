@@ -145,9 +145,9 @@ TEST(FleetProgress, LineIsDrawnAgainBelowTheCodeAfterTheFirstMachinesBlock) {
     std::string const& bytes = terminal.stdoutText;
     std::size_t const firstCode = bytes.find("ReturnCode: \r\n0");
     ASSERT_NE(firstCode, std::string::npos) << bytes;
-    EXPECT_NE(bytes.find("\n\r1/2 partitions done, 0 failed, 1 running  1/2 machines done  ",
-                         firstCode),
-              std::string::npos)
+    EXPECT_NE(
+        bytes.find("\n\r1/2 partitions done, 0 failed, 1 running  1/2 machines done  ", firstCode),
+        std::string::npos)
         << "no progress line below the first machine's code: " << bytes;
     EXPECT_NE(bytes.find("\033[K\033[A\033[2G", firstCode), std::string::npos) << bytes;
 
@@ -214,12 +214,11 @@ std::string hangingConsole() {
         scenario += std::to_string(id) + ",10.1.1.1" + std::to_string(id) + ",3,host" +
                     std::to_string(id) + ",Zeph,7.2;";
     }
-    return scenario +
-           "\n[runCmdOnPartition 3]\nchild-delay 3600\ndelay 3600\n"
-           "[runCmdOnPartition *]\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
-           "delay 0.3\n"
-           "[getFileFromPartition *]\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
-           "document-nolf <fetched/>\n";
+    return scenario + "\n[runCmdOnPartition 3]\nchild-delay 3600\ndelay 3600\n"
+                      "[runCmdOnPartition *]\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
+                      "delay 0.3\n"
+                      "[getFileFromPartition *]\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
+                      "document-nolf <fetched/>\n";
 }
 
 std::string hangingSurvey(std::size_t columns) {
@@ -234,7 +233,7 @@ std::vector<std::string> drawnLines(std::string const& bytes) {
     std::regex const start("\r\033\\[K|\n\r");
     for (std::sregex_iterator match(bytes.begin(), bytes.end(), start), end; match != end;
          ++match) {
-        std::size_t const from = static_cast<std::size_t>(match->position() + match->length());
+        auto const from = static_cast<std::size_t>(match->position() + match->length());
         std::string const line = bytes.substr(from, bytes.find_first_of("\r\n\033", from) - from);
         if (!line.empty()) {
             lines.push_back(line);
@@ -287,16 +286,16 @@ TEST_P(FleetOnTerminal, RecapFollowsTheLastBlockOnRowsOfItsOwn) {
     std::vector<std::string> const last(rows.end() - 8, rows.end());
     EXPECT_EQ(last[0], "quorvexPYLON_VPD_Survey_ClientPartition ReturnCode:");
     EXPECT_EQ(last[1], "4") << "the recap does not start on a row of its own";
-    EXPECT_TRUE(std::regex_match(last[2],
-                                 std::regex("quorvex-survey: 5 partitions of 1 machine in "
-                                            "00:00:0[0-9]")))
+    EXPECT_TRUE(std::regex_match(last[2], std::regex("quorvex-survey: 5 partitions of 1 machine in "
+                                                     "00:00:0[0-9]")))
         << last[2];
     EXPECT_EQ(last[3], "  4 surveyed, 1 timed out");
     EXPECT_EQ(last[4], "  failed, by reason:");
     EXPECT_EQ(last[5], "    1 timed out: runCmdOnPartition stopped by the time limit");
     EXPECT_EQ(last[6], "      host3");
-    EXPECT_TRUE(std::regex_match(last[7], std::regex("  longest: host3 [4-9] s, host[1245] [0-9]+ s, "
-                                                     "host[1245] [0-9]+ s")))
+    EXPECT_TRUE(
+        std::regex_match(last[7], std::regex("  longest: host3 [4-9] s, host[1245] [0-9]+ s, "
+                                             "host[1245] [0-9]+ s")))
         << last[7];
 }
 
@@ -309,8 +308,8 @@ TEST_P(FleetOnTerminal, CtrlCGivesARecapThatSaysInterruptedBySigint) {
     QuorvexTest::clearFolder(QuorvexTest::gc_TraceFolder);
     std::string const typing = "(until grep -q 'PartitionId::3::' '" + console.logPath() +
                                "'; do sleep 0.1; done; sleep 0.5; printf '\\003'; sleep 0.2)";
-    std::string const survey = "stty cols " + std::to_string(columns) + "; exec " +
-                               surveyCommand({"-j", "2", "-t", "0"});
+    std::string const survey =
+        "stty cols " + std::to_string(columns) + "; exec " + surveyCommand({"-j", "2", "-t", "0"});
     CommandResult const terminal =
         QuorvexTest::runShell(typing + " | script -qfec " + quoted({survey}) + " /dev/null");
     EXPECT_EQ(terminal.exitStatus, 130) << terminal.stderrText;
@@ -322,7 +321,8 @@ TEST_P(FleetOnTerminal, CtrlCGivesARecapThatSaysInterruptedBySigint) {
     });
     ASSERT_NE(headline, rows.end()) << terminal.stdoutText;
     ASSERT_NE(headline + 1, rows.end());
-    EXPECT_TRUE(std::regex_match(*(headline + 1), std::regex("  interrupted by SIGINT after [0-9] s")))
+    EXPECT_TRUE(
+        std::regex_match(*(headline + 1), std::regex("  interrupted by SIGINT after [0-9] s")))
         << *(headline + 1);
     // A quick partition may have been in flight beside the hang.
     std::regex const stopped(
@@ -347,7 +347,8 @@ TEST(FleetProgress, RecapGoesToStandardErrorWhenAskedFor) {
     CommandResult const run = QuorvexTest::runShell(surveyCommand({"-j", "2", "--recap"}));
     EXPECT_EQ(run.exitStatus, 4);
     std::string const& text = run.stderrText;
-    std::size_t const recap = text.find("ReturnCode: \n4\nquorvex-survey: 6 partitions of 1 machine");
+    std::size_t const recap =
+        text.find("ReturnCode: \n4\nquorvex-survey: 6 partitions of 1 machine");
     EXPECT_NE(recap, std::string::npos) << text;
     EXPECT_NE(text.find("\n  5 surveyed, 1 channel failure\n"), std::string::npos) << text;
     EXPECT_EQ(text.find('\033'), std::string::npos) << text;
