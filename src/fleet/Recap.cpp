@@ -1,5 +1,6 @@
 #include "fleet/Recap.h"
 
+#include "fleet/PartitionName.h"
 #include "fleet/Progress.h"
 #include "report/FailureReason.h"
 #include "report/ReportCommand.h"
@@ -62,11 +63,6 @@ std::string reasonOf(PartitionRecord const& record) {
         return result.reason.substr(0, result.reason.find('\n'));
     }
     return result.statusText;
-}
-
-// The name a person knows a partition by; its identity when it has none.
-std::string shownName(Quorvex::System::Partition const& partition) {
-    return partition.get_HostName().empty() ? std::string(partition) : partition.get_HostName();
 }
 
 std::string wholeSeconds(double seconds) {

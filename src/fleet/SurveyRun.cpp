@@ -1,6 +1,7 @@
 #include "fleet/SurveyRun.h"
 
 #include "fleet/MachineReport.h"
+#include "fleet/PartitionName.h"
 #include "fleet/RunFiles.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/WorkUnits.h"
@@ -212,12 +213,6 @@ void SurveyRun::_drawProgress() {
     _progress.draw(formatProgress(_progressFigures(), _progress.columns()), Clock::now());
 }
 
-// The name a person knows a partition by; its identity when it has none.
-std::string SurveyRun::_shownName(Scheduler::Unit const& unit) const {
-    Quorvex::System::Partition const& partition = _record(unit).partition;
-    return partition.get_HostName().empty() ? std::string(partition) : partition.get_HostName();
-}
-
 void SurveyRun::_countMachines(ProgressFigures& figures) const {
     figures.machines = _machines.size();
     for (std::size_t index = 0; index < _machines.size(); ++index) {
@@ -248,7 +243,7 @@ ProgressFigures SurveyRun::_progressFigures() const {
         surveys.seconds.push_back(seconds);
         if (seconds >= figures.longestSeconds) {
             figures.longestSeconds = seconds;
-            figures.longestName = _shownName(running->unit);
+            figures.longestName = shownName(_record(running->unit).partition);
         }
     }
     figures.elapsedSeconds = secondsSince(_start);

@@ -62,7 +62,6 @@ private:
     void _drawProgress();
     ProgressFigures _progressFigures() const;
     void _countMachines(ProgressFigures& figures) const;
-    std::string _shownName(Scheduler::Unit const& unit) const;
     PartitionRecord& _record(Scheduler::Unit const& unit);
     PartitionRecord const& _record(Scheduler::Unit const& unit) const;
 
