@@ -17,6 +17,9 @@ struct Options {
     // --report DIR: the run's report is written there.
     std::string reportFolder;
     bool quiet = false;
+    // --recap (true) or --no-recap (false); nullopt: a recap when standard
+    // error is a terminal and the run is not quiet.
+    std::optional<bool> recap;
     bool all = false;
     // As given, an identity given more than once kept at its first place.
     std::vector<std::string> identities;

@@ -1,6 +1,7 @@
 #include "fleet/SurveyRun.h"
 
 #include "fleet/MachineReport.h"
+#include "fleet/PartitionName.h"
 #include "fleet/RunFiles.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/WorkUnits.h"
@@ -209,35 +210,44 @@ void SurveyRun::_drawProgress() {
     if (_output.isAllWritten() || !_progress.isDue(Clock::now())) {
         return;
     }
-    _progress.draw(formatProgress(_progressFigures()), Clock::now());
+    _progress.draw(formatProgress(_progressFigures(), _progress.columns()), Clock::now());
+}
+
+void SurveyRun::_countMachines(ProgressFigures& figures) const {
+    figures.machines = _machines.size();
+    for (std::size_t index = 0; index < _machines.size(); ++index) {
+        MachineRecord const& machine = _machines[index];
+        figures.listingsPending += machine.listed ? 0 : 1;
+        figures.machinesDone += _scheduler.isMachineDone(index) ? 1 : 0;
+        figures.partitions += machine.partitions.size();
+        for (auto const& record : machine.partitions) {
+            if (record.outcome) {
+                ++(report::isFailure(*record.outcome) ? figures.failed
+                                                      : figures.endedWithoutFailure);
+            }
+        }
+    }
 }
 
 ProgressFigures SurveyRun::_progressFigures() const {
     ProgressFigures figures;
-    figures.machinesDone = _output.writtenCount();
-    figures.machines = _machines.size();
-    for (auto const& machine : _machines) {
-        figures.partitions += machine.partitions.size();
-        for (auto const& record : machine.partitions) {
-            if (record.outcome) {
-                ++(record.result.returnCode == report::gc_SurveyedCode ? figures.surveyed
-                                                                       : figures.failed);
-            }
-        }
-    }
+    _countMachines(figures);
+    RunningSurveys surveys;
+    surveys.timeoutSeconds = _options.timeoutSeconds;
     for (auto const& running : _inFlight) {
         if (!running || !running->unit.partition) {
             continue;
         }
         ++figures.running;
         double const seconds = secondsSince(running->started);
+        surveys.seconds.push_back(seconds);
         if (seconds >= figures.longestSeconds) {
             figures.longestSeconds = seconds;
-            figures.longestName = std::string(_record(running->unit).partition);
+            figures.longestName = shownName(_record(running->unit).partition);
         }
     }
     figures.elapsedSeconds = secondsSince(_start);
-    figures.leftSeconds = estimateLeft(figures);
+    figures.left = estimateLeft(figures, surveys);
     return figures;
 }
 

@@ -61,6 +61,7 @@ private:
     void _recordStop(InFlight& running, WorkerEvent const& event);
     void _drawProgress();
     ProgressFigures _progressFigures() const;
+    void _countMachines(ProgressFigures& figures) const;
     PartitionRecord& _record(Scheduler::Unit const& unit);
     PartitionRecord const& _record(Scheduler::Unit const& unit) const;
 

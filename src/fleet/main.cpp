@@ -1,7 +1,9 @@
 #include "fleet/CommandLine.h"
+#include "fleet/Recap.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
+#include "fleet/TerminalWidth.h"
 #include "fleet/TimeLimits.h"
 #include "fleet/WorkUnits.h"
 #include "fleet/WorkerPool.h"
@@ -11,6 +13,8 @@
 #include "utility/LocalTime.h"
 #include "utility/SystemError.h"
 #include "utility/Trace.h"
+
+#include <unistd.h>
 
 #include <chrono>
 #include <ctime>
@@ -76,16 +80,34 @@ void writeRunFiles(fleet::Options const& options, fleet::SurveyRun const& run, i
     }
 }
 
-// Diagnostics after the machines' blocks, each on a line of its own,
-// though the last block ends with its code digit and no line end.
-void printAfterBlocks(fleet::SurveyRun const& run, std::string const& messages) {
-    if (messages.empty()) {
+// The recap of the run, when one is wanted: by default only for a person at
+// a terminal, so that scripts read the blocks alone.
+std::string recapText(fleet::Options const& options, fleet::SurveyRun const& run,
+                      std::chrono::steady_clock::time_point startedAt) {
+    if (!options.recap.value_or(!options.quiet && isatty(STDERR_FILENO) == 1)) {
+        return "";
+    }
+    fleet::RecapEnding ending;
+    ending.elapsedSeconds =
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - startedAt).count();
+    if (run.interruptingSignal() != 0) {
+        ending.interruptedBy = fleet::signalName(run.interruptingSignal());
+    }
+    ending.summaryFile = options.summaryFile;
+    ending.reportFolder = options.reportFolder;
+    return fleet::Recap(run.machines()).text(ending, fleet::terminalColumns(STDERR_FILENO));
+}
+
+// Diagnostics and the recap after the machines' blocks, on lines of their
+// own, though the last block ends with its code digit and no line end.
+void printAfterBlocks(fleet::SurveyRun const& run, std::string const& text) {
+    if (text.empty()) {
         return;
     }
     if (run.endsOnOpenRow()) {
         std::cerr << "\n";
     }
-    std::cerr << messages << std::flush;
+    std::cerr << text << std::flush;
 }
 
 } // namespace
@@ -117,6 +139,6 @@ int main(int argc, char** argv) {
     if (!options.summaryFile.empty() || !options.reportFolder.empty()) {
         writeRunFiles(options, run, exitStatus, started, startedAt, messages);
     }
-    printAfterBlocks(run, messages.str());
+    printAfterBlocks(run, messages.str() + recapText(options, run, startedAt));
     return exitStatus;
 }

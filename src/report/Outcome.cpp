@@ -42,6 +42,10 @@ std::optional<Outcome> outcomeNamed(std::string const& name) {
     return found->outcome;
 }
 
+bool isFailure(Outcome outcome) {
+    return outcome != Outcome::Surveyed && outcome != Outcome::Inactive;
+}
+
 Outcome outcomeOf(Kind kind) {
     switch (kind) {
     case Kind::Surveyed:

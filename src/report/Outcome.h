@@ -43,6 +43,9 @@ OutcomeText const& textOf(Outcome outcome);
 char const* outcomeName(Outcome outcome);
 // The outcome of a summary name; nullopt for a name the table lacks.
 std::optional<Outcome> outcomeNamed(std::string const& name);
+// Whether a partition that ended so failed: every outcome but surveyed and
+// inactive (a partition that is not running is no failure of the run).
+bool isFailure(Outcome outcome);
 // The outcome of a survey that ran to its end.
 Outcome outcomeOf(Quorvex::PYLON::VPD::PartitionOutcomeKind kind);
 

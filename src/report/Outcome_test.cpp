@@ -44,3 +44,10 @@ TEST(Outcome, SurveyKindsMapToTheirOutcomes) {
     EXPECT_EQ(report::outcomeOf(Kind::ClientFailure), Outcome::ClientFailure);
     EXPECT_EQ(report::outcomeOf(Kind::FetchFailure), Outcome::FetchFailure);
 }
+
+TEST(Outcome, EveryOutcomeButSurveyedAndInactiveIsAFailure) {
+    for (auto const& row : report::outcomeTable()) {
+        bool const isFine = row.outcome == Outcome::Surveyed || row.outcome == Outcome::Inactive;
+        EXPECT_EQ(report::isFailure(row.outcome), !isFine) << row.name;
+    }
+}
