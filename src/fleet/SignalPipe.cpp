@@ -11,6 +11,8 @@ namespace fleet {
 
 namespace {
 
+constexpr int gc_HandledSignals[] = {SIGINT, SIGTERM, SIGHUP, SIGPIPE};
+
 int gs_ReadEnd = -1;
 int gs_WriteEnd = -1;
 int gs_FirstSignal = 0;
@@ -41,10 +43,22 @@ std::optional<std::string> installSignalPipe() {
     action.sa_handler = &handleSignal;
     sigemptyset(&action.sa_mask);
     action.sa_flags = SA_RESTART;
-    if (sigaction(SIGINT, &action, nullptr) != 0 || sigaction(SIGTERM, &action, nullptr) != 0) {
-        return failure("cannot handle SIGINT and SIGTERM");
+    for (int const signalNumber : gc_HandledSignals) {
+        if (sigaction(signalNumber, &action, nullptr) != 0) {
+            return failure((std::string("cannot handle ") + signalName(signalNumber)).c_str());
+        }
     }
     return std::nullopt;
+}
+
+void holdSignals() {
+    sigset_t held;
+    sigemptyset(&held);
+    for (int const signalNumber : gc_HandledSignals) {
+        sigaddset(&held, signalNumber);
+    }
+    // Cannot fail with a valid set and operation.
+    sigprocmask(SIG_BLOCK, &held, nullptr);
 }
 
 int signalPipeDescriptor() {
@@ -62,7 +76,16 @@ int takeSignal() {
 }
 
 char const* signalName(int signalNumber) {
-    return signalNumber == SIGTERM ? "SIGTERM" : "SIGINT";
+    switch (signalNumber) {
+    case SIGTERM:
+        return "SIGTERM";
+    case SIGHUP:
+        return "SIGHUP";
+    case SIGPIPE:
+        return "SIGPIPE";
+    default:
+        return "SIGINT";
+    }
 }
 
 } // namespace fleet
