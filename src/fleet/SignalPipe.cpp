@@ -26,6 +26,15 @@ void handleSignal(int signalNumber) {
     errno = savedErrno;
 }
 
+sigset_t handledSignals() {
+    sigset_t set;
+    sigemptyset(&set);
+    for (int const signalNumber : gc_HandledSignals) {
+        sigaddset(&set, signalNumber);
+    }
+    return set;
+}
+
 std::string failure(char const* operation) {
     return std::string(operation) + ": " + std::strerror(errno);
 }
@@ -48,17 +57,15 @@ std::optional<std::string> installSignalPipe() {
             return failure((std::string("cannot handle ") + signalName(signalNumber)).c_str());
         }
     }
+    // A signal blocked by whoever started the run would never reach the pipe.
+    sigset_t const handled = handledSignals();
+    sigprocmask(SIG_UNBLOCK, &handled, nullptr);
     return std::nullopt;
 }
 
 void holdSignals() {
-    sigset_t held;
-    sigemptyset(&held);
-    for (int const signalNumber : gc_HandledSignals) {
-        sigaddset(&held, signalNumber);
-    }
-    // Cannot fail with a valid set and operation.
-    sigprocmask(SIG_BLOCK, &held, nullptr);
+    sigset_t const handled = handledSignals();
+    sigprocmask(SIG_BLOCK, &handled, nullptr);
 }
 
 int signalPipeDescriptor() {

@@ -64,6 +64,21 @@ INSTANTIATE_TEST_SUITE_P(SignalPipe, SignalThatStopsTheRun,
                              return std::string(fleet::signalName(info.param));
                          });
 
+TEST(SignalPipe, SignalBlockedByTheStarterStillArrives) {
+    QuorvexTest::CommandResult const result = QuorvexTest::runInChild([] {
+        sigset_t blocked;
+        sigemptyset(&blocked);
+        sigaddset(&blocked, SIGPIPE);
+        sigprocmask(SIG_BLOCK, &blocked, nullptr);
+        if (fleet::installSignalPipe()) {
+            return 1;
+        }
+        raise(SIGPIPE);
+        return fleet::takeSignal() == SIGPIPE ? 0 : 2;
+    });
+    EXPECT_EQ(result.exitStatus, 0) << "1: not installed; 2: the signal stayed blocked";
+}
+
 TEST(SignalPipe, SignalHeldAfterTheRunEndedChangesNothing) {
     QuorvexTest::CommandResult const result = QuorvexTest::runInChild([] {
         if (fleet::installSignalPipe()) {

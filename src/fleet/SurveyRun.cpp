@@ -98,8 +98,7 @@ int SurveyRun::exitStatus() const {
     if (signalNumber != 0) {
         return 128 + signalNumber;
     }
-    return _output.writeFailures().empty() ? std::atoi(overallCode().c_str())
-                                           : gc_ExitCannotCreate;
+    return _output.writeFailures().empty() ? std::atoi(overallCode().c_str()) : gc_ExitCannotCreate;
 }
 
 std::vector<std::string> const& SurveyRun::writeFailures() const {

@@ -62,7 +62,8 @@ TEST(WorkUnits, MissingCodesStayUnknown) {
 TEST(WorkUnits, OutcomeOfAChildThatDiedIsRejected) {
     EXPECT_FALSE(fleet::decodeOutcome("").has_value());
     EXPECT_FALSE(fleet::decodeOutcome(encodeFields({"a", "b"})).has_value());
-    EXPECT_FALSE(fleet::decodeOutcome(encodeFields({"", "8", "x", "9", "", "", "", "0"})).has_value());
+    EXPECT_FALSE(
+        fleet::decodeOutcome(encodeFields({"", "8", "x", "9", "", "", "", "0"})).has_value());
 }
 
 TEST(WorkUnits, MachineListIsOneRecordOfIdentities) {

@@ -1,3 +1,4 @@
+#include "fleet/ChildProcess.h"
 #include "fleet/CommandLine.h"
 #include "fleet/OutputFolders.h"
 #include "fleet/SignalPipe.h"
@@ -13,6 +14,8 @@
 #include "utility/SystemError.h"
 #include "utility/Trace.h"
 
+#include <poll.h>
+
 #include <chrono>
 #include <csignal>
 #include <ctime>
@@ -20,7 +23,7 @@
 
 namespace {
 
-// When the run started, and on which console, for its summary.
+// When the run started, and on which console, for its summary and report.
 struct RunClock {
     std::time_t started;
     std::chrono::steady_clock::time_point startedAt;
@@ -60,10 +63,10 @@ std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
     }
 }
 
-// The summary document of the run as it stands, with the exit status it
-// ends with so far.
-nlohmann::ordered_json summaryOf(fleet::Options const& options, fleet::SurveyRun const& run,
-                                 int exitStatus, RunClock const& clock) {
+// The summary of the run as it stands, with the exit status it ends with so
+// far.
+report::RunSummary summaryOf(fleet::Options const& options, fleet::SurveyRun const& run,
+                             RunClock const& clock) {
     fleet::RunFacts facts;
     facts.options = options;
     facts.consoleHost = clock.consoleHost;
@@ -74,8 +77,8 @@ nlohmann::ordered_json summaryOf(fleet::Options const& options, fleet::SurveyRun
     if (run.interruptingSignal() != 0) {
         facts.interruptedBy = fleet::signalName(run.interruptingSignal());
     }
-    facts.exitStatus = exitStatus;
-    return report::summaryDocument(fleet::runSummary(facts, run.machines()));
+    facts.exitStatus = run.exitStatus();
+    return fleet::runSummary(facts, run.machines());
 }
 
 // The report first, then the summary, so that the summary's exit status
@@ -84,17 +87,18 @@ nlohmann::ordered_json summaryOf(fleet::Options const& options, fleet::SurveyRun
 std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::SurveyRun const& run,
                                        RunClock const& clock) {
     std::vector<std::string> failures = run.writeFailures();
+    report::RunSummary summary = summaryOf(options, run, clock);
     if (!options.reportFolder.empty()) {
-        if (std::optional<std::string> const failure = report::writeRunReport(
-                summaryOf(options, run, run.exitStatus(), clock), options.reportFolder)) {
+        if (std::optional<std::string> const failure =
+                report::writeRunReport(report::summaryDocument(summary), options.reportFolder)) {
             failures.push_back(*failure);
         }
     }
-    int const exitStatus = finalExitStatus(run, failures);
+    summary.exitStatus = finalExitStatus(run, failures);
     try {
         if (!options.summaryFile.empty()) {
             util::writeFileAtomically(options.summaryFile,
-                                      report::summaryText(summaryOf(options, run, exitStatus, clock)));
+                                      report::summaryText(report::summaryDocument(summary)));
         }
     } catch (util::SystemError const& failure) {
         failures.emplace_back(failure.what());
@@ -102,15 +106,32 @@ std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::Sur
     return failures;
 }
 
+// The console's host name when the run writes a summary or report, asked in
+// a child process once every unit of work has ended: the host name command
+// runs through system(), which ignores SIGINT in its caller meanwhile, and a
+// signal then must still reach the run. Asked here when no child can be made.
+std::string consoleHostFor(fleet::Options const& options) {
+    if (options.summaryFile.empty() && options.reportFolder.empty()) {
+        return {};
+    }
+    fleet::ChildProcess child([] { return Utility::get_HostName(); });
+    if (!child.isStarted()) {
+        return Utility::get_HostName();
+    }
+    while (child.readAvailable()) {
+        pollfd result{child.resultDescriptor(), POLLIN, 0};
+        // A signal ends the wait early; it is noted once the name is known.
+        ::poll(&result, 1, -1);
+    }
+    return child.takeResult();
+}
+
 // Writes the run's last files. A signal that comes while they are written
 // makes them be written again saying so; once they are in place the
 // signals are held, and the run is finished.
 std::vector<std::string> finishRun(fleet::Options const& options, fleet::SurveyRun& run,
                                    RunClock clock) {
-    if (!options.summaryFile.empty() || !options.reportFolder.empty()) {
-        // Every unit of work has ended: the host name command may trace here.
-        clock.consoleHost = Utility::get_HostName();
-    }
+    clock.consoleHost = consoleHostFor(options);
     run.noteSignal();
     int const signalSeen = run.interruptingSignal();
     std::vector<std::string> failures = writeRunFiles(options, run, clock);
@@ -172,12 +193,12 @@ int main(int argc, char** argv) {
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;
     }
-    if (std::optional<std::string> const failure = fleet::installSignalPipe()) {
-        std::cerr << report::gc_ProgramName << ": " << *failure << std::endl;
-    }
     fleet::Options const& options = parsed.options;
     if (!areOutputsWritable(options)) {
         return fleet::gc_ExitCannotCreate;
+    }
+    if (std::optional<std::string> const failure = fleet::installSignalPipe()) {
+        std::cerr << report::gc_ProgramName << ": " << *failure << std::endl;
     }
     RunClock const clock{std::time(nullptr), std::chrono::steady_clock::now(), {}};
     std::vector<std::string> const identities =

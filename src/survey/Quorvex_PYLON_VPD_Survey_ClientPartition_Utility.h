@@ -29,9 +29,9 @@ void u_create_VPD_ResourceSet_forFailedPartition(Quorvex::System::Partition cons
 // write that failed, 0 otherwise; the survey tool itself says nothing about
 // it, quorvex-survey reports it (its callers read the result, the bytes and
 // the name of the file stay as they are).
-[[nodiscard]] int u_create_DefaultXML_forFailedPartition(Quorvex::System::Partition const& partition,
-                                            std::string const& reason,
-                                            std::string const& localFileName);
+[[nodiscard]] int
+u_create_DefaultXML_forFailedPartition(Quorvex::System::Partition const& partition,
+                                       std::string const& reason, std::string const& localFileName);
 
 // "\n", the return code's pairs one a line as "[key] = value" with the keys
 // right-aligned, then "\n" and a line end.

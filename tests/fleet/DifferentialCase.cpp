@@ -81,8 +81,8 @@ void DifferentialCase::expectRefusedUpFront(int jobs,
         return;
     }
     std::string const printed = QuorvexTest::readFile(_file(run, "stderr"));
-    EXPECT_TRUE(QuorvexTest::contains(stderrTexts, printed)) << name() << " " << run << ": "
-                                                             << printed;
+    EXPECT_TRUE(QuorvexTest::contains(stderrTexts, printed))
+        << name() << " " << run << ": " << printed;
     _expectEqual(run, "stdout", "", QuorvexTest::readFile(_file(run, "stdout")));
     _expectEqual(run, "exit status", "73\n", QuorvexTest::readFile(_file(run, "exit-status")));
     _expectEqual(run, "console command lines", "", QuorvexTest::readFile(_file(run, "calls")));

@@ -44,8 +44,8 @@ constexpr char gc_BlockEnd[] = "\nquorvexPYLON_VPD_Survey_ClientPartition Return
 std::string listing(std::string const& identity, int count, bool active, int first = 1) {
     std::string line = "[lspartition " + identity + "]\nstdout ";
     for (int id = first; id < first + count; ++id) {
-        line += std::to_string(id) + ",10.1.1." + std::to_string(id) + "," +
-                (active ? "3" : "1") + ",host" + std::to_string(id) + ",Zeph,7.2;";
+        line += std::to_string(id) + ",10.1.1." + std::to_string(id) + "," + (active ? "3" : "1") +
+                ",host" + std::to_string(id) + ",Zeph,7.2;";
     }
     return line + "\n";
 }
@@ -71,9 +71,7 @@ protected:
         return SurveyProcess(argv, _work.file("stdout"), _work.file("stderr"), fileSizeLimit);
     }
 
-    std::string _stderr() const {
-        return QuorvexTest::readFile(_work.file("stderr"));
-    }
+    std::string _stderr() const { return QuorvexTest::readFile(_work.file("stderr")); }
 
     // Refused before the first console command: nothing else printed or written.
     void _expectRefused(SurveyProcess& survey, SimulatedConsole const& console,
@@ -93,14 +91,16 @@ TEST_F(FleetOutputFiles, SummaryFolderThatCannotBeMadeEndsWith73BeforeAnyConsole
     SimulatedConsole const console("[lspartition *]\n" + std::string(gc_Hang));
     QuorvexTest::writeFile(_work.file("file"), "x");
     SurveyProcess survey = _start({"--summary", _work.file("file/runs/summary.json"), gc_Identity});
-    _expectRefused(survey, console, "cannot create " + _work.file("file/runs") + ": Not a directory");
+    _expectRefused(survey, console,
+                   "cannot create " + _work.file("file/runs") + ": Not a directory");
 }
 
 TEST_F(FleetOutputFiles, SummaryPathThatIsAFolderEndsWith73BeforeAnyConsoleCommand) {
     SimulatedConsole const console("[lspartition *]\n" + std::string(gc_Hang));
     std::filesystem::create_directories(_work.file("summary.json"));
     SurveyProcess survey = _start({"--summary", _work.file("summary.json"), gc_Identity});
-    _expectRefused(survey, console, "cannot write " + _work.file("summary.json") + ": Is a directory");
+    _expectRefused(survey, console,
+                   "cannot write " + _work.file("summary.json") + ": Is a directory");
 }
 
 TEST_F(FleetOutputFiles, ReportFolderThatIsAFileEndsWith73BeforeTheMachineListing) {
@@ -137,7 +137,8 @@ TEST_F(FleetOutputFiles, StatusFileAndSummaryThatCannotBeWrittenAreNamedAndEndWi
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_VPD_Folder), std::vector<std::string>{})
         << "a cut status file or its temporary file was left";
     EXPECT_TRUE(QuorvexTest::fileExists(gc_TraceFile));
-    EXPECT_EQ(QuorvexTest::listFolder(_work.path()), (std::vector<std::string>{"stderr", "stdout"}));
+    EXPECT_EQ(QuorvexTest::listFolder(_work.path()),
+              (std::vector<std::string>{"stderr", "stdout"}));
 }
 
 // A failed client run gets a default document, written by the survey code in
@@ -148,8 +149,9 @@ TEST_F(FleetOutputFiles, DefaultDocumentThatCannotBeWrittenIsNamedAndEndsWith73)
     std::string const summary = _work.file("summary.json");
     SurveyProcess survey = _start({"--summary", summary, gc_Identity}, 1200);
     EXPECT_EQ(survey.waitForExit(gc_Bound), 73) << _stderr();
-    std::string const document = "/var/adm/quorvex/VPD/"
-                                 "quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-1.VPD.xml";
+    std::string const document =
+        "/var/adm/quorvex/VPD/"
+        "quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-1.VPD.xml";
     EXPECT_EQ(_stderr(), std::string("8\n") + gc_BlockEnd + "8\nquorvex-survey: cannot write " +
                              document + ": File too large\nquorvex-survey: cannot write " +
                              summary + ": File too large\n");
@@ -218,8 +220,9 @@ TEST_F(FleetOutputFiles, ReaderGoneFromStandardOutputStopsTheRunWithSigpipe) {
     ASSERT_EQ(::pipe(ends), 0);
     ::close(ends[0]);
     std::string const summary = _work.file("summary.json");
-    SurveyProcess survey({FleetTest::consoleWideTool(), "--summary", summary, gc_Identity, gc_Second},
-                         "/proc/self/fd/" + std::to_string(ends[1]), _work.file("stderr"));
+    SurveyProcess survey(
+        {FleetTest::consoleWideTool(), "--summary", summary, gc_Identity, gc_Second},
+        "/proc/self/fd/" + std::to_string(ends[1]), _work.file("stderr"));
     ::close(ends[1]);
     EXPECT_EQ(survey.waitForExit(gc_Bound), 128 + SIGPIPE) << _stderr();
     EXPECT_EQ(_stderr(), std::string("0\n") + gc_BlockEnd + "08\n" + gc_BlockEnd +
