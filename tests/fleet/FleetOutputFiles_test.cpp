@@ -187,7 +187,8 @@ bool waitForOutput(int readEnd) {
 TEST_F(FleetOutputFiles, SignalWhileTheLastBlockIsWrittenEndsTheRunAsInterrupted) {
     SimulatedConsole const console(listing(gc_Identity, 80, true) + surveyedActions());
     int ends[2];
-    ASSERT_EQ(::pipe(ends), 0);
+    // Close-on-exec: the run must hold no reading end of its own output.
+    ASSERT_EQ(::pipe2(ends, O_CLOEXEC), 0);
     ASSERT_EQ(::fcntl(ends[1], F_SETPIPE_SZ, 4096), 4096);
     std::string const summary = _work.file("summary.json");
     SurveyProcess survey(
@@ -208,22 +209,44 @@ TEST_F(FleetOutputFiles, SignalWhileTheLastBlockIsWrittenEndsTheRunAsInterrupted
     EXPECT_TRUE(QuorvexTest::fileExists(gc_StatusFile));
 }
 
+// Waits until the console has received the client run of partition id.
+bool waitForClientRun(SimulatedConsole const& console, std::string const& id) {
+    double const until = FleetTest::monotonicSeconds() + gc_Bound;
+    while (FleetTest::monotonicSeconds() < until) {
+        if (console.logText().find("runCmdOnPartition::CallerID::0::CecMT::5678-DEF::CecMS::"
+                                   "20FGHIJ::PartitionId::" +
+                                   id + "::") != std::string::npos) {
+            return true;
+        }
+        std::this_thread::sleep_for(std::chrono::milliseconds(20));
+    }
+    return false;
+}
+
 // Standard output read by nobody any more (a reader such as "head -1" gone):
 // the first machine's block meets SIGPIPE, and the run stops as for SIGTERM,
-// the second machine's hung action included, and says why.
+// the second machine's hung action included, and says why. The pipe is full
+// until the hung action has started, so the block cannot get through before
+// the reader goes, whatever the timing.
 TEST_F(FleetOutputFiles, ReaderGoneFromStandardOutputStopsTheRunWithSigpipe) {
     SimulatedConsole const console(listing(gc_Identity, 1, true) + listing(gc_Second, 1, true, 2) +
                                    "[runCmdOnPartition 1]\n" + gc_Answer +
                                    "[getFileFromPartition *]\n" + gc_Answer +
                                    "document-nolf <fetched/>\n[runCmdOnPartition 2]\n" + gc_Hang);
     int ends[2];
-    ASSERT_EQ(::pipe(ends), 0);
-    ::close(ends[0]);
+    // Close-on-exec: the run must hold no reading end of its own output.
+    ASSERT_EQ(::pipe2(ends, O_CLOEXEC), 0);
+    ASSERT_EQ(::fcntl(ends[1], F_SETPIPE_SZ, 4096), 4096);
+    std::string const filling(4096, 'x');
+    ASSERT_EQ(::write(ends[1], filling.data(), filling.size()), 4096);
     std::string const summary = _work.file("summary.json");
     SurveyProcess survey(
         {FleetTest::consoleWideTool(), "--summary", summary, gc_Identity, gc_Second},
         "/proc/self/fd/" + std::to_string(ends[1]), _work.file("stderr"));
     ::close(ends[1]);
+    bool const started = waitForClientRun(console, "2");
+    ::close(ends[0]);
+    ASSERT_TRUE(started) << "the second machine's action never started";
     EXPECT_EQ(survey.waitForExit(gc_Bound), 128 + SIGPIPE) << _stderr();
     EXPECT_EQ(_stderr(), std::string("0\n") + gc_BlockEnd + "08\n" + gc_BlockEnd +
                              "8\nquorvex-survey: stopped by SIGPIPE\n");
