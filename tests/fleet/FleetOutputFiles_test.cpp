@@ -179,34 +179,62 @@ bool waitForOutput(int readEnd) {
     return false;
 }
 
-// Every partition has ended and the run prints its machine's block (5,751
-// bytes) into a pipe of 4,096 bytes that nobody reads until the signal is
-// sent: the signal comes while the results are written, whatever the timing.
-// It still ends the run as interrupted, with every outcome as the survey
-// left it.
-TEST_F(FleetOutputFiles, SignalWhileTheLastBlockIsWrittenEndsTheRunAsInterrupted) {
-    SimulatedConsole const console(listing(gc_Identity, 80, true) + surveyedActions());
+// Runs the survey of gc_Identity with a summary, its standard output a pipe
+// of 4,096 bytes that nobody reads until SIGTERM is sent; the exit status.
+// With 80 surveyed partitions the machine's block (5,751 bytes) cannot get
+// through before the signal: the signal comes once every partition has
+// ended, while the results are written, whatever the timing.
+int signalWhileTheBlockIsWritten(std::string const& summary, std::string const& stderrPath,
+                                 std::optional<rlim_t> fileSizeLimit = {}) {
     int ends[2];
     // Close-on-exec: the run must hold no reading end of its own output.
-    ASSERT_EQ(::pipe2(ends, O_CLOEXEC), 0);
-    ASSERT_EQ(::fcntl(ends[1], F_SETPIPE_SZ, 4096), 4096);
-    std::string const summary = _work.file("summary.json");
+    if (::pipe2(ends, O_CLOEXEC) != 0 || ::fcntl(ends[1], F_SETPIPE_SZ, 4096) != 4096) {
+        return -2;
+    }
     SurveyProcess survey(
         {FleetTest::consoleWideTool(), "-j", "8", "--summary", summary, gc_Identity},
-        "/proc/self/fd/" + std::to_string(ends[1]), _work.file("stderr"));
+        "/proc/self/fd/" + std::to_string(ends[1]), stderrPath, fileSizeLimit);
     ::close(ends[1]);
     bool const printing = waitForOutput(ends[0]);
     survey.signal(SIGTERM);
     drain(ends[0]);
     ::close(ends[0]);
-    ASSERT_TRUE(printing) << "the machine's block never came";
-    EXPECT_EQ(survey.waitForExit(gc_Bound), 143) << _stderr();
+    int const status = survey.waitForExit(gc_Bound);
+    return printing ? status : -3;
+}
+
+// The signal still ends the run as interrupted, with every outcome as the
+// survey left it.
+TEST_F(FleetOutputFiles, SignalWhileTheLastBlockIsWrittenEndsTheRunAsInterrupted) {
+    SimulatedConsole const console(listing(gc_Identity, 80, true) + surveyedActions());
+    std::string const summary = _work.file("summary.json");
+    EXPECT_EQ(signalWhileTheBlockIsWritten(summary, _work.file("stderr")), 143)
+        << "-2: no pipe; -3: the block never came\n"
+        << _stderr();
     FleetTest::SummaryFile const written(summary);
     EXPECT_EQ(written.validationProblems(), "");
     EXPECT_EQ(written.field("/interrupted"), "\"SIGTERM\"");
     EXPECT_EQ(written.field("/exit_status"), "143");
     EXPECT_EQ(written.outcomes(), std::vector<std::string>(80, "surveyed"));
     EXPECT_TRUE(QuorvexTest::fileExists(gc_StatusFile));
+}
+
+// A signal outweighs a file that could not be written (73), which is still
+// named. Under a limit of 8,000 bytes the listing (under 3,000 bytes) is read
+// whole, while the machine's trace (a block of commands per partition) and
+// the summary do not fit.
+TEST_F(FleetOutputFiles, SignalOutweighsAFileThatCannotBeWritten) {
+    SimulatedConsole const console(listing(gc_Identity, 80, true) + surveyedActions());
+    std::string const summary = _work.file("summary.json");
+    EXPECT_EQ(signalWhileTheBlockIsWritten(summary, _work.file("stderr"), 8000), 143)
+        << "-2: no pipe; -3: the block never came\n"
+        << _stderr();
+    std::string const printed = _stderr();
+    EXPECT_NE(printed.find("\nquorvex-survey: cannot write " + std::string(gc_TraceFile) +
+                           ": File too large\n"),
+              std::string::npos)
+        << printed;
+    EXPECT_FALSE(QuorvexTest::fileExists(summary)) << "the summary did not fit either";
 }
 
 // Waits until the console has received the client run of partition id.
