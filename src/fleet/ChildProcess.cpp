@@ -27,6 +27,7 @@ namespace {
 void restoreDefaultSignals() {
     std::signal(SIGINT, SIG_DFL);
     std::signal(SIGTERM, SIG_DFL);
+    std::signal(SIGHUP, SIG_DFL);
     std::signal(SIGPIPE, SIG_DFL);
 }
 

@@ -40,6 +40,9 @@ struct ParsedCommandLine {
 };
 
 constexpr int gc_ExitUsage = 64;
+// An output of the run (a result folder, the summary, the report, a
+// machine's file) cannot be written: sysexits.h's EX_CANTCREAT.
+constexpr int gc_ExitCannotCreate = 73;
 
 ParsedCommandLine parseCommandLine(int argc, char const* const* argv);
 

@@ -68,9 +68,9 @@ int SurveyRun::run() {
     _start = Clock::now();
     // A signal may have come while the machines were listed, and a run
     // without machines never enters the loop.
-    _takeSignal();
+    noteSignal();
     while (!_scheduler.isFinished()) {
-        _takeSignal();
+        noteSignal();
         for (auto const& unit : _scheduler.takeStartable()) {
             _startUnit(unit);
         }
@@ -78,7 +78,7 @@ int SurveyRun::run() {
             break;
         }
         std::vector<WorkerEvent> const ended = _pool.waitForEvents();
-        _takeSignal();
+        noteSignal();
         _handle(ended);
         _handle(_pool.stopDueActions(_limits));
         _output.writeReady(_scheduler);
@@ -89,11 +89,24 @@ int SurveyRun::run() {
     }
     _output.writeRest();
     _progress.erase();
-    int const signalNumber = _limits.interruptingSignal();
-    return signalNumber != 0 ? 128 + signalNumber : std::atoi(overallCode().c_str());
+    // A signal may have come while the last machines were written.
+    noteSignal();
+    return exitStatus();
 }
 
-void SurveyRun::_takeSignal() {
+int SurveyRun::exitStatus() const {
+    int const signalNumber = _limits.interruptingSignal();
+    if (signalNumber != 0) {
+        return 128 + signalNumber;
+    }
+    return _output.writeFailures().empty() ? std::atoi(overallCode().c_str()) : gc_ExitCannotCreate;
+}
+
+std::vector<std::string> const& SurveyRun::writeFailures() const {
+    return _output.writeFailures();
+}
+
+void SurveyRun::noteSignal() {
     int const signalNumber = takeSignal();
     if (signalNumber != 0 && !_limits.isInterrupted()) {
         _limits.interrupt(signalNumber);

@@ -23,7 +23,7 @@ using Quorvex::PYLON::VPD::PartitionOutcomeKind;
 constexpr unsigned int gc_ManagedMachineType = 0;
 constexpr char gc_MainLine[] = "PYLON_VPD_Survey_ClientPartition::main";
 constexpr std::size_t gc_PartitionFields = 6;
-constexpr std::size_t gc_OutcomeFields = 7;
+constexpr std::size_t gc_OutcomeFields = 8;
 
 std::string optionalText(std::optional<int> const& value) {
     return value ? std::to_string(*value) : std::string();
@@ -123,7 +123,8 @@ std::string surveyPartition(Quorvex::System::Partition const& partition,
     closeTrace();
     return encodeFields({outcome.fileName, outcome.returnCode, outcome.statusText,
                          std::to_string(static_cast<int>(outcome.kind)), optionalText(outcome.rc),
-                         optionalText(outcome.rcCmd), outcome.reason});
+                         optionalText(outcome.rcCmd), outcome.reason,
+                         std::to_string(outcome.documentError)});
 }
 
 std::optional<PartitionOutcome> decodeOutcome(std::string const& text) {
@@ -144,6 +145,7 @@ std::optional<PartitionOutcome> decodeOutcome(std::string const& text) {
     outcome.rc = optionalNumber(fields[4]);
     outcome.rcCmd = optionalNumber(fields[5]);
     outcome.reason = fields[6];
+    outcome.documentError = optionalNumber(fields[7]).value_or(0);
     return outcome;
 }
 

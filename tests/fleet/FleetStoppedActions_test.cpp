@@ -220,10 +220,24 @@ TEST(FleetTimeLimit, ZeroMeansNoLimit) {
 
 class FleetInterruption : public ::testing::TestWithParam<int> {};
 
+std::string signalNameOf(int signalNumber) {
+    switch (signalNumber) {
+    case SIGINT:
+        return "SIGINT";
+    case SIGHUP:
+        return "SIGHUP";
+    default:
+        return "SIGTERM";
+    }
+}
+
 // Partition 1 is surveyed at once; 2 and 3 hang in flight (-j 2); 4 never starts.
 TEST_P(FleetInterruption, StopsWhatIsInFlightAndMarksWhatDidNotFinish) {
     int const signalNumber = GetParam();
-    std::string const signalName = signalNumber == SIGINT ? "SIGINT" : "SIGTERM";
+    std::string const signalName = signalNameOf(signalNumber);
+    // A closed terminal is nobody's request: the run says why it stopped.
+    std::string const closing =
+        signalNumber == SIGHUP ? "\nquorvex-survey: stopped by SIGHUP\n" : "";
     clearResultFolders();
     SimulatedConsole const console(listing(4) + "[runCmdOnPartition 1]\n" + gc_Answer +
                                    "[runCmdOnPartition *]\n" + gc_Hang + fetchAnswer());
@@ -244,7 +258,7 @@ TEST_P(FleetInterruption, StopsWhatIsInFlightAndMarksWhatDidNotFinish) {
     EXPECT_EQ(QuorvexTest::readFile(work.file("stdout")),
               "VPD/" + document("1") + "\nVPD/" + document("2") + "\nVPD/" + document("3") + "\n");
     EXPECT_EQ(QuorvexTest::readFile(work.file("stderr")),
-              "0\n8\n8\n\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n4");
+              "0\n8\n8\n\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n4" + closing);
     EXPECT_EQ(
         QuorvexTest::listFolder(gc_VPD),
         (std::vector<std::string>{document("1"), document("2"), document("3"), gc_StatusFile}))
@@ -265,10 +279,9 @@ TEST_P(FleetInterruption, StopsWhatIsInFlightAndMarksWhatDidNotFinish) {
               (std::vector<std::string>{"surveyed", "interrupted", "interrupted", "interrupted"}));
 }
 
-INSTANTIATE_TEST_SUITE_P(Signals, FleetInterruption, ::testing::Values(SIGINT, SIGTERM),
+INSTANTIATE_TEST_SUITE_P(Signals, FleetInterruption, ::testing::Values(SIGINT, SIGTERM, SIGHUP),
                          [](::testing::TestParamInfo<int> const& info) {
-                             return info.param == SIGINT ? std::string("SIGINT")
-                                                         : std::string("SIGTERM");
+                             return signalNameOf(info.param);
                          });
 
 } // namespace
