@@ -1,4 +1,5 @@
 #include "fleet/CommandLine.h"
+#include "fleet/ProcessTree.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
@@ -11,6 +12,8 @@
 #include "utility/LocalTime.h"
 #include "utility/SystemError.h"
 #include "utility/Trace.h"
+
+#include <sys/prctl.h>
 
 #include <chrono>
 #include <ctime>
@@ -101,6 +104,8 @@ int main(int argc, char** argv) {
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;
     }
+    // What a dying worker leaves comes to this process, which ends it.
+    prctl(PR_SET_CHILD_SUBREAPER, 1);
     if (std::optional<std::string> const failure = fleet::installSignalPipe()) {
         std::cerr << report::gc_ProgramName << ": " << *failure << std::endl;
     }
@@ -118,5 +123,7 @@ int main(int argc, char** argv) {
         writeRunFiles(options, run, exitStatus, started, startedAt, messages);
     }
     printAfterBlocks(run, messages.str());
+    // Nothing the run started outlives it.
+    fleet::endChildrenExcept({});
     return exitStatus;
 }
