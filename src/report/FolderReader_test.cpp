@@ -78,7 +78,7 @@ TEST(FolderReader, RunWithEveryFailureKindGivesEachPartitionItsFacts) {
               R"("seconds":null})",
               partitions[3].dump());
     EXPECT_EQ(R"({"partitions":4,"surveyed":0,"inactive":1,"channel_failure":1,)"
-              R"("client_failure":1,"fetch_failure":1,"timed_out":0,"interrupted":0})",
+              R"("client_failure":1,"fetch_failure":1,"timed_out":0,"interrupted":0,"worker_died":0})",
               machine["counts"].dump());
 }
 
@@ -97,7 +97,7 @@ TEST(FolderReader, ShippedDemoRunIsReadWithSurveyedDocumentsMatched) {
     EXPECT_EQ("surveyed", partitions[6]["outcome"]);
     EXPECT_EQ("4", summary["return_code"]);
     EXPECT_EQ(R"({"machines":1,"partitions":7,"surveyed":3,"inactive":1,"channel_failure":1,)"
-              R"("client_failure":1,"fetch_failure":1,"timed_out":0,"interrupted":0})",
+              R"("client_failure":1,"fetch_failure":1,"timed_out":0,"interrupted":0,"worker_died":0})",
               summary["totals"].dump());
 }
 
