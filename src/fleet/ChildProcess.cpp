@@ -92,16 +92,15 @@ void ChildProcess::_runChild(Body const& body, int writeEnd, pid_t parent) {
     try {
         tieToParent(parent);
         keepDescriptorsFromActions();
-        delivered = util::writeAll(writeEnd, body());
+        std::string const result = body();
+        keepBrokenPipeFromEndingWorker();
+        delivered = util::writeAll(writeEnd, result);
     } catch (...) {
-        _exit(1);
+        delivered = false;
     }
     close(writeEnd);
-    // Adopted orphans of a stopped action are reaped before the child goes.
-    while (waitpid(-1, nullptr, WNOHANG) > 0) {
-    }
     // The parent reads a result cut short as it is; the status says so.
-    _exit(delivered ? 0 : 1);
+    endWorker(delivered ? 0 : 1);
 }
 
 ChildProcess::~ChildProcess() {
@@ -187,17 +186,21 @@ void ChildProcess::_settleReaped(std::optional<int> status) {
     _reaped = true;
     _stopped = false;
     _waitStatus = status;
-    _removeTemporaryFiles();
+    _removeTemporaryFiles(_slot);
 }
 
-// The child is gone: a file it recorded as made and not yet as removed is
-// its own (made exclusively, under a name no other process can have made
-// while it exists), and no process uses it any more.
-void ChildProcess::_removeTemporaryFiles() {
-    if (_slot == nullptr) {
+void ChildProcess::removeOwnTemporaryFiles() {
+    _removeTemporaryFiles(ms_ownSlot);
+}
+
+// The child is gone, or ends: a file it recorded as made and not yet as
+// removed is its own (made exclusively, under a name no other process can
+// have made while it exists), and no process uses it any more.
+void ChildProcess::_removeTemporaryFiles(Slot* slot) {
+    if (slot == nullptr) {
         return;
     }
-    for (FileEntry& entry : _slot->files) {
+    for (FileEntry& entry : slot->files) {
         if (entry.inUse.load() != 0) {
             unlink(entry.name);
             entry.inUse.store(0);
@@ -210,10 +213,18 @@ void ChildProcess::_removeTemporaryFiles() {
 // that is still the child's file. A killed child leaves a file behind only
 // when it dies between making the file and recording it, or between
 // freeing the entry and deleting the file.
+// A file made once the parent is gone is removed here, before any command
+// can use it; one made before is recorded in time for the thread that ends
+// the worker, which marks the parent gone before it removes what is recorded.
 void ChildProcess::_recordTemporaryFile(std::string const& name, bool made) {
+    _noteTemporaryFile(name, made);
     if (made && isParentGone()) {
+        unlink(name.c_str());
         waitForTheEnd();
     }
+}
+
+void ChildProcess::_noteTemporaryFile(std::string const& name, bool made) {
     if (ms_ownSlot == nullptr || name.size() >= sizeof(FileEntry::name)) {
         return;
     }

@@ -63,6 +63,9 @@ public:
     static std::string stopNote();
     // Leaves the line in the slot of this child (parent side).
     void setStopNote(std::string const& note);
+    // Removes the temporary files the calling child has recorded and not
+    // removed: the child ends without its parent to do it.
+    static void removeOwnTemporaryFiles();
 
     // The exit status of a child that ended because its parent was gone.
     static constexpr int ms_ParentGoneStatus = 125;
@@ -85,8 +88,9 @@ private:
     [[noreturn]] void _runChild(Body const& body, int writeEnd, pid_t parent);
     void _fail(char const* operation);
     static void _recordTemporaryFile(std::string const& name, bool made);
+    static void _noteTemporaryFile(std::string const& name, bool made);
+    static void _removeTemporaryFiles(Slot* slot);
     void _settleReaped(std::optional<int> status);
-    void _removeTemporaryFiles();
 
     pid_t _pid = -1;
     std::optional<std::string> _startFailure;

@@ -34,12 +34,14 @@ void onParentGone(int) {
     errno = savedErrno;
 }
 
+// The worker's other thread may run on meanwhile: it starts no new command
+// once the parent is marked gone, and it too ends the worker only after it
+// has killed everything below it.
 [[noreturn]] void endWithActions() {
     gs_ParentGone.store(true);
     killDescendants(getpid());
-    while (waitpid(-1, nullptr, WNOHANG) > 0) {
-    }
-    _exit(ChildProcess::ms_ParentGoneStatus);
+    ChildProcess::removeOwnTemporaryFiles();
+    endWorker(ChildProcess::ms_ParentGoneStatus);
 }
 
 void watchParentGone(int readEnd) {
@@ -76,6 +78,20 @@ void tieToParent(pid_t parent) {
 
 bool isParentGone() {
     return gs_ParentGone.load();
+}
+
+void keepBrokenPipeFromEndingWorker() {
+    sigset_t brokenPipe;
+    sigemptyset(&brokenPipe);
+    sigaddset(&brokenPipe, SIGPIPE);
+    pthread_sigmask(SIG_BLOCK, &brokenPipe, nullptr);
+}
+
+void endWorker(int status) {
+    killDescendants(getpid());
+    while (waitpid(-1, nullptr, WNOHANG) > 0) {
+    }
+    _exit(status);
 }
 
 void keepDescriptorsFromActions() {
