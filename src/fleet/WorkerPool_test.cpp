@@ -145,6 +145,23 @@ TEST(WorkerPool, InterruptionStopsAListingsActionAndTheWorkerGoesOn) {
     EXPECT_EQ(events.back().text.rfind("went on ", 0), 0U) << events.back().text;
 }
 
+// The action ends (exit 7) as soon as it sees its worker stopped: the pool
+// may freeze it before or after that. Either way one story: a stop is
+// reported exactly when the action was killed (SIGKILL, status 9), never
+// beside an action that ended on its own (status 7 << 8).
+TEST(WorkerPool, ActionEndingAsItsWorkerIsStoppedIsReportedStoppedOnlyWhenKilled) {
+    TimeLimits limits(0);
+    std::string const command =
+        "while read -r line < /proc/$PPID/stat; do set -- $line; [ \"$3\" = T ] && exit 7; done";
+    std::vector<WorkerEvent> const events = interruptWhileRunning(
+        UnitKind::PartitionListing, [command] { return std::to_string(std::system(command.c_str())); },
+        "while read", limits);
+    ASSERT_FALSE(events.empty());
+    ASSERT_EQ(events.back().kind, WorkerEvent::Kind::Ended);
+    bool const reportedStopped = events.front().kind == WorkerEvent::Kind::ActionStopped;
+    EXPECT_EQ(events.back().text, reportedStopped ? "9" : std::to_string(7 << 8));
+}
+
 TEST(WorkerPool, StoppedSurveyActionLeavesTheNoteOfItsAgeForTheWorker) {
     RemoteAction const action;
     std::string const command = action.command();
