@@ -11,8 +11,8 @@ extern "C" {
 #include <unistd.h>
 
 #include <algorithm>
-#include <cerrno>
 #include <array>
+#include <cerrno>
 #include <chrono>
 #include <csignal>
 #include <ctime>
@@ -177,8 +177,8 @@ bool signalChildOf(pid_t parent, pid_t pid, int signalNumber) {
     if (descriptor < 0) {
         return false;
     }
-    bool const sent = parentOf(pid) == parent &&
-                      pidfd_send_signal(descriptor, signalNumber, nullptr, 0) == 0;
+    bool const sent =
+        parentOf(pid) == parent && pidfd_send_signal(descriptor, signalNumber, nullptr, 0) == 0;
     close(descriptor);
     return sent;
 }
@@ -203,14 +203,19 @@ ChildStop stopChild(pid_t child) {
     }
 }
 
+// Frozen first, so that nothing forks meanwhile, then killed children
+// before parents: a parent killed first would leave its live children to a
+// subreaper above root, or to init, out of reach of the next round.
 std::size_t killDescendants(pid_t root) {
+    freezeDescendants(root);
     std::size_t signalsSent = 0;
     for (int round = 0; round < gc_KillRounds; ++round) {
         bool anyAlive = false;
-        for (Link const& link : linksBelow(root)) {
-            if (!hasEnded(link.pid)) {
+        std::vector<Link> const links = linksBelow(root);
+        for (auto link = links.rbegin(); link != links.rend(); ++link) {
+            if (!hasEnded(link->pid)) {
                 anyAlive = true;
-                signalsSent += signalChildOf(link.parent, link.pid, SIGKILL) ? 1 : 0;
+                signalsSent += signalChildOf(link->parent, link->pid, SIGKILL) ? 1 : 0;
             }
         }
         if (!anyAlive) {

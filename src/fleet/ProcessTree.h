@@ -49,9 +49,10 @@ struct ChildStop {
 // through a process descriptor: a PID read from /proc may belong to another
 // process by the time it is signalled, a descriptor cannot. True once sent.
 bool signalChildOf(pid_t parent, pid_t pid, int signalNumber);
-// Kills every descendant of root with SIGKILL, again and again until no
-// live one is left (a stopped root cannot start new ones). root itself is
-// left alone. Returns the number of kill signals sent.
+// Kills every descendant of root with SIGKILL: freezes the tree, then kills
+// children before their parents, again and again until no live one is left
+// (a stopped root cannot start new ones). root itself is left alone.
+// Returns the number of kill signals sent.
 std::size_t killDescendants(pid_t root);
 // Stops every descendant of root with SIGSTOP and waits until each is
 // stopped or has ended, round after round until none is left running (a

@@ -154,8 +154,8 @@ TEST(WorkerPool, ActionEndingAsItsWorkerIsStoppedIsReportedStoppedOnlyWhenKilled
     std::string const command =
         "while read -r line < /proc/$PPID/stat; do set -- $line; [ \"$3\" = T ] && exit 7; done";
     std::vector<WorkerEvent> const events = interruptWhileRunning(
-        UnitKind::PartitionListing, [command] { return std::to_string(std::system(command.c_str())); },
-        "while read", limits);
+        UnitKind::PartitionListing,
+        [command] { return std::to_string(std::system(command.c_str())); }, "while read", limits);
     ASSERT_FALSE(events.empty());
     ASSERT_EQ(events.back().kind, WorkerEvent::Kind::Ended);
     bool const reportedStopped = events.front().kind == WorkerEvent::Kind::ActionStopped;

@@ -327,7 +327,8 @@ TEST(FleetSupervision, KilledWorkerIsRecordedAsDiedAndLeavesNothingBehind) {
     EXPECT_TRUE(std::regex_search(died, reason)) << died;
     FleetTest::SummaryFile const summary(work.file("summary.json"));
     EXPECT_EQ(summary.validationProblems(), "");
-    EXPECT_EQ(summary.outcomes(), (std::vector<std::string>{"surveyed", "worker_died", "surveyed"}));
+    EXPECT_EQ(summary.outcomes(),
+              (std::vector<std::string>{"surveyed", "worker_died", "surveyed"}));
 }
 
 // The hung action and the helper it left hold only standard input, output

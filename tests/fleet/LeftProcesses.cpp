@@ -48,8 +48,8 @@ std::string commandLineOf(std::filesystem::path const& process) {
 
 std::vector<int> childrenOf(int pid) {
     std::vector<int> children;
-    std::string const path = "/proc/" + std::to_string(pid) + "/task/" + std::to_string(pid) +
-                             "/children";
+    std::string const path =
+        "/proc/" + std::to_string(pid) + "/task/" + std::to_string(pid) + "/children";
     std::istringstream list(readProcFile(path));
     int child = 0;
     while (list >> child) {
