@@ -92,9 +92,9 @@ void ChildProcess::_runChild(Body const& body, int writeEnd, pid_t parent) {
     try {
         tieToParent(parent);
         keepDescriptorsFromActions();
-        std::string const result = body();
+        std::string const text = body();
         keepBrokenPipeFromEndingWorker();
-        delivered = util::writeAll(writeEnd, result);
+        delivered = util::writeAll(writeEnd, text);
     } catch (...) {
         delivered = false;
     }

@@ -60,15 +60,14 @@ struct Link {
 };
 
 std::vector<Link> linksBelow(pid_t root) {
-    std::vector<Link> found;
-    for (pid_t child : childrenOf(root)) {
-        found.push_back({root, child});
-    }
+    std::vector<Link> found{{0, root}};
     for (std::size_t i = 0; i < found.size(); ++i) {
-        for (pid_t grandchild : childrenOf(found[i].pid)) {
-            found.push_back({found[i].pid, grandchild});
+        for (pid_t child : childrenOf(found[i].pid)) {
+            found.push_back({found[i].pid, child});
         }
     }
+    // The root itself is not below the root.
+    found.erase(found.begin());
     return found;
 }
 
@@ -133,10 +132,10 @@ std::vector<pid_t> childrenOf(pid_t pid) {
 }
 
 std::vector<pid_t> descendantsOf(pid_t pid) {
-    std::vector<pid_t> found;
-    for (Link const& link : linksBelow(pid)) {
-        found.push_back(link.pid);
-    }
+    std::vector<Link> const links = linksBelow(pid);
+    std::vector<pid_t> found(links.size());
+    std::transform(links.begin(), links.end(), found.begin(),
+                   [](Link const& link) { return link.pid; });
     return found;
 }
 

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <iterator>
 #include <sstream>
 #include <unistd.h>
 
@@ -62,9 +63,10 @@ std::vector<int> descriptorsOf(int pid) {
     std::vector<int> descriptors;
     std::error_code ignored;
     std::filesystem::path const folder = "/proc/" + std::to_string(pid) + "/fd";
-    for (auto const& entry : std::filesystem::directory_iterator(folder, ignored)) {
-        descriptors.push_back(std::stoi(entry.path().filename().string()));
-    }
+    std::filesystem::directory_iterator const entries(folder, ignored);
+    std::transform(std::filesystem::begin(entries), std::filesystem::end(entries),
+                   std::back_inserter(descriptors),
+                   [](auto const& entry) { return std::stoi(entry.path().filename().string()); });
     std::sort(descriptors.begin(), descriptors.end());
     return descriptors;
 }
