@@ -6,6 +6,7 @@
 
 #include <gtest/gtest.h>
 
+#include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -66,6 +67,11 @@ bool waitForCommand(std::string const& text) {
 
 // A remote action as the survey runs it: a command whose name is the
 // console's remote action tool (here a link to sleep).
+std::string sleepForever() {
+    pause();
+    return "woke";
+}
+
 class RemoteAction {
 public:
     RemoteAction() { symlink("/bin/sleep", _folder.file("runact-api").c_str()); }
@@ -93,6 +99,21 @@ TEST(WorkerPool, EndedWorkerIsReportedOnceWithItsTagAndResult) {
         EXPECT_EQ(event.text, "result of " + std::to_string(event.tag));
     }
     EXPECT_NE(ended[0].tag, ended[1].tag);
+}
+
+TEST(WorkerPool, KilledWorkerIsReportedEndedWithItsWaitStatusAndNoResult) {
+    WorkerPool pool(gc_NoWake);
+    ASSERT_EQ(pool.start(3, UnitKind::Survey, [] { return sleepForever(); }), std::nullopt);
+    std::vector<pid_t> const workers = fleet::childrenOf(getpid());
+    ASSERT_EQ(workers.size(), 1U);
+    ASSERT_EQ(kill(workers.front(), SIGKILL), 0);
+    std::vector<WorkerEvent> const events = waitFor(pool, WorkerEvent::Kind::Ended);
+    ASSERT_EQ(events.size(), 1U);
+    EXPECT_EQ(events[0].tag, 3U);
+    EXPECT_EQ(events[0].text, "");
+    ASSERT_TRUE(events[0].waitStatus.has_value());
+    EXPECT_TRUE(WIFSIGNALED(*events[0].waitStatus));
+    EXPECT_EQ(WTERMSIG(*events[0].waitStatus), SIGKILL);
 }
 
 TEST(WorkerPool, WorkerThatCannotStartIsNotKeptAndSaysWhy) {
