@@ -6,6 +6,7 @@
 #include "fleet/SignalPipe.h"
 #include "fleet/WorkUnits.h"
 #include "report/StatusText.h"
+#include "survey/Quorvex_PYLON_VPD_Survey_ClientPartition_Utility.h"
 #include "survey/calculate_ReturnCode.h"
 
 #include <unistd.h>
@@ -161,21 +162,21 @@ void SurveyRun::_notStarted(Scheduler::Unit const& unit, std::string const& fail
 void SurveyRun::_handle(std::vector<WorkerEvent> const& events) {
     for (auto const& event : events) {
         if (event.kind == WorkerEvent::Kind::Ended) {
-            _finish(event.tag, event.text);
+            _finish(event);
         } else {
             _recordStop(*_inFlight[event.tag], event);
         }
     }
 }
 
-void SurveyRun::_finish(std::size_t slot, std::string const& result) {
-    InFlight const running = *_inFlight[slot];
-    _inFlight[slot].reset();
-    _output.releaseSlot(slot);
+void SurveyRun::_finish(WorkerEvent const& ended) {
+    InFlight const running = *_inFlight[ended.tag];
+    _inFlight[ended.tag].reset();
+    _output.releaseSlot(ended.tag);
     if (running.unit.partition) {
-        _finishSurvey(running, result);
+        _finishSurvey(running, ended);
     } else {
-        _finishListing(running, result);
+        _finishListing(running, ended.text);
     }
 }
 
@@ -200,12 +201,25 @@ void SurveyRun::_finishListing(InFlight const& running, std::string const& resul
     _scheduler.setListed(running.unit.machine, ids);
 }
 
-void SurveyRun::_finishSurvey(InFlight const& running, std::string const& result) {
+void SurveyRun::_finishSurvey(InFlight const& running, WorkerEvent const& ended) {
     PartitionRecord& record = _record(running.unit);
     record.seconds = secondsSince(running.started);
     record.trace = takeTracePiece(_output.tracePiece(running.unit.machine, running.slot));
-    settlePartition(record, decodeOutcome(result).value_or(notStartedOutcome()));
+    if (std::optional<Quorvex::PYLON::VPD::PartitionOutcome> result = decodeOutcome(ended.text)) {
+        settlePartition(record, std::move(*result));
+    } else {
+        _settleWorkerDeath(record, ended);
+    }
     _scheduler.finish(running.unit);
+}
+
+// A worker that died left its actions to this process, which ends them
+// before it writes the partition's default document in their place.
+void SurveyRun::_settleWorkerDeath(PartitionRecord& record, WorkerEvent const& ended) {
+    _pool.endAdopted();
+    settlePartition(record, WorkerDeath{ended.waitStatus.value_or(0), record.seconds.value_or(0)});
+    Quorvex_PYLON_VPD_Survey_ClientPartition_Utility::u_create_DefaultXML_forFailedPartition(
+        record.partition, record.result.reason, record.result.fileName);
 }
 
 // The outcome itself is settled when the unit ends, from what its survey left.

@@ -64,9 +64,10 @@ private:
     void _startUnit(Scheduler::Unit const& unit);
     void _notStarted(Scheduler::Unit const& unit, std::string const& failure);
     void _handle(std::vector<WorkerEvent> const& events);
-    void _finish(std::size_t slot, std::string const& result);
+    void _finish(WorkerEvent const& ended);
     void _finishListing(InFlight const& running, std::string const& result);
-    void _finishSurvey(InFlight const& running, std::string const& result);
+    void _finishSurvey(InFlight const& running, WorkerEvent const& ended);
+    void _settleWorkerDeath(PartitionRecord& record, WorkerEvent const& ended);
     void _recordStop(InFlight& running, WorkerEvent const& event);
     void _drawProgress();
     ProgressFigures _progressFigures() const;

@@ -2,6 +2,7 @@
 
 #include "fleet/ChildProcess.h"
 #include "fleet/FieldCodec.h"
+#include "fleet/WorkerLife.h"
 #include "pylon/ListOf_Machines.h"
 #include "pylon/ListOf_Partitions.h"
 #include "pylon/Machine.h"
@@ -72,6 +73,7 @@ std::string listPartitions(std::string const& identity, std::string const& trace
     std::string encoded;
     {
         Utility::Trace trace(tracePiece);
+        keepDescriptorsFromActions();
         trace << gc_MainLine << std::endl;
         Quorvex::System::MTMS const mtms(identity);
         Quorvex::PYLON::ListOf_Partitions partitions;
@@ -117,6 +119,7 @@ std::string surveyPartition(Quorvex::System::Partition const& partition,
     PartitionOutcome outcome;
     {
         Utility::Trace trace(tracePiece);
+        keepDescriptorsFromActions();
         outcome = Quorvex::PYLON::VPD::Survey_ClientPartition::survey_Partition(
             partition, &ChildProcess::stopNote);
     }

@@ -1,10 +1,12 @@
 #include "fleet/ChildProcess.h"
 #include "fleet/CommandLine.h"
 #include "fleet/OutputFolders.h"
+#include "fleet/ProcessTree.h"
 #include "fleet/Recap.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
+#include "fleet/TerminalWidth.h"
 #include "fleet/TimeLimits.h"
 #include "fleet/WorkUnits.h"
 #include "fleet/WorkerPool.h"
@@ -16,6 +18,7 @@
 #include "utility/Trace.h"
 
 #include <poll.h>
+#include <sys/prctl.h>
 #include <unistd.h>
 
 #include <chrono>
@@ -218,6 +221,8 @@ int main(int argc, char** argv) {
     if (!areOutputsWritable(options)) {
         return fleet::gc_ExitCannotCreate;
     }
+    // What a dying worker leaves comes to this process, which ends it.
+    prctl(PR_SET_CHILD_SUBREAPER, 1);
     if (std::optional<std::string> const failure = fleet::installSignalPipe()) {
         std::cerr << report::gc_ProgramName << ": " << *failure << std::endl;
     }
@@ -227,6 +232,8 @@ int main(int argc, char** argv) {
     fleet::SurveyRun run(options, identities);
     run.run();
     std::vector<std::string> const failures = finishRun(options, run, clock);
+    // Nothing the run started outlives it.
+    fleet::endChildrenExcept({});
     printAfterBlocks(run, closingMessages(run, failures), recapText(options, run, clock));
     return finalExitStatus(run, failures);
 }

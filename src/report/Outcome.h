@@ -19,6 +19,7 @@ enum class Outcome {
     FetchFailure,
     TimedOut,
     Interrupted,
+    WorkerDied,
 };
 
 // One row of the outcome table.
@@ -33,7 +34,7 @@ struct OutcomeText {
     char const* pageClass;
 };
 
-constexpr std::size_t gc_OutcomeCount = 7;
+constexpr std::size_t gc_OutcomeCount = 8;
 
 // Every outcome once, in the order summaries count them and the report
 // shows them.

@@ -12,7 +12,7 @@ TEST(Outcome, TableListsEveryOutcomeInEnumeratorOrder) {
     for (std::size_t i = 0; i < table.size(); ++i) {
         EXPECT_EQ(static_cast<std::size_t>(table[i].outcome), i) << table[i].name;
     }
-    EXPECT_EQ(table.back().outcome, Outcome::Interrupted);
+    EXPECT_EQ(table.back().outcome, Outcome::WorkerDied);
 }
 
 TEST(Outcome, NamesLabelsAndPageClassesAreDistinct) {
