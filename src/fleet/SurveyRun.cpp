@@ -218,8 +218,9 @@ void SurveyRun::_finishSurvey(InFlight const& running, WorkerEvent const& ended)
 void SurveyRun::_settleWorkerDeath(PartitionRecord& record, WorkerEvent const& ended) {
     _pool.endAdopted();
     settlePartition(record, WorkerDeath{ended.waitStatus.value_or(0), record.seconds.value_or(0)});
-    Quorvex_PYLON_VPD_Survey_ClientPartition_Utility::u_create_DefaultXML_forFailedPartition(
-        record.partition, record.result.reason, record.result.fileName);
+    record.result.documentError =
+        Quorvex_PYLON_VPD_Survey_ClientPartition_Utility::u_create_DefaultXML_forFailedPartition(
+            record.partition, record.result.reason, record.result.fileName);
 }
 
 // The outcome itself is settled when the unit ends, from what its survey left.
