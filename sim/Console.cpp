@@ -11,6 +11,7 @@
 #include <iostream>
 #include <iterator>
 #include <optional>
+#include <sys/wait.h>
 #include <thread>
 #include <unistd.h>
 
@@ -61,6 +62,29 @@ void _leaveChild(std::optional<double> const& seconds) {
     if (::fork() == 0) {
         _wait(*seconds);
         ::_exit(0);
+    }
+}
+
+// A helper that a console action starts as a daemon: a child that starts a
+// session of its own and a grandchild in it, the child ending at once, so
+// that the helper is nobody's child and in no process group of the tool's.
+// It waits, prints nothing and ends.
+void _leaveDaemon(std::optional<double> const& seconds) {
+    if (!seconds) {
+        return;
+    }
+    std::cout.flush();
+    std::cerr.flush();
+    pid_t const child = ::fork();
+    if (child == 0) {
+        ::setsid();
+        if (::fork() == 0) {
+            _wait(*seconds);
+        }
+        ::_exit(0);
+    }
+    if (child > 0) {
+        ::waitpid(child, nullptr, 0);
     }
 }
 
@@ -129,6 +153,7 @@ int Console::_answerListing(std::string const& tool, std::vector<std::string> co
     std::string const name = tool == "lsvtc" ? "" : _identity(arguments);
     Response const response = scenario.find(tool, name);
     _leaveChild(response.childDelay);
+    _leaveDaemon(response.daemonDelay);
     _wait(response.delay.value_or(scenario.get_DefaultDelay()));
     return _print(response, "");
 }
@@ -145,6 +170,7 @@ int Console::_answerRemoteAction(std::vector<std::string> const& arguments) {
     }
     Response const response = scenario.find(request.get_Action(), request.get_PartitionID());
     _leaveChild(response.childDelay);
+    _leaveDaemon(response.daemonDelay);
     _wait(response.delay.value_or(scenario.get_DefaultDelay()));
     std::string const diagnostic =
         response.document ? _placeDocument(request, *response.document) : std::string();

@@ -9,6 +9,7 @@
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
+#include <sstream>
 #include <string>
 #include <unistd.h>
 
@@ -367,6 +368,24 @@ TEST(SimulatedConsole, ChildDelayLeavesAProcessRunningAfterTheAnswer) {
     ASSERT_FALSE(left.empty()) << "no process left behind by the tool";
     EXPECT_EQ(1, std::count(left.begin(), left.end(), '\n')) << "processes left: " << left;
     EXPECT_EQ(0, ::kill(std::stoi(left), SIGKILL));
+}
+
+TEST(SimulatedConsole, DaemonDelayLeavesAProcessInASessionOfItsOwn) {
+    SimulatedConsole console("[lsvtc]\nstdout 0:A_B;\ndaemon-delay 30\n");
+    std::string const commandLine =
+        std::string(gc_Lsvtc) + " -t0 left-daemon-" + std::to_string(::getpid());
+    CommandResult const found = runShell(commandLine + " > /dev/null; echo $?; pgrep -f -x '" +
+                                         commandLine + "' | xargs -r ps -o pid=,sid= -p");
+    std::size_t const statusEnd = found.stdoutText.find('\n');
+    ASSERT_NE(std::string::npos, statusEnd) << found.stderrText;
+    EXPECT_EQ("0", found.stdoutText.substr(0, statusEnd)) << "the tool's own exit status";
+    std::istringstream left(found.stdoutText.substr(statusEnd + 1));
+    pid_t pid = 0;
+    pid_t session = 0;
+    ASSERT_TRUE(left >> pid >> session) << "no daemon left behind: " << found.stdoutText;
+    EXPECT_NE(::getsid(0), session) << "the daemon is in a session of its own";
+    EXPECT_FALSE(left >> pid) << "one daemon only: " << found.stdoutText;
+    EXPECT_EQ(0, ::kill(pid, SIGKILL));
 }
 
 TEST(SimulatedConsole, MalformedScenarioIsRejectedNamingFileLineAndProblem) {

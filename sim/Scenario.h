@@ -18,6 +18,10 @@ struct Response {
     // Seconds a child process that the tool starts and leaves behind waits
     // before it ends; unset: no such child.
     std::optional<double> childDelay;
+    // Seconds a daemonised helper waits before it ends: started in a session
+    // of its own through a second fork, so that it is no child of the tool
+    // and survives the tool's process group; unset: no such helper.
+    std::optional<double> daemonDelay;
     // The client document that getFileFromPartition places; unset: none.
     std::optional<std::string> document;
 };

@@ -107,6 +107,10 @@ void ScenarioParser::_parseLine(std::string const& line) {
         _parseChildDelay(value);
         return;
     }
+    if (key == "daemon-delay") {
+        _parseDaemonDelay(value);
+        return;
+    }
     _parseText(key, value);
 }
 
@@ -161,7 +165,7 @@ void ScenarioParser::_parseExitCode(std::string const& value) {
     _response.exitCode = static_cast<int>(code);
 }
 
-// Seconds for "delay" or "child-delay": a number from 0 to 3600.
+// Seconds for "delay", "child-delay" or "daemon-delay": a number from 0 to 3600.
 double ScenarioParser::_parseSeconds(std::string const& key, std::string const& value) {
     _requireOnce(key);
     std::string const text = _trimmed(value);
@@ -192,6 +196,14 @@ void ScenarioParser::_parseChildDelay(std::string const& value) {
     _response.childDelay = seconds;
 }
 
+void ScenarioParser::_parseDaemonDelay(std::string const& value) {
+    double const seconds = _parseSeconds("daemon-delay", value);
+    if (_tool.empty()) {
+        _fail("\"daemon-delay\" must follow a section header");
+    }
+    _response.daemonDelay = seconds;
+}
+
 void ScenarioParser::_parseText(std::string const& key, std::string const& value) {
     std::size_t const dash = key.find('-');
     std::string const streamName = key.substr(0, dash);
@@ -203,8 +215,8 @@ void ScenarioParser::_parseText(std::string const& key, std::string const& value
         stream = Stream::Document;
     } else if (streamName != "stdout") {
         _fail("unknown key \"" + key +
-              "\" (expected stdout, stderr, document, their -nolf and -file forms, exit, delay or "
-              "child-delay)");
+              "\" (expected stdout, stderr, document, their -nolf and -file forms, exit, delay, "
+              "child-delay or daemon-delay)");
     }
     if (formName != "" && formName != "nolf" && formName != "file") {
         _fail("unknown key \"" + key + "\" (a text key ends in nothing, -nolf or -file)");

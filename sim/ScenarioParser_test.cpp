@@ -157,7 +157,7 @@ TEST_F(ScenarioFile, ErrorNamesFileLineAndProblem) {
     EXPECT_EQ(
         path() +
             ":3: unknown key \"stdot\" (expected stdout, stderr, document, their -nolf and -file "
-            "forms, exit, delay or child-delay)",
+            "forms, exit, delay, child-delay or daemon-delay)",
         error.describe());
 }
 
@@ -241,6 +241,25 @@ TEST_F(ScenarioFile, BadOrRepeatedChildDelayIsRejected) {
               errorOf("[lsvtc]\nchild-delay later\n").problem);
     EXPECT_EQ("\"child-delay\" is given twice in this section",
               errorOf("[lsvtc]\nchild-delay 1\nchild-delay 2\n").problem);
+}
+
+TEST_F(ScenarioFile, DaemonDelayIsReadPerSection) {
+    Scenario const scenario = load("[runCmdOnPartition 2]\ndaemon-delay 30\n[lsvtc]\n");
+    std::optional<double> const daemonDelay = scenario.find("runCmdOnPartition", "2").daemonDelay;
+    ASSERT_TRUE(daemonDelay);
+    EXPECT_EQ(30.0, *daemonDelay);
+    EXPECT_FALSE(scenario.find("lsvtc", "").daemonDelay);
+}
+
+TEST_F(ScenarioFile, DaemonDelayBeforeTheFirstSectionIsRejected) {
+    EXPECT_EQ("\"daemon-delay\" must follow a section header", errorOf("daemon-delay 1\n").problem);
+}
+
+TEST_F(ScenarioFile, BadOrRepeatedDaemonDelayIsRejected) {
+    EXPECT_EQ("daemon-delay must be a number of seconds from 0 to 3600, not \"later\"",
+              errorOf("[lsvtc]\ndaemon-delay later\n").problem);
+    EXPECT_EQ("\"daemon-delay\" is given twice in this section",
+              errorOf("[lsvtc]\ndaemon-delay 1\ndaemon-delay 2\n").problem);
 }
 
 TEST_F(ScenarioFile, DocumentOutsideGetFileSectionsIsRejected) {

@@ -187,7 +187,7 @@ TEST(Scripts, TestHelpIsNotHandedToCmake) {
 TEST(Scripts, TestRefusesAnUnknownPreset) {
     CommandResult const run = runCommand({QuorvexTest::sourceRoot() + "/tools/test", "release2"});
     EXPECT_EQ(2, run.exitStatus);
-    EXPECT_EQ("test: unknown preset 'release2' (dev, ci or asan)\n"
+    EXPECT_EQ("test: unknown preset 'release2' (dev, ci, asan or fault)\n"
               "test: try 'tools/test --help'\n",
               run.stderrText);
 }
