@@ -6,11 +6,14 @@
 
 #include <algorithm>
 #include <chrono>
+#include <csignal>
 #include <cstdlib>
 #include <fstream>
 #include <iostream>
 #include <iterator>
 #include <optional>
+#include <set>
+#include <sys/prctl.h>
 #include <sys/wait.h>
 #include <thread>
 #include <unistd.h>
@@ -88,6 +91,46 @@ void _leaveDaemon(std::optional<double> const& seconds) {
     }
 }
 
+// A chain of processes that keeps forking: each one starts the next and
+// ends, so that no single PID stays for a stopper to find. It ends by
+// itself after half a minute, so that a chain nobody stops does not run on.
+void _forkStorm() {
+    constexpr int c_Generations = 1500;
+    if (::fork() != 0) {
+        return;
+    }
+    for (int generation = 0; generation < c_Generations; ++generation) {
+        _wait(0.02);
+        if (::fork() != 0) {
+            ::_exit(0);
+        }
+    }
+    ::_exit(0);
+}
+
+// What a hung console action may do to resist being stopped.
+void _misbehave(std::set<std::string> const& misbehaviours) {
+    std::cout.flush();
+    std::cerr.flush();
+    if (misbehaviours.count("ignore-signals") != 0) {
+        std::signal(SIGINT, SIG_IGN);
+        std::signal(SIGTERM, SIG_IGN);
+        std::signal(SIGHUP, SIG_IGN);
+    }
+    if (misbehaviours.count("close-stdout") != 0) {
+        ::close(STDOUT_FILENO);
+    }
+    if (misbehaviours.count("rename") != 0) {
+        ::prctl(PR_SET_NAME, "renamed-action");
+    }
+    if (misbehaviours.count("fork-storm") != 0) {
+        _forkStorm();
+    }
+    if (misbehaviours.count("stop-self") != 0) {
+        ::raise(SIGSTOP);
+    }
+}
+
 int _print(Response const& response, std::string const& diagnostic) {
     std::cout.write(response.stdoutText.data(),
                     static_cast<std::streamsize>(response.stdoutText.size()));
@@ -154,6 +197,7 @@ int Console::_answerListing(std::string const& tool, std::vector<std::string> co
     Response const response = scenario.find(tool, name);
     _leaveChild(response.childDelay);
     _leaveDaemon(response.daemonDelay);
+    _misbehave(response.misbehaviours);
     _wait(response.delay.value_or(scenario.get_DefaultDelay()));
     return _print(response, "");
 }
@@ -171,6 +215,7 @@ int Console::_answerRemoteAction(std::vector<std::string> const& arguments) {
     Response const response = scenario.find(request.get_Action(), request.get_PartitionID());
     _leaveChild(response.childDelay);
     _leaveDaemon(response.daemonDelay);
+    _misbehave(response.misbehaviours);
     _wait(response.delay.value_or(scenario.get_DefaultDelay()));
     std::string const diagnostic =
         response.document ? _placeDocument(request, *response.document) : std::string();

@@ -111,6 +111,10 @@ void ScenarioParser::_parseLine(std::string const& line) {
         _parseDaemonDelay(value);
         return;
     }
+    if (key == "misbehave") {
+        _parseMisbehaviour(value);
+        return;
+    }
     _parseText(key, value);
 }
 
@@ -204,6 +208,20 @@ void ScenarioParser::_parseDaemonDelay(std::string const& value) {
     _response.daemonDelay = seconds;
 }
 
+// Several misbehaviours may be given, one per line.
+void ScenarioParser::_parseMisbehaviour(std::string const& value) {
+    std::string const name = _trimmed(value);
+    if (_tool.empty()) {
+        _fail("\"misbehave\" must follow a section header");
+    }
+    if (name != "ignore-signals" && name != "close-stdout" && name != "rename" &&
+        name != "fork-storm" && name != "stop-self") {
+        _fail("unknown misbehaviour \"" + name +
+              "\" (expected ignore-signals, close-stdout, rename, fork-storm or stop-self)");
+    }
+    _response.misbehaviours.insert(name);
+}
+
 void ScenarioParser::_parseText(std::string const& key, std::string const& value) {
     std::size_t const dash = key.find('-');
     std::string const streamName = key.substr(0, dash);
@@ -216,7 +234,7 @@ void ScenarioParser::_parseText(std::string const& key, std::string const& value
     } else if (streamName != "stdout") {
         _fail("unknown key \"" + key +
               "\" (expected stdout, stderr, document, their -nolf and -file forms, exit, delay, "
-              "child-delay or daemon-delay)");
+              "child-delay, daemon-delay or misbehave)");
     }
     if (formName != "" && formName != "nolf" && formName != "file") {
         _fail("unknown key \"" + key + "\" (a text key ends in nothing, -nolf or -file)");

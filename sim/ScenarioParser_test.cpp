@@ -4,6 +4,9 @@
 
 #include <gtest/gtest.h>
 
+#include <set>
+#include <string>
+
 using PylonSim::Response;
 using PylonSim::Scenario;
 using PylonSim::ScenarioError;
@@ -157,7 +160,7 @@ TEST_F(ScenarioFile, ErrorNamesFileLineAndProblem) {
     EXPECT_EQ(
         path() +
             ":3: unknown key \"stdot\" (expected stdout, stderr, document, their -nolf and -file "
-            "forms, exit, delay, child-delay or daemon-delay)",
+            "forms, exit, delay, child-delay, daemon-delay or misbehave)",
         error.describe());
 }
 
@@ -260,6 +263,24 @@ TEST_F(ScenarioFile, BadOrRepeatedDaemonDelayIsRejected) {
               errorOf("[lsvtc]\ndaemon-delay later\n").problem);
     EXPECT_EQ("\"daemon-delay\" is given twice in this section",
               errorOf("[lsvtc]\ndaemon-delay 1\ndaemon-delay 2\n").problem);
+}
+
+TEST_F(ScenarioFile, MisbehavioursAddUpPerSection) {
+    Scenario const scenario =
+        load("[runCmdOnPartition 2]\nmisbehave rename\nmisbehave stop-self\n[lsvtc]\n");
+    EXPECT_EQ((std::set<std::string>{"rename", "stop-self"}),
+              scenario.find("runCmdOnPartition", "2").misbehaviours);
+    EXPECT_TRUE(scenario.find("lsvtc", "").misbehaviours.empty());
+}
+
+TEST_F(ScenarioFile, UnknownMisbehaviourIsRejected) {
+    EXPECT_EQ("unknown misbehaviour \"explode\" (expected ignore-signals, close-stdout, rename, "
+              "fork-storm or stop-self)",
+              errorOf("[lsvtc]\nmisbehave explode\n").problem);
+}
+
+TEST_F(ScenarioFile, MisbehaviourBeforeTheFirstSectionIsRejected) {
+    EXPECT_EQ("\"misbehave\" must follow a section header", errorOf("misbehave rename\n").problem);
 }
 
 TEST_F(ScenarioFile, DocumentOutsideGetFileSectionsIsRejected) {

@@ -429,14 +429,40 @@ TEST(FleetFault, FullVpdFolderIsNamedOnStandardErrorWithExit73) {
     });
 }
 
-// Cases that hold today, kept so that they go on holding: a hung action that
-// daemonises a helper, stopped within the limit with everything it started.
+// Cases that held before the faults above were found, kept so that they go
+// on holding: a hung action that daemonises a helper is stopped within the
+// limit with everything it started.
 TEST(FleetFault, HungActionThatDaemonisesIsStoppedWithinTheLimit) {
     repeat([](FaultTimings& timings) {
         int const partitions = timings.wholeBetween(1, 3);
         FaultRun run(listing(partitions) + "[runCmdOnPartition *]\ndaemon-delay 3600\n" + gc_Hang +
                          fetchAnswer(),
                      {"-t", "1", "-j", "3", gc_Identity});
+        double const started = FleetTest::monotonicSeconds();
+        EXPECT_EQ(run.waitForExit(), 8) << run.standardError();
+        EXPECT_LE(FleetTest::monotonicSeconds() - started, 1.0 + 1.0 + gc_Margin);
+        run.expectEndedCleanly();
+    });
+}
+
+// Hung actions that resist being stopped: they ignore the signals, close
+// their standard output, rename themselves, fork without end or stop
+// themselves, alone or together.
+TEST(FleetFault, HungActionsThatMisbehaveAreStoppedWithinTheLimit) {
+    std::vector<std::string> const misbehaviours{"ignore-signals", "close-stdout", "rename",
+                                                 "fork-storm", "stop-self"};
+    repeat([&misbehaviours](FaultTimings& timings) {
+        int const partitions = timings.wholeBetween(1, 3);
+        std::string scenario = listing(partitions);
+        for (int id = 1; id <= partitions; ++id) {
+            scenario += "[runCmdOnPartition " + std::to_string(id) + "]\n" + gc_Hang;
+            for (std::string const& misbehaviour : misbehaviours) {
+                if (timings.wholeBetween(0, 1) == 1) {
+                    scenario += "misbehave " + misbehaviour + "\n";
+                }
+            }
+        }
+        FaultRun run(scenario + fetchAnswer(), {"-t", "1", "-j", "3", gc_Identity});
         double const started = FleetTest::monotonicSeconds();
         EXPECT_EQ(run.waitForExit(), 8) << run.standardError();
         EXPECT_LE(FleetTest::monotonicSeconds() - started, 1.0 + 1.0 + gc_Margin);
