@@ -445,6 +445,32 @@ TEST(FleetFault, HungActionThatDaemonisesIsStoppedWithinTheLimit) {
     });
 }
 
+// SIGINT or SIGTERM at any moment of the survey, at any width, once or
+// twice (a double Ctrl-C): the first signal decides the exit status.
+TEST(FleetFault, SignalDuringTheSurveyAtAnyWidthEndsTheRun) {
+    repeat([](FaultTimings& timings) {
+        int const partitions = timings.wholeBetween(10, 70);
+        int const signalNumber = timings.wholeBetween(0, 1) == 0 ? SIGINT : SIGTERM;
+        std::string const jobs = std::vector<std::string>{
+            "1", "8", "64"}[static_cast<std::size_t>(timings.wholeBetween(0, 2))];
+        std::string scenario = listing(partitions);
+        for (int id = 1; id <= partitions; ++id) {
+            scenario += clientRun(id, timings.between(0.0, 0.5));
+        }
+        FaultRun run(scenario + fetchAnswer(), {"-t", "0", "-j", jobs, gc_Identity});
+        ASSERT_TRUE(waitForCalls(run.console(), "runCmdOnPartition", 1));
+        pause(timings.between(0.0, 1.0));
+        bool const reached = run.survey().signal(signalNumber);
+        if (timings.wholeBetween(0, 1) == 1) {
+            pause(timings.between(0.0, 0.2));
+            run.survey().signal(signalNumber);
+        }
+        EXPECT_EQ(run.waitForExit(), reached ? 128 + signalNumber : 0) << "at -j " << jobs << "\n"
+                                                                       << run.standardError();
+        run.expectEndedCleanly();
+    });
+}
+
 // Hung actions that resist being stopped: they ignore the signals, close
 // their standard output, rename themselves, fork without end or stop
 // themselves, alone or together.
