@@ -48,7 +48,7 @@ CommandResult _run(Script const& script, std::string const& argument) {
 class StandInBuildTools {
 public:
     StandInBuildTools(std::string const& ctestSummary, int ctestStatus) {
-        std::string const log = "echo \"$(basename \"$0\") $*\" >> '" + calls() + "'\n";
+        std::string const log = R"(echo "$(basename "$0") $*" >> ')" + calls() + "'\n";
         _write("cmake", log + "exit 0\n");
         QuorvexTest::writeFile(_folder.file("summary"), ctestSummary);
         _write("ctest", log + "cat '" + _folder.file("summary") + "'\nexit " +

@@ -25,6 +25,8 @@ namespace {
 
 constexpr char gc_MarkerVariable[] = "QUORVEX_FAULT_RUN";
 constexpr auto gc_PollPause = std::chrono::milliseconds(20);
+// Rounds of killing: a process of the run may start another while it is killed.
+constexpr int gc_KillRounds = 20;
 
 // What /proc/<pid>/stat says of a process: its state, parent, group, session.
 struct ProcessStat {
@@ -87,7 +89,6 @@ std::vector<pid_t> livePids() {
 
 // Orphans this process adopted as a subreaper would stay as zombies.
 void reapAdoptedOrphans(pid_t keep) {
-    std::vector<pid_t> zombies;
     for (pid_t const pid : livePids()) {
         ProcessStat stat;
         if (pid != keep && readStat(pid, stat) && stat.parent == ::getpid() && stat.state == 'Z') {
@@ -115,6 +116,12 @@ void reapAdoptedOrphans(pid_t keep) {
     ::_exit(127);
 }
 
+// Unique to each run of this process: its PID and a count.
+std::string nextMarker() {
+    static int s_runs = 0;
+    return std::to_string(::getpid()) + "-" + std::to_string(++s_runs);
+}
+
 int statusOf(int waitStatus) {
     return WIFSIGNALED(waitStatus) ? 128 + WTERMSIG(waitStatus) : WEXITSTATUS(waitStatus);
 }
@@ -122,9 +129,8 @@ int statusOf(int waitStatus) {
 } // namespace
 
 MarkedSurvey::MarkedSurvey(std::vector<std::string> const& argv, std::string const& stdoutPath,
-                           std::string const& stderrPath, Output output) {
-    static int s_runs = 0;
-    _marker = std::to_string(::getpid()) + "-" + std::to_string(++s_runs);
+                           std::string const& stderrPath, Output output)
+    : _marker(nextMarker()) {
     int ends[2] = {-1, -1};
     if (output == Output::ClosedPipe
             ? ::pipe(ends) != 0
@@ -186,10 +192,10 @@ int MarkedSurvey::waitForExit(double boundSeconds) {
 
 std::vector<pid_t> MarkedSurvey::children() const {
     std::vector<pid_t> found;
-    for (pid_t const pid : livePids()) {
+    for (pid_t const process : livePids()) {
         ProcessStat stat;
-        if (readStat(pid, stat) && stat.parent == _pid && stat.state != 'Z') {
-            found.push_back(pid);
+        if (readStat(process, stat) && stat.parent == _pid && stat.state != 'Z') {
+            found.push_back(process);
         }
     }
     return found;
@@ -198,13 +204,13 @@ std::vector<pid_t> MarkedSurvey::children() const {
 std::vector<pid_t> MarkedSurvey::descendants() const {
     std::string const marker = std::string(gc_MarkerVariable) + "=" + _marker;
     std::vector<pid_t> found;
-    for (pid_t const pid : livePids()) {
+    for (pid_t const process : livePids()) {
         ProcessStat stat;
-        if (pid == _pid || !readStat(pid, stat) || stat.state == 'Z') {
+        if (process == _pid || !readStat(process, stat) || stat.state == 'Z') {
             continue;
         }
-        if (stat.group == _pid || stat.session == _pid || hasEntry(pid, "environ", marker)) {
-            found.push_back(pid);
+        if (stat.group == _pid || stat.session == _pid || hasEntry(process, "environ", marker)) {
+            found.push_back(process);
         }
     }
     return found;
@@ -219,22 +225,23 @@ std::vector<std::string> MarkedSurvey::processesLeft(double boundSeconds) const 
         left = descendants();
     }
     std::vector<std::string> described;
-    for (pid_t const pid : left) {
+    for (pid_t const process : left) {
         ProcessStat stat;
-        readStat(pid, stat);
-        described.push_back(std::to_string(pid) + " (" + stat.state + ") " + commandLineOf(pid));
+        readStat(process, stat);
+        described.push_back(std::to_string(process) + " (" + stat.state + ") " +
+                            commandLineOf(process));
     }
     return described;
 }
 
 void MarkedSurvey::killLeftProcesses() const {
-    for (int round = 0; round < 20; ++round) {
+    for (int round = 0; round < gc_KillRounds; ++round) {
         std::vector<pid_t> const left = descendants();
         if (left.empty()) {
             return;
         }
-        for (pid_t const pid : left) {
-            ::kill(pid, SIGKILL);
+        for (pid_t const process : left) {
+            ::kill(process, SIGKILL);
         }
         std::this_thread::sleep_for(gc_PollPause);
         reapAdoptedOrphans(_reaped ? -1 : _pid);

@@ -4,6 +4,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include <filesystem>
 #include <map>
 
 namespace FleetFaultTest {
@@ -105,7 +106,7 @@ std::vector<std::string> temporaryFilesLeft(std::string const& workFolder) {
                                       std::string(QuorvexTest::gc_TraceFolder), workFolder}) {
         for (std::string const& name : QuorvexTest::listFolder(folder)) {
             if (isTemporaryName(name)) {
-                left.push_back(folder + "/" + name);
+                left.push_back((std::filesystem::path(folder) / name).string());
             }
         }
     }
