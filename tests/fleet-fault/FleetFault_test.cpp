@@ -114,10 +114,13 @@ public:
     }
 
     // Sends the signal, noting whether it came before the summary, the last
-    // file the run writes, was in place.
+    // file the run writes, was in place: missing both before and after the
+    // signal was sent, so that a summary put in place in between counts as
+    // coming first.
     void sendSignal(int signalNumber) {
-        _signalBeforeTheLastFile = !QuorvexTest::fileExists(summaryPath());
+        bool const missingBefore = !QuorvexTest::fileExists(summaryPath());
         _signalReached = _survey.signal(signalNumber);
+        _signalBeforeTheLastFile = missingBefore && !QuorvexTest::fileExists(summaryPath());
         _signal = signalNumber;
     }
 
