@@ -23,7 +23,6 @@
 #include <csignal>
 #include <cstring>
 #include <filesystem>
-#include <memory>
 #include <set>
 #include <sys/mount.h>
 #include <thread>
@@ -100,7 +99,7 @@ class FaultRun {
 public:
     FaultRun(std::string const& scenario, std::vector<std::string> const& options,
              MarkedSurvey::Output output = MarkedSurvey::Output::File)
-        : _console((clearResultFolders(), scenario)),
+        : _console(withFreshFolders(scenario)),
           _survey(arguments(options), _work.file("stdout"), _work.file("stderr"), output) {}
 
     SimulatedConsole const& console() const { return _console; }
@@ -158,9 +157,9 @@ public:
     }
 
 private:
-    // Result folders and /tmp as a fresh console has them, whatever an
-    // earlier run left behind.
-    static void clearResultFolders() {
+    // The scenario, once the result folders and /tmp are as a fresh console
+    // has them, whatever an earlier run left behind.
+    static std::string const& withFreshFolders(std::string const& scenario) {
         QuorvexTest::clearFolder(QuorvexTest::gc_VPD_Folder);
         QuorvexTest::clearFolder(QuorvexTest::gc_TraceFolder);
         for (std::string const& name : QuorvexTest::listFolder("/tmp")) {
@@ -168,6 +167,7 @@ private:
                 std::filesystem::remove("/tmp/" + name);
             }
         }
+        return scenario;
     }
 
     std::vector<std::string> arguments(std::vector<std::string> const& options) const {
