@@ -1,13 +1,17 @@
 #include "report/ReportPage.h"
 
+#include "report/DocumentCopies.h"
 #include "report/JsonMember.h"
 #include "report/Outcome.h"
 #include "report/PageAssets.h"
 #include "report/PageSkeleton.h"
+#include "report/ReadableTime.h"
 #include "report/ReportCommand.h"
 #include "utility/TextSafety.h"
 
 #include <cstdio>
+#include <optional>
+#include <set>
 #include <vector>
 
 namespace report {
@@ -90,18 +94,37 @@ std::string urlPath(std::string const& path) {
     return encoded;
 }
 
+// A summary's time as people read it; the text as it is when it is no time
+// the page knows how to read.
+std::string timeText(Json const& value) {
+    std::optional<std::string> const readable =
+        value.is_string() ? readableTime(value.get<std::string>()) : std::nullopt;
+    return readable ? *readable : htmlText(value);
+}
+
+// The time in an element that keeps the summary's text for programs.
+std::string timeElement(Json const& value) {
+    if (!value.is_string()) {
+        return htmlText(value);
+    }
+    return "<time datetime=\"" + htmlText(value) + "\">" + timeText(value) + "</time>";
+}
+
+// Each option with its value, and each identity, is kept whole on its line
+// (a line may break after the "-" of "-j" or inside "9119-MHE_21ABCDE");
+// lines break between them.
 std::string optionsText(Json const& summary) {
     if (htmlText(member(summary, "tool")) != gc_ProgramName) {
         return "read from the files earlier runs left";
     }
     Json const& options = member(summary, "options");
-    std::string text = "-j " + htmlText(member(options, "jobs")) + " -t " +
-                       htmlText(member(options, "timeout_seconds"));
+    std::string text = "<span>-j " + htmlText(member(options, "jobs")) + "</span> <span>-t " +
+                       htmlText(member(options, "timeout_seconds")) + "</span>";
     if (member(options, "all").is_boolean() && member(options, "all").get<bool>()) {
-        return text + " --all";
+        return text + " <span>--all</span>";
     }
     for (Json const& identity : member(options, "identities")) {
-        text += " " + htmlText(identity);
+        text += " <span>" + htmlText(identity) + "</span>";
     }
     return text;
 }
@@ -124,6 +147,8 @@ void appendOutcomeTotals(std::string& page, Json const& totals) {
     }
 }
 
+// A machine's counts under its bar: one item per outcome present, kept
+// whole on its line ("1 channel failure"), so the cell wraps between items.
 std::string barOf(Json const& counts) {
     long long const partitions = countOf(counts, "partitions");
     std::string bar = "<div class=\"bar\">";
@@ -139,15 +164,34 @@ std::string barOf(Json const& counts) {
         std::string const text = std::to_string(count) + " " + outcome.label;
         bar += "<i class=\"" + std::string(outcome.pageClass) + "\" style=\"width:" + width +
                "\" title=\"" + text + "\"></i>";
-        described += (described.empty() ? "" : ", ") + text;
+        described += "<span><span class=\"key " + std::string(outcome.pageClass) + "\"></span>" +
+                     text + "</span> ";
     }
-    return bar + "</div><td class=\"legend\">" + (described.empty() ? "none listed" : described);
+    return bar + "</div><p class=\"counts\">" +
+           (described.empty() ? "none listed" : described.substr(0, described.size() - 1)) + "</p>";
+}
+
+// A machine whose partitions the console could not list: the console's
+// message where the summary keeps it, in place of the counts.
+std::string listingFailure(Json const& failure) {
+    std::string text =
+        R"(<div class="bar listing-failed"></div><p class="counts"><b>listing failed</b>)";
+    if (failure.is_string()) {
+        text += ": " + htmlText(failure);
+    }
+    return text + "</p>";
+}
+
+bool listingFailed(Json const& machine) {
+    Json const& failure = member(machine, "listing_failed");
+    return !failure.is_null() && failure != false;
 }
 
 void appendMachineRow(std::string& page, Json const& machine, std::size_t index) {
     std::string const identity = htmlText(member(machine, "identity"));
     std::string const code = htmlText(member(machine, "return_code"));
-    page += R"(<tr><th scope="row">)";
+    page += listingFailed(machine) ? R"(<tr class="listing-failed"><th scope="row">)"
+                                   : R"(<tr><th scope="row">)";
     if (member(machine, "partitions").empty()) {
         page += identity;
     } else {
@@ -156,7 +200,10 @@ void appendMachineRow(std::string& page, Json const& machine, std::size_t index)
     }
     page += R"(<td class="code code)" + code + R"(">)" + code + R"(<td class="number">)" +
             std::to_string(countOf(member(machine, "counts"), "partitions")) +
-            R"(<td class="bar-cell">)" + barOf(member(machine, "counts")) + "\n";
+            R"(<td class="bar-cell">)" +
+            (listingFailed(machine) ? listingFailure(member(machine, "listing_failed"))
+                                    : barOf(member(machine, "counts"))) +
+            "\n";
 }
 
 void appendMachineRows(std::string& page, Json const& machines) {
@@ -167,11 +214,14 @@ void appendMachineRows(std::string& page, Json const& machines) {
     }
 }
 
+// The outcomes' keys, and the mark of a machine whose listing failed, each
+// key kept on the line of its name.
 void appendOutcomeKeys(std::string& page) {
     for (OutcomeText const& outcome : outcomeTable()) {
-        page +=
-            "<span class=\"key " + std::string(outcome.pageClass) + "\"></span>" + outcome.label;
+        page += "<span><span class=\"key " + std::string(outcome.pageClass) + "\"></span>" +
+                outcome.label + "</span> ";
     }
+    page += R"(<span><span class="key listing-failed"></span>listing failed</span>)";
 }
 
 // The filter's boxes: the value is the class of the rows a box keeps.
@@ -195,13 +245,18 @@ void appendMachineOptions(std::string& page, Json const& machines) {
     }
 }
 
-std::string documentLink(Json const& document, std::string const& documentFolder) {
-    if (!document.is_string()) {
+// A link to the document's copy beside the page; none for a document that
+// was not copied, as the link would lead nowhere.
+std::string documentLink(Json const& document, std::set<std::string> const& linkedDocuments) {
+    if (!document.is_string() || linkedDocuments.count(document.get<std::string>()) == 0) {
         return "";
     }
-    std::string const path = document.get<std::string>();
-    std::string const file = path.substr(path.rfind('/') + 1);
-    return "<a href=\"" + escapeHtml(urlPath(documentFolder + "/" + file)) + "\">XML</a>";
+    std::optional<std::string> const file = documentFileName(document.get<std::string>());
+    if (!file) {
+        return "";
+    }
+    return "<a href=\"" + escapeHtml(urlPath(std::string(gc_DocumentFolder) + "/" + *file)) +
+           "\">XML</a>";
 }
 
 std::string reasonDetails(Json const& reason) {
@@ -215,7 +270,7 @@ std::string reasonDetails(Json const& reason) {
 // Cells are left open (HTML closes them) to keep 50,000 rows small; only
 // the cells the style sheet colours or aligns carry a class.
 void appendPartitionRow(std::string& page, Json const& partition, std::string const& identity,
-                        std::string const& anchor, std::string const& documentFolder) {
+                        std::string const& anchor, std::set<std::string> const& linkedDocuments) {
     RowOutcome const outcome = rowOutcome(member(partition, "outcome"));
     page += "<tr" + anchor + " class=" + outcome.pageClass + "><td>" + identity +
             "<td class=number>" + htmlText(member(partition, "id")) + "<td>" +
@@ -223,7 +278,7 @@ void appendPartitionRow(std::string& page, Json const& partition, std::string co
             "<td class=outcome>" + outcome.label + "<td>" +
             htmlText(member(partition, "status_text")) + "<td class=number>" +
             secondsText(member(partition, "seconds")) + "<td>" +
-            documentLink(member(partition, "document"), documentFolder) + "<td>" +
+            documentLink(member(partition, "document"), linkedDocuments) + "<td>" +
             reasonDetails(member(partition, "reason"));
     // The row is closed before the line end: left open, the line end would
     // belong to the last cell, and an empty reason cell would lose the dash
@@ -232,13 +287,13 @@ void appendPartitionRow(std::string& page, Json const& partition, std::string co
 }
 
 void appendPartitionRows(std::string& page, Json const& machines,
-                         std::string const& documentFolder) {
+                         std::set<std::string> const& linkedDocuments) {
     std::size_t index = 0;
     for (Json const& machine : machines) {
         std::string const identity = htmlText(member(machine, "identity"));
         std::string anchor = " id=m" + std::to_string(index);
         for (Json const& partition : member(machine, "partitions")) {
-            appendPartitionRow(page, partition, identity, anchor, documentFolder);
+            appendPartitionRow(page, partition, identity, anchor, linkedDocuments);
             anchor.clear();
         }
         ++index;
@@ -261,8 +316,9 @@ std::vector<Placeholder> runPlaceholders(Json const& summary) {
     Json const& totals = member(summary, "totals");
     return {
         textPlaceholder("console-host", htmlText(member(summary, "console_host"))),
-        textPlaceholder("started", htmlText(member(summary, "started"))),
-        textPlaceholder("ended", htmlText(member(summary, "ended"))),
+        textPlaceholder("started", timeElement(member(summary, "started"))),
+        textPlaceholder("ended", timeElement(member(summary, "ended"))),
+        textPlaceholder("started-text", timeText(member(summary, "started"))),
         textPlaceholder("elapsed-seconds", secondsText(member(summary, "elapsed_seconds"))),
         textPlaceholder("return-code", htmlText(member(summary, "return_code"))),
         textPlaceholder("interruption", interruptionText(summary)),
@@ -279,7 +335,7 @@ std::vector<Placeholder> runPlaceholders(Json const& summary) {
 
 } // namespace
 
-std::string reportPage(Json const& summary, std::string const& documentFolder) {
+std::string reportPage(Json const& summary, std::set<std::string> const& linkedDocuments) {
     Json const& machines = member(summary, "machines");
     std::vector<Placeholder> placeholders = runPlaceholders(summary);
     placeholders.push_back(
@@ -290,7 +346,7 @@ std::string reportPage(Json const& summary, std::string const& documentFolder) {
                                 appendMachineOptions(page, machines);
                             }});
     placeholders.push_back({"partition-rows", [&](std::string& page) {
-                                appendPartitionRows(page, machines, documentFolder);
+                                appendPartitionRows(page, machines, linkedDocuments);
                             }});
     std::string page;
     page.reserve(expectedSize(summary));

@@ -29,21 +29,38 @@ TEST(ReportWriter, WritesThePageTheCsvAndTheSummaryIntoANewFolder) {
     EXPECT_EQ(report::partitionsCsv(summary),
               QuorvexTest::readFile(root.file("report/today/partitions.csv")));
     EXPECT_TRUE(QuorvexTest::fileExists(root.file("report/today/index.html")));
-    EXPECT_EQ(3, std::distance(fs::directory_iterator(root.file("report/today")),
+    EXPECT_TRUE(fs::is_directory(root.file("report/today/documents")));
+    EXPECT_EQ(4, std::distance(fs::directory_iterator(root.file("report/today")),
                                fs::directory_iterator()));
 }
 
-TEST(ReportWriter, PageLinksDocumentsRelativeToTheReportFolder) {
+TEST(ReportWriter, PageLinksTheDocumentsCopiedBesideIt) {
     QuorvexTest::TemporaryDirectory root;
     fs::create_directories(root.file("VPD"));
+    QuorvexTest::writeFile(root.file("VPD/d.VPD.xml"), "<d/>");
     Json summary;
     summary["machines"] =
         Json::array({{{"identity", "1-A_S"},
                       {"partitions",
-                       Json::array({{{"outcome", "surveyed"}, {"document", "VPD/d.VPD.xml"}}})}}});
+                       Json::array({{{"outcome", "surveyed"}, {"document", "VPD/d.VPD.xml"}},
+                                    {{"outcome", "surveyed"}, {"document", "VPD/e.VPD.xml"}}})}}});
     report::writeReport(summary, root.file("VPD"), root.file("out/report"));
-    EXPECT_NE(std::string::npos, QuorvexTest::readFile(root.file("out/report/index.html"))
-                                     .find("<a href=\"../../VPD/d.VPD.xml\">"));
+    std::string const page = QuorvexTest::readFile(root.file("out/report/index.html"));
+    EXPECT_NE(std::string::npos, page.find("<a href=\"documents/d.VPD.xml\">"));
+    EXPECT_EQ(std::string::npos, page.find("e.VPD.xml"));
+    EXPECT_EQ("<d/>", QuorvexTest::readFile(root.file("out/report/documents/d.VPD.xml")));
+}
+
+TEST(ReportWriter, DocumentsFolderThatIsAFileThrowsCreateWithItsPath) {
+    QuorvexTest::TemporaryDirectory root;
+    fs::create_directories(root.file("report"));
+    QuorvexTest::writeFile(root.file("report/documents"), "x");
+    auto const error = QuorvexTest::thrownBy<util::SystemError>(
+        [&] { report::writeReport(Json::object(), root.path(), root.file("report")); });
+    ASSERT_TRUE(error);
+    EXPECT_EQ(ENOTDIR, error->errorNumber());
+    EXPECT_EQ("create", error->operation());
+    EXPECT_EQ(root.file("report") + "/documents", error->object());
 }
 
 TEST(ReportWriter, FolderUnderARegularFileThrowsCreateWithThePathAndEnotdir) {
