@@ -89,6 +89,15 @@ bool waitForCalls(SimulatedConsole const& console, std::string const& action, st
     return false;
 }
 
+// Waits (up to the bound of a hung run) until the run has no worker left:
+// every unit has ended, and what remains is writing the results.
+void waitForNoWorker(MarkedSurvey const& survey) {
+    double const until = FleetTest::monotonicSeconds() + gc_HungRun;
+    while (!survey.children().empty() && FleetTest::monotonicSeconds() < until) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(1));
+    }
+}
+
 void pause(double seconds) {
     std::this_thread::sleep_for(std::chrono::duration<double>(std::max(seconds, 0.0)));
 }
@@ -97,10 +106,14 @@ void pause(double seconds) {
 // with a summary in a work folder, and the checks every run ends with.
 class FaultRun {
 public:
+    // The files the run writes besides its results: a summary, and a report
+    // when asked.
+    enum class Files { Summary, SummaryAndReport };
+
     FaultRun(std::string const& scenario, std::vector<std::string> const& options,
-             MarkedSurvey::Output output = MarkedSurvey::Output::File)
-        : _console(withFreshFolders(scenario)),
-          _survey(arguments(options), _work.file("stdout"), _work.file("stderr"), output) {}
+             MarkedSurvey::Output output = MarkedSurvey::Output::File, Files files = Files::Summary)
+        : _console(withFreshFolders(scenario)), _arguments(arguments(options, files)),
+          _survey(_arguments, _work.file("stdout"), _work.file("stderr"), output) {}
 
     SimulatedConsole const& console() const { return _console; }
     MarkedSurvey& survey() { return _survey; }
@@ -112,16 +125,19 @@ public:
         return _status;
     }
 
-    // Sends the signal, noting whether it came before the summary, the last
-    // file the run writes, was in place: missing both before and after the
-    // signal was sent, so that a summary put in place in between counts as
-    // coming first.
+    // Sends the signal, noting whether it came before the run's last files
+    // (its summary, and its report's page when it writes a report) were in
+    // place: one missing both before and after the signal was sent, so that
+    // files put in place in between count as coming first.
     void sendSignal(int signalNumber) {
-        bool const missingBefore = !QuorvexTest::fileExists(summaryPath());
+        bool const missingBefore = !lastFilesInPlace();
         _signalReached = _survey.signal(signalNumber);
-        _signalBeforeTheLastFile = missingBefore && !QuorvexTest::fileExists(summaryPath());
+        _signalBeforeTheLastFile = missingBefore && !lastFilesInPlace();
         _signal = signalNumber;
     }
+
+    // Where the run writes its report, when it writes one.
+    std::string reportFolder() const { return _work.file("report"); }
 
     // A signal that reached the run before its last file was in place ends
     // it with 128 + the signal; one that came later may find it finished
@@ -132,7 +148,8 @@ public:
         EXPECT_TRUE(_status == 128 + _signal || (!mustCount && finished))
             << "exit status " << _status << " after " << signalName(_signal)
             << (_signalReached ? " reached the run" : " came after the run had ended")
-            << (_signalBeforeTheLastFile ? " before" : " after") << " its summary was in place\n"
+            << (_signalBeforeTheLastFile ? " before" : " after")
+            << " its last files were in place\n"
             << standardError();
     }
 
@@ -157,6 +174,13 @@ public:
     }
 
 private:
+    bool lastFilesInPlace() const {
+        bool const writesReport =
+            std::find(_arguments.begin(), _arguments.end(), "--report") != _arguments.end();
+        return QuorvexTest::fileExists(summaryPath()) &&
+               (!writesReport || QuorvexTest::fileExists(reportFolder() + "/index.html"));
+    }
+
     // The scenario, once the result folders and /tmp are as a fresh console
     // has them, whatever an earlier run left behind.
     static std::string const& withFreshFolders(std::string const& scenario) {
@@ -170,15 +194,19 @@ private:
         return scenario;
     }
 
-    std::vector<std::string> arguments(std::vector<std::string> const& options) const {
+    std::vector<std::string> arguments(std::vector<std::string> const& options, Files files) const {
         std::vector<std::string> argv{FleetTest::consoleWideTool(), "--summary",
                                       _work.file("summary.json")};
+        if (files == Files::SummaryAndReport) {
+            argv.insert(argv.end(), {"--report", reportFolder()});
+        }
         argv.insert(argv.end(), options.begin(), options.end());
         return argv;
     }
 
     QuorvexTest::TemporaryDirectory const _work;
     SimulatedConsole const _console;
+    std::vector<std::string> const _arguments;
     MarkedSurvey _survey;
     int _status = -1;
     int _signal = 0;
@@ -241,11 +269,15 @@ TEST(FleetFault, SignalWhileTheResultsAreWrittenEndsTheRunAsDocumented) {
     repeat([](FaultTimings& timings) {
         int const partitions = timings.wholeBetween(10, 30);
         int const signalNumber = timings.wholeBetween(0, 1) == 0 ? SIGINT : SIGTERM;
+        // A report makes the writing after the survey last long enough for
+        // the signal to meet it.
         FaultRun run(listing(partitions) + "[runCmdOnPartition *]\n" + gc_Answer + fetchAnswer(),
-                     {"-t", "5", "-j", "8", gc_Identity});
+                     {"-t", "5", "-j", "8", gc_Identity}, MarkedSurvey::Output::File,
+                     FaultRun::Files::SummaryAndReport);
         ASSERT_TRUE(waitForCalls(run.console(), "getFileFromPartition",
                                  static_cast<std::size_t>(partitions)));
-        pause(timings.between(0.0, 0.08));
+        waitForNoWorker(run.survey());
+        pause(timings.between(0.0, 0.03));
         run.sendSignal(signalNumber);
         run.waitForExit();
         run.expectSignalCounted();
