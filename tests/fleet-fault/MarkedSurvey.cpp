@@ -110,7 +110,14 @@ void reapAdoptedOrphans(pid_t keep) {
     // The run inherits only the standard descriptors, as from a shell, so
     // that any other descriptor its actions hold is one it opened itself.
     ::close_range(3, ~0U, 0);
-    std::signal(SIGPIPE, SIG_DFL);
+    // And the signal dispositions and mask of a program started from a
+    // terminal, whatever the test's own are.
+    for (int const signalNumber : {SIGINT, SIGTERM, SIGHUP, SIGPIPE}) {
+        std::signal(signalNumber, SIG_DFL);
+    }
+    sigset_t none;
+    sigemptyset(&none);
+    ::sigprocmask(SIG_SETMASK, &none, nullptr);
     std::vector<char*> arguments = QuorvexTest::argumentPointers(argv);
     ::execv(arguments[0], arguments.data());
     ::_exit(127);
