@@ -6,11 +6,15 @@
 
 #include <algorithm>
 #include <chrono>
+#include <csignal>
 #include <cstdlib>
 #include <fstream>
 #include <iostream>
 #include <iterator>
 #include <optional>
+#include <set>
+#include <sys/prctl.h>
+#include <sys/wait.h>
 #include <thread>
 #include <unistd.h>
 
@@ -61,6 +65,69 @@ void _leaveChild(std::optional<double> const& seconds) {
     if (::fork() == 0) {
         _wait(*seconds);
         ::_exit(0);
+    }
+}
+
+// A helper that a console action starts as a daemon: a child that starts a
+// session of its own and a grandchild in it, the child ending at once, so
+// that the helper is nobody's child and in no process group of the tool's.
+// It waits, prints nothing and ends.
+void _leaveDaemon(std::optional<double> const& seconds) {
+    if (!seconds) {
+        return;
+    }
+    std::cout.flush();
+    std::cerr.flush();
+    pid_t const child = ::fork();
+    if (child == 0) {
+        ::setsid();
+        if (::fork() == 0) {
+            _wait(*seconds);
+        }
+        ::_exit(0);
+    }
+    if (child > 0) {
+        ::waitpid(child, nullptr, 0);
+    }
+}
+
+// A chain of processes that keeps forking: each one starts the next and
+// ends, so that no single PID stays for a stopper to find. It ends by
+// itself after half a minute, so that a chain nobody stops does not run on.
+void _forkStorm() {
+    constexpr int c_Generations = 1500;
+    if (::fork() != 0) {
+        return;
+    }
+    for (int generation = 0; generation < c_Generations; ++generation) {
+        _wait(0.02);
+        if (::fork() != 0) {
+            ::_exit(0);
+        }
+    }
+    ::_exit(0);
+}
+
+// What a hung console action may do to resist being stopped.
+void _misbehave(std::set<std::string> const& misbehaviours) {
+    std::cout.flush();
+    std::cerr.flush();
+    if (misbehaviours.count("ignore-signals") != 0) {
+        std::signal(SIGINT, SIG_IGN);
+        std::signal(SIGTERM, SIG_IGN);
+        std::signal(SIGHUP, SIG_IGN);
+    }
+    if (misbehaviours.count("close-stdout") != 0) {
+        ::close(STDOUT_FILENO);
+    }
+    if (misbehaviours.count("rename") != 0) {
+        ::prctl(PR_SET_NAME, "renamed-action");
+    }
+    if (misbehaviours.count("fork-storm") != 0) {
+        _forkStorm();
+    }
+    if (misbehaviours.count("stop-self") != 0) {
+        ::raise(SIGSTOP);
     }
 }
 
@@ -129,6 +196,8 @@ int Console::_answerListing(std::string const& tool, std::vector<std::string> co
     std::string const name = tool == "lsvtc" ? "" : _identity(arguments);
     Response const response = scenario.find(tool, name);
     _leaveChild(response.childDelay);
+    _leaveDaemon(response.daemonDelay);
+    _misbehave(response.misbehaviours);
     _wait(response.delay.value_or(scenario.get_DefaultDelay()));
     return _print(response, "");
 }
@@ -145,6 +214,8 @@ int Console::_answerRemoteAction(std::vector<std::string> const& arguments) {
     }
     Response const response = scenario.find(request.get_Action(), request.get_PartitionID());
     _leaveChild(response.childDelay);
+    _leaveDaemon(response.daemonDelay);
+    _misbehave(response.misbehaviours);
     _wait(response.delay.value_or(scenario.get_DefaultDelay()));
     std::string const diagnostic =
         response.document ? _placeDocument(request, *response.document) : std::string();

@@ -9,6 +9,7 @@
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
+#include <sstream>
 #include <string>
 #include <unistd.h>
 
@@ -367,6 +368,71 @@ TEST(SimulatedConsole, ChildDelayLeavesAProcessRunningAfterTheAnswer) {
     ASSERT_FALSE(left.empty()) << "no process left behind by the tool";
     EXPECT_EQ(1, std::count(left.begin(), left.end(), '\n')) << "processes left: " << left;
     EXPECT_EQ(0, ::kill(std::stoi(left), SIGKILL));
+}
+
+TEST(SimulatedConsole, DaemonDelayLeavesAProcessInASessionOfItsOwn) {
+    SimulatedConsole console("[lsvtc]\nstdout 0:A_B;\ndaemon-delay 30\n");
+    std::string const commandLine =
+        std::string(gc_Lsvtc) + " -t0 left-daemon-" + std::to_string(::getpid());
+    CommandResult const found = runShell(commandLine + " > /dev/null; echo $?; pgrep -f -x '" +
+                                         commandLine + "' | xargs -r ps -o pid=,sid= -p");
+    std::size_t const statusEnd = found.stdoutText.find('\n');
+    ASSERT_NE(std::string::npos, statusEnd) << found.stderrText;
+    EXPECT_EQ("0", found.stdoutText.substr(0, statusEnd)) << "the tool's own exit status";
+    std::istringstream left(found.stdoutText.substr(statusEnd + 1));
+    pid_t pid = 0;
+    pid_t session = 0;
+    ASSERT_TRUE(left >> pid >> session) << "no daemon left behind: " << found.stdoutText;
+    EXPECT_NE(::getsid(0), session) << "the daemon is in a session of its own";
+    EXPECT_FALSE(left >> pid) << "one daemon only: " << found.stdoutText;
+    EXPECT_EQ(0, ::kill(pid, SIGKILL));
+}
+
+// Starts lsvtc in the background, waits (up to ten seconds) until it has
+// stopped itself, then runs the shell commands given with $! its PID, and
+// kills it.
+CommandResult _onceStopped(std::string const& commands) {
+    return runShell(std::string(gc_Lsvtc) +
+                    " -t0 > /dev/null & for i in $(seq 1000); do"
+                    " case $(cut -d' ' -f3 /proc/$!/stat) in T) break;; esac; sleep 0.01; done; " +
+                    commands + "; kill -KILL $!");
+}
+
+TEST(SimulatedConsole, StopSelfStopsTheToolBeforeItAnswers) {
+    SimulatedConsole console("[lsvtc]\nmisbehave stop-self\nstdout 0:A_B;\n");
+    EXPECT_EQ("T\n", _onceStopped("cut -d' ' -f3 /proc/$!/stat").stdoutText);
+}
+
+TEST(SimulatedConsole, RenameGivesTheToolAnotherProcessName) {
+    SimulatedConsole console("[lsvtc]\nmisbehave rename\nmisbehave stop-self\n");
+    EXPECT_EQ("renamed-action\n", _onceStopped("cat /proc/$!/comm").stdoutText);
+}
+
+TEST(SimulatedConsole, IgnoreSignalsLeavesTheToolRunningAfterSigterm) {
+    SimulatedConsole console("[lsvtc]\nmisbehave ignore-signals\nmisbehave stop-self\n");
+    EXPECT_EQ("alive\n",
+              _onceStopped("kill -TERM $!; kill -HUP $!; kill -INT $!; kill -0 $! && echo alive")
+                  .stdoutText);
+}
+
+TEST(SimulatedConsole, CloseStdoutClosesTheToolsStandardOutput) {
+    SimulatedConsole console("[lsvtc]\nmisbehave close-stdout\nmisbehave stop-self\n");
+    EXPECT_EQ("no stdout\n", _onceStopped("test -e /proc/$!/fd/1 || echo no stdout").stdoutText);
+}
+
+TEST(SimulatedConsole, ForkStormKeepsStartingProcessesInTheToolsGroup) {
+    SimulatedConsole console("[lsvtc]\nmisbehave fork-storm\nmisbehave stop-self\n");
+    // The tool leads a session and group of its own (setsid); two looks a
+    // while apart find the chain's member in it under a new PID, and the
+    // group is then killed whole.
+    CommandResult const found = runShell(
+        "setsid " + std::string(gc_Lsvtc) +
+        " -t0 > /dev/null 2>&1 & group=$!; members() { pgrep -s $group | grep -v -x $group; };"
+        " first=$(members); for i in $(seq 1000); do now=$(members);"
+        " [ -n \"$first\" ] && [ -n \"$now\" ] && [ \"$now\" != \"$first\" ] && break;"
+        " [ -n \"$first\" ] || first=$now; sleep 0.01; done;"
+        " [ -n \"$first\" ] && [ \"$now\" != \"$first\" ] && echo forking; kill -KILL -$group");
+    EXPECT_EQ("forking\n", found.stdoutText) << found.stderrText;
 }
 
 TEST(SimulatedConsole, MalformedScenarioIsRejectedNamingFileLineAndProblem) {

@@ -4,6 +4,7 @@
 
 #include <map>
 #include <optional>
+#include <set>
 #include <string>
 
 namespace PylonSim {
@@ -18,6 +19,15 @@ struct Response {
     // Seconds a child process that the tool starts and leaves behind waits
     // before it ends; unset: no such child.
     std::optional<double> childDelay;
+    // Seconds a daemonised helper waits before it ends: started in a session
+    // of its own through a second fork, so that it is no child of the tool
+    // and survives the tool's process group; unset: no such helper.
+    std::optional<double> daemonDelay;
+    // Ways the tool misbehaves before it waits, as hung console actions do:
+    // "ignore-signals" (SIGINT, SIGTERM and SIGHUP ignored), "close-stdout",
+    // "rename" (another process name), "fork-storm" (a chain of processes
+    // that keeps forking), "stop-self" (stops itself with SIGSTOP).
+    std::set<std::string> misbehaviours;
     // The client document that getFileFromPartition places; unset: none.
     std::optional<std::string> document;
 };

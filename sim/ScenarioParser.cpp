@@ -107,6 +107,14 @@ void ScenarioParser::_parseLine(std::string const& line) {
         _parseChildDelay(value);
         return;
     }
+    if (key == "daemon-delay") {
+        _parseDaemonDelay(value);
+        return;
+    }
+    if (key == "misbehave") {
+        _parseMisbehaviour(value);
+        return;
+    }
     _parseText(key, value);
 }
 
@@ -161,7 +169,7 @@ void ScenarioParser::_parseExitCode(std::string const& value) {
     _response.exitCode = static_cast<int>(code);
 }
 
-// Seconds for "delay" or "child-delay": a number from 0 to 3600.
+// Seconds for "delay", "child-delay" or "daemon-delay": a number from 0 to 3600.
 double ScenarioParser::_parseSeconds(std::string const& key, std::string const& value) {
     _requireOnce(key);
     std::string const text = _trimmed(value);
@@ -192,6 +200,28 @@ void ScenarioParser::_parseChildDelay(std::string const& value) {
     _response.childDelay = seconds;
 }
 
+void ScenarioParser::_parseDaemonDelay(std::string const& value) {
+    double const seconds = _parseSeconds("daemon-delay", value);
+    if (_tool.empty()) {
+        _fail("\"daemon-delay\" must follow a section header");
+    }
+    _response.daemonDelay = seconds;
+}
+
+// Several misbehaviours may be given, one per line.
+void ScenarioParser::_parseMisbehaviour(std::string const& value) {
+    std::string const name = _trimmed(value);
+    if (_tool.empty()) {
+        _fail("\"misbehave\" must follow a section header");
+    }
+    if (name != "ignore-signals" && name != "close-stdout" && name != "rename" &&
+        name != "fork-storm" && name != "stop-self") {
+        _fail("unknown misbehaviour \"" + name +
+              "\" (expected ignore-signals, close-stdout, rename, fork-storm or stop-self)");
+    }
+    _response.misbehaviours.insert(name);
+}
+
 void ScenarioParser::_parseText(std::string const& key, std::string const& value) {
     std::size_t const dash = key.find('-');
     std::string const streamName = key.substr(0, dash);
@@ -203,8 +233,8 @@ void ScenarioParser::_parseText(std::string const& key, std::string const& value
         stream = Stream::Document;
     } else if (streamName != "stdout") {
         _fail("unknown key \"" + key +
-              "\" (expected stdout, stderr, document, their -nolf and -file forms, exit, delay or "
-              "child-delay)");
+              "\" (expected stdout, stderr, document, their -nolf and -file forms, exit, delay, "
+              "child-delay, daemon-delay or misbehave)");
     }
     if (formName != "" && formName != "nolf" && formName != "file") {
         _fail("unknown key \"" + key + "\" (a text key ends in nothing, -nolf or -file)");

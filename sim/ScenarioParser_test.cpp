@@ -4,6 +4,9 @@
 
 #include <gtest/gtest.h>
 
+#include <set>
+#include <string>
+
 using PylonSim::Response;
 using PylonSim::Scenario;
 using PylonSim::ScenarioError;
@@ -157,7 +160,7 @@ TEST_F(ScenarioFile, ErrorNamesFileLineAndProblem) {
     EXPECT_EQ(
         path() +
             ":3: unknown key \"stdot\" (expected stdout, stderr, document, their -nolf and -file "
-            "forms, exit, delay or child-delay)",
+            "forms, exit, delay, child-delay, daemon-delay or misbehave)",
         error.describe());
 }
 
@@ -241,6 +244,43 @@ TEST_F(ScenarioFile, BadOrRepeatedChildDelayIsRejected) {
               errorOf("[lsvtc]\nchild-delay later\n").problem);
     EXPECT_EQ("\"child-delay\" is given twice in this section",
               errorOf("[lsvtc]\nchild-delay 1\nchild-delay 2\n").problem);
+}
+
+TEST_F(ScenarioFile, DaemonDelayIsReadPerSection) {
+    Scenario const scenario = load("[runCmdOnPartition 2]\ndaemon-delay 30\n[lsvtc]\n");
+    std::optional<double> const daemonDelay = scenario.find("runCmdOnPartition", "2").daemonDelay;
+    ASSERT_TRUE(daemonDelay);
+    EXPECT_EQ(30.0, *daemonDelay);
+    EXPECT_FALSE(scenario.find("lsvtc", "").daemonDelay);
+}
+
+TEST_F(ScenarioFile, DaemonDelayBeforeTheFirstSectionIsRejected) {
+    EXPECT_EQ("\"daemon-delay\" must follow a section header", errorOf("daemon-delay 1\n").problem);
+}
+
+TEST_F(ScenarioFile, BadOrRepeatedDaemonDelayIsRejected) {
+    EXPECT_EQ("daemon-delay must be a number of seconds from 0 to 3600, not \"later\"",
+              errorOf("[lsvtc]\ndaemon-delay later\n").problem);
+    EXPECT_EQ("\"daemon-delay\" is given twice in this section",
+              errorOf("[lsvtc]\ndaemon-delay 1\ndaemon-delay 2\n").problem);
+}
+
+TEST_F(ScenarioFile, MisbehavioursAddUpPerSection) {
+    Scenario const scenario =
+        load("[runCmdOnPartition 2]\nmisbehave rename\nmisbehave stop-self\n[lsvtc]\n");
+    EXPECT_EQ((std::set<std::string>{"rename", "stop-self"}),
+              scenario.find("runCmdOnPartition", "2").misbehaviours);
+    EXPECT_TRUE(scenario.find("lsvtc", "").misbehaviours.empty());
+}
+
+TEST_F(ScenarioFile, UnknownMisbehaviourIsRejected) {
+    EXPECT_EQ("unknown misbehaviour \"explode\" (expected ignore-signals, close-stdout, rename, "
+              "fork-storm or stop-self)",
+              errorOf("[lsvtc]\nmisbehave explode\n").problem);
+}
+
+TEST_F(ScenarioFile, MisbehaviourBeforeTheFirstSectionIsRejected) {
+    EXPECT_EQ("\"misbehave\" must follow a section header", errorOf("misbehave rename\n").problem);
 }
 
 TEST_F(ScenarioFile, DocumentOutsideGetFileSectionsIsRejected) {

@@ -48,19 +48,27 @@ CommandResult _run(Script const& script, std::string const& argument) {
 class StandInBuildTools {
 public:
     StandInBuildTools(std::string const& ctestSummary, int ctestStatus) {
-        _write("cmake", "exit 0\n");
+        std::string const log = R"(echo "$(basename "$0") $*" >> ')" + calls() + "'\n";
+        _write("cmake", log + "exit 0\n");
         QuorvexTest::writeFile(_folder.file("summary"), ctestSummary);
-        _write("ctest",
-               "cat '" + _folder.file("summary") + "'\nexit " + std::to_string(ctestStatus) + "\n");
+        _write("ctest", log + "cat '" + _folder.file("summary") + "'\nexit " +
+                            std::to_string(ctestStatus) + "\n");
     }
 
-    CommandResult runTest(std::string const& allowSkips) const {
+    CommandResult runTest(std::string const& allowSkips, std::string const& preset = "") const {
         char const* path = std::getenv("PATH");
-        return runCommand(
-            {"/usr/bin/env",
-             "PATH=" + _folder.path() + ":" + (path != nullptr ? path : "/usr/bin:/bin"),
-             "QUORVEX_ALLOW_SKIPS=" + allowSkips, QuorvexTest::sourceRoot() + "/tools/test"});
+        std::vector<std::string> argv{
+            "/usr/bin/env",
+            "PATH=" + _folder.path() + ":" + (path != nullptr ? path : "/usr/bin:/bin"),
+            "QUORVEX_ALLOW_SKIPS=" + allowSkips, QuorvexTest::sourceRoot() + "/tools/test"};
+        if (!preset.empty()) {
+            argv.push_back(preset);
+        }
+        return runCommand(argv);
     }
+
+    // The file the stand-ins log their command lines to, one per call.
+    std::string calls() const { return _folder.file("calls"); }
 
 private:
     void _write(std::string const& name, std::string const& body) const {
@@ -187,7 +195,7 @@ TEST(Scripts, TestHelpIsNotHandedToCmake) {
 TEST(Scripts, TestRefusesAnUnknownPreset) {
     CommandResult const run = runCommand({QuorvexTest::sourceRoot() + "/tools/test", "release2"});
     EXPECT_EQ(2, run.exitStatus);
-    EXPECT_EQ("test: unknown preset 'release2' (dev, ci or asan)\n"
+    EXPECT_EQ("test: unknown preset 'release2' (dev, ci, asan or fault)\n"
               "test: try 'tools/test --help'\n",
               run.stderrText);
 }
@@ -230,6 +238,15 @@ TEST(Scripts, TestPassesWithoutSkips) {
 TEST(Scripts, TestFailsWithTheStatusOfFailedTests) {
     CommandResult const run = StandInBuildTools(gc_SummaryWithoutSkips, 8).runTest("1");
     EXPECT_EQ(8, run.exitStatus) << run.stderrText;
+}
+
+TEST(Scripts, TestFaultBuildsTheDevPresetAndRunsOnlyTheSlowFaultRuns) {
+    StandInBuildTools const tools(gc_SummaryWithoutSkips, 0);
+    CommandResult const run = tools.runTest("0", "fault");
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ(QuorvexTest::linesOf(QuorvexTest::readFile(tools.calls())),
+              (std::vector<std::string>{"cmake --preset dev", "cmake --build --preset dev",
+                                        "ctest --preset fault"}));
 }
 
 TEST(Scripts, EnsureDepsPassesTheLockBoundToAptGetAndNamesAListsLockStillHeld) {
