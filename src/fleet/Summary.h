@@ -19,6 +19,8 @@ struct RunFacts {
     // "SIGINT", "SIGTERM", or empty when the run was not interrupted.
     std::string interruptedBy;
     int exitStatus = 0;
+    // Why the console's machines could not be listed (--all).
+    std::optional<report::ListingFailure> listingFailure;
 };
 
 // The summary of a run (report::summaryDocument makes its document): every

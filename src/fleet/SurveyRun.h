@@ -49,6 +49,7 @@ private:
         std::size_t slot = 0;
         Clock::time_point started;
         bool listingStopped = false;
+        bool listingTimedOut = false;
     };
 
     void _takeSignal();
@@ -57,6 +58,8 @@ private:
     void _handle(std::vector<WorkerEvent> const& events);
     void _finish(std::size_t slot, std::string const& result);
     void _finishListing(InFlight const& running, std::string const& result);
+    std::optional<report::ListingFailure>
+    _listingFailure(InFlight const& running, std::optional<std::string> const& trace) const;
     void _finishSurvey(InFlight const& running, std::string const& result);
     void _recordStop(InFlight& running, WorkerEvent const& event);
     void _drawProgress();

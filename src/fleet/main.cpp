@@ -1,10 +1,8 @@
 #include "fleet/CommandLine.h"
+#include "fleet/MachineListing.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
-#include "fleet/TimeLimits.h"
-#include "fleet/WorkUnits.h"
-#include "fleet/WorkerPool.h"
 #include "report/ReportCommand.h"
 #include "report/RunSummary.h"
 #include "utility/AtomicFile.h"
@@ -19,38 +17,35 @@
 
 namespace {
 
-// The console's managed machines, listed in a worker of its own so that this
-// process never writes through the survey code's trace. A listing action that
-// runs past the time limit, or an interruption, stops the listing with
-// everything it started, and it never goes on: the run then has no machines.
-std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
-    fleet::WorkerPool pool(fleet::signalPipeDescriptor());
-    fleet::TimeLimits limits(timeoutSeconds);
-    if (std::optional<std::string> const failure =
-            pool.start(0, fleet::UnitKind::MachineListing, &fleet::listMachines)) {
-        std::cerr << report::gc_ProgramName << ": cannot list the managed machines: " << *failure
-                  << std::endl;
-        return {};
+// The machines to survey: those given, or with --all those the console
+// lists. A listing that fails is said at once, in one line.
+fleet::MachineListing machinesToSurvey(fleet::Options const& options) {
+    if (!options.all) {
+        return fleet::MachineListing{options.identities, std::nullopt};
     }
-    while (true) {
-        std::vector<fleet::WorkerEvent> const ended = pool.waitForEvents();
-        if (!ended.empty()) {
-            return fleet::decodeMachines(ended.front().text);
-        }
-        limits.interrupt(fleet::takeSignal());
-        if (!pool.stopDueActions(limits).empty() || limits.isInterrupted()) {
-            // The pool ends the stopped worker with everything it started.
-            return {};
-        }
+    fleet::MachineListing listing = fleet::listManagedMachines(options.timeoutSeconds);
+    if (listing.failure) {
+        std::cerr << report::gc_ProgramName << ": cannot list the managed machines: "
+                  << report::listingFailureText(*listing.failure) << std::endl;
     }
+    return listing;
+}
+
+// A console whose machines cannot be listed is unavailable (sysexits.h's
+// EX_UNAVAILABLE), unless a signal ended the run first.
+int exitStatusOf(fleet::SurveyRun const& run, int runStatus, fleet::MachineListing const& listing) {
+    return listing.failure && run.interruptingSignal() == 0 ? fleet::gc_ExitUnavailable
+                                                            : runStatus;
 }
 
 // The summary and the report of a run that has ended. What cannot be
 // written is said in messages, one line each.
 void writeRunFiles(fleet::Options const& options, fleet::SurveyRun const& run, int exitStatus,
                    std::time_t started, std::chrono::steady_clock::time_point startedAt,
+                   std::optional<report::ListingFailure> const& listingFailure,
                    std::ostream& messages) {
     fleet::RunFacts facts;
+    facts.listingFailure = listingFailure;
     facts.options = options;
     // Every unit of work has ended: the host name command may trace here.
     facts.consoleHost = Utility::get_HostName();
@@ -108,14 +103,13 @@ int main(int argc, char** argv) {
     std::time_t const started = std::time(nullptr);
 
     fleet::Options const& options = parsed.options;
-    std::vector<std::string> const identities =
-        options.all ? listManagedMachines(options.timeoutSeconds) : options.identities;
-    fleet::SurveyRun run(options, identities);
-    int const exitStatus = run.run();
+    fleet::MachineListing const listing = machinesToSurvey(options);
+    fleet::SurveyRun run(options, listing.identities);
+    int const exitStatus = exitStatusOf(run, run.run(), listing);
 
     std::ostringstream messages;
     if (!options.summaryFile.empty() || !options.reportFolder.empty()) {
-        writeRunFiles(options, run, exitStatus, started, startedAt, messages);
+        writeRunFiles(options, run, exitStatus, started, startedAt, listing.failure, messages);
     }
     printAfterBlocks(run, messages.str());
     return exitStatus;
