@@ -1,5 +1,7 @@
 #include "report/ListingFailure.h"
 
+#include "report/JsonMember.h"
+
 #include <cstddef>
 #include <vector>
 
@@ -112,6 +114,22 @@ std::string listingFailureText(ListingFailure const& failure) {
         text += " exited with status " + std::to_string(*failure.exitStatus);
     }
     return text + ": " + failure.message;
+}
+
+} // namespace report
+
+namespace report {
+
+std::string listingFailureText(nlohmann::ordered_json const& failure) {
+    auto const text = [&failure](char const* name) {
+        nlohmann::ordered_json const& value = member(failure, name);
+        return value.is_string() ? value.get<std::string>() : std::string();
+    };
+    nlohmann::ordered_json const& exitStatus = member(failure, "exit_status");
+    return listingFailureText(ListingFailure{
+        text("command"),
+        exitStatus.is_number_integer() ? std::optional<int>(exitStatus.get<int>()) : std::nullopt,
+        text("message")});
 }
 
 } // namespace report

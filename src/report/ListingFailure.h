@@ -1,9 +1,14 @@
 #pragma once
 
+#include <nlohmann/json.hpp>
+
 #include <optional>
 #include <string>
 
 namespace report {
+
+// How the report marks a machine, or a run, whose listing failed.
+inline constexpr char gc_ListingFailedName[] = "listing_failed";
 
 // A console listing command that failed: the machine listing of --all, or a
 // machine's partition listing. The listing code of the single-machine tool
@@ -33,5 +38,8 @@ ListingFailure stoppedListing(std::string const& trace, unsigned int timeoutSeco
 
 // One line for an operator: "<command> exited with status N: <message>".
 std::string listingFailureText(ListingFailure const& failure);
+// The same for a summary's "listing_failure" object, read as a report reads
+// any summary: a missing field is unknown.
+std::string listingFailureText(nlohmann::ordered_json const& failure);
 
 } // namespace report
