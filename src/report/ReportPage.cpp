@@ -1,6 +1,7 @@
 #include "report/ReportPage.h"
 
 #include "report/JsonMember.h"
+#include "report/ListingFailure.h"
 #include "report/Outcome.h"
 #include "report/PageAssets.h"
 #include "report/PageSkeleton.h"
@@ -114,6 +115,19 @@ std::string interruptionText(Json const& summary) {
     return " &middot; <b>interrupted by " + htmlText(interrupted) + "</b>";
 }
 
+// What the report says for a machine, or a run, whose listing failed: the
+// outcome's name, then the command, its exit status and the console's message.
+std::string listingFailureNote(Json const& failure) {
+    return std::string(gc_ListingFailedName) + ": " + escapeHtml(listingFailureText(failure));
+}
+
+// Beside the times: an interruption, and a machine listing that failed.
+std::string runNotesText(Json const& summary) {
+    Json const& failure = member(summary, "listing_failure");
+    return interruptionText(summary) +
+           (failure.is_null() ? "" : " &middot; <b>" + listingFailureNote(failure) + "</b>");
+}
+
 // One item per outcome; the page's script finds them by data-outcome, and
 // their class gives them the outcome's colour.
 void appendOutcomeTotals(std::string& page, Json const& totals) {
@@ -124,7 +138,8 @@ void appendOutcomeTotals(std::string& page, Json const& totals) {
     }
 }
 
-std::string barOf(Json const& counts) {
+// noneText describes a machine without partitions.
+std::string barOf(Json const& counts, std::string const& noneText) {
     long long const partitions = countOf(counts, "partitions");
     std::string bar = "<div class=\"bar\">";
     std::string described;
@@ -141,12 +156,14 @@ std::string barOf(Json const& counts) {
                "\" title=\"" + text + "\"></i>";
         described += (described.empty() ? "" : ", ") + text;
     }
-    return bar + "</div><td class=\"legend\">" + (described.empty() ? "none listed" : described);
+    return bar + "</div><td class=\"legend\">" + (described.empty() ? noneText : described);
 }
 
 void appendMachineRow(std::string& page, Json const& machine, std::size_t index) {
     std::string const identity = htmlText(member(machine, "identity"));
     std::string const code = htmlText(member(machine, "return_code"));
+    Json const& failure = member(machine, "listing_failure");
+    std::string const noneText = failure.is_null() ? "none listed" : listingFailureNote(failure);
     page += R"(<tr><th scope="row">)";
     if (member(machine, "partitions").empty()) {
         page += identity;
@@ -156,7 +173,7 @@ void appendMachineRow(std::string& page, Json const& machine, std::size_t index)
     }
     page += R"(<td class="code code)" + code + R"(">)" + code + R"(<td class="number">)" +
             std::to_string(countOf(member(machine, "counts"), "partitions")) +
-            R"(<td class="bar-cell">)" + barOf(member(machine, "counts")) + "\n";
+            R"(<td class="bar-cell">)" + barOf(member(machine, "counts"), noneText) + "\n";
 }
 
 void appendMachineRows(std::string& page, Json const& machines) {
@@ -265,7 +282,7 @@ std::vector<Placeholder> runPlaceholders(Json const& summary) {
         textPlaceholder("ended", htmlText(member(summary, "ended"))),
         textPlaceholder("elapsed-seconds", secondsText(member(summary, "elapsed_seconds"))),
         textPlaceholder("return-code", htmlText(member(summary, "return_code"))),
-        textPlaceholder("interruption", interruptionText(summary)),
+        textPlaceholder("interruption", runNotesText(summary)),
         textPlaceholder("options", optionsText(summary)),
         textPlaceholder("machine-count", std::to_string(countOf(totals, "machines"))),
         textPlaceholder("partition-count", std::to_string(countOf(totals, "partitions"))),

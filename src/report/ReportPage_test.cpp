@@ -220,4 +220,26 @@ TEST(ReportPage, RowMarkupStaysSmallForLargeConsoles) {
     EXPECT_LT(page(partitions).size(), 20U * 1000 * 1000 / 50);
 }
 
+TEST(ReportPage, AMachineWhoseListingFailedSaysListingFailedWithTheConsolesMessage) {
+    Json run = summary(Json::array());
+    run["machines"][0]["listing_failure"] = {{"command", "/opt/vtc/bin/lspartition -ix -c X"},
+                                             {"exit_status", 1},
+                                             {"message", "managed system <not> found"}};
+    std::string const html = report::reportPage(run, "../VPD");
+    EXPECT_NE(std::string::npos,
+              html.find("<td class=\"legend\">listing_failed: /opt/vtc/bin/lspartition -ix -c X "
+                        "exited with status 1: managed system &lt;not&gt; found\n"));
+}
+
+TEST(ReportPage, ARunWhoseMachineListingFailedSaysSoBesideItsTimes) {
+    Json run = summary(Json::array());
+    run["machines"] = Json::array();
+    run["listing_failure"] = {
+        {"command", "/opt/lsvtc/bin/lsvtc -t0"}, {"exit_status", 127}, {"message", "not found"}};
+    std::string const html = report::reportPage(run, "../VPD");
+    EXPECT_NE(std::string::npos,
+              html.find("overall code <b>4</b> &middot; <b>listing_failed: /opt/lsvtc/bin/lsvtc "
+                        "-t0 exited with status 127: not found</b>"));
+}
+
 } // namespace
