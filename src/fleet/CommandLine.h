@@ -18,6 +18,9 @@ struct Options {
     std::string reportFolder;
     bool quiet = false;
     bool all = false;
+    // --wait: wait for another run using the same result folder to end,
+    // rather than exit with gc_ExitTemporaryFailure.
+    bool waitForFolder = false;
     // As given, an identity given more than once kept at its first place.
     std::vector<std::string> identities;
 };

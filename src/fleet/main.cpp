@@ -1,5 +1,7 @@
 #include "fleet/CommandLine.h"
 #include "fleet/MachineListing.h"
+#include "fleet/RunFiles.h"
+#include "fleet/RunLock.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
@@ -10,12 +12,48 @@
 #include "utility/SystemError.h"
 #include "utility/Trace.h"
 
+#include <unistd.h>
+
 #include <chrono>
 #include <ctime>
+#include <filesystem>
 #include <iostream>
 #include <sstream>
 
 namespace {
+
+// Who holds the result folder, as a second run reads it in the lock file.
+std::string holderText() {
+    return "PID " + std::to_string(getpid()) + ", started " + util::localTimeText(std::time(nullptr));
+}
+
+// The holder as a message gives it; a run that has just made the file may
+// not have written itself into it yet.
+std::string holderOf(fleet::RunLock const& lock) {
+    std::string const holder = lock.holder();
+    return holder.empty() ? "its PID not written yet" : holder;
+}
+
+// One run per result folder, taken before any console command runs: nullopt
+// when this run may go on, else its exit status.
+std::optional<int> lockResultFolder(fleet::RunLock& lock, bool waitForFolder) {
+    if (lock.tryTake(holderText())) {
+        return std::nullopt;
+    }
+    std::string const folder = std::filesystem::path(lock.path()).parent_path().string();
+    if (!waitForFolder) {
+        std::cerr << report::gc_ProgramName << ": another run uses the result folder " << folder
+                  << ": " << holderOf(lock) << " (lock file " << lock.path()
+                  << "); try again later, or use --wait" << std::endl;
+        return fleet::gc_ExitTemporaryFailure;
+    }
+    std::cerr << report::gc_ProgramName << ": waiting for the run that uses " << folder << " ("
+              << holderOf(lock) << ") to end" << std::endl;
+    if (lock.waitToTake(holderText(), fleet::signalPipeDescriptor())) {
+        return std::nullopt;
+    }
+    return 128 + fleet::takeSignal();
+}
 
 // The machines to survey: those given, or with --all those the console
 // lists. A listing that fails is said at once, in one line.
@@ -98,6 +136,10 @@ int main(int argc, char** argv) {
     }
     if (std::optional<std::string> const failure = fleet::installSignalPipe()) {
         std::cerr << report::gc_ProgramName << ": " << *failure << std::endl;
+    }
+    fleet::RunLock lock(fleet::runLockPath());
+    if (std::optional<int> const refused = lockResultFolder(lock, parsed.options.waitForFolder)) {
+        return *refused;
     }
     auto const startedAt = std::chrono::steady_clock::now();
     std::time_t const started = std::time(nullptr);
