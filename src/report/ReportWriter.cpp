@@ -1,11 +1,20 @@
 #include "report/ReportWriter.h"
 
+#include "report/JsonMember.h"
 #include "report/PartitionsCsv.h"
 #include "report/ReportPage.h"
 #include "report/RunSummary.h"
 #include "utility/AtomicFile.h"
+#include "utility/FileText.h"
+#include "utility/LocalTime.h"
 #include "utility/SystemError.h"
 
+#include <sys/stat.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <ctime>
+#include <cstdio>
 #include <filesystem>
 
 namespace report {
@@ -25,6 +34,62 @@ std::string documentFolderFrom(std::string const& vpdFolder, std::string const& 
     return relative.empty() ? documents.generic_string() : relative.generic_string();
 }
 
+// The report's files, each kept beside the next report under the run time of
+// its own report as <stem>-<time><extension>.
+struct ReportFile {
+    char const* stem;
+    char const* extension;
+};
+constexpr ReportFile gc_ReportFiles[] = {
+    {"index", ".html"}, {"partitions", ".csv"}, {"summary", ".json"}};
+
+// The start of the run a report describes, as its summary says, else the
+// time its page was written; ISO 8601 without the colons that some file
+// systems and URLs refuse.
+std::string runTimeOfReport(std::string const& base) {
+    std::string started;
+    try {
+        nlohmann::ordered_json const summary =
+            nlohmann::ordered_json::parse(util::readWholeFileOrEmpty(base + "summary.json"));
+        if (member(summary, "started").is_string()) {
+            started = member(summary, "started").get<std::string>();
+        }
+    } catch (nlohmann::json::exception const&) {
+        // A summary that cannot be read leaves the page's time.
+    }
+    if (started.empty()) {
+        struct stat page {};
+        started = util::localTimeText(stat((base + "index.html").c_str(), &page) == 0
+                                          ? page.st_mtime
+                                          : std::time(nullptr));
+    }
+    started.erase(std::remove(started.begin(), started.end(), ':'), started.end());
+    return started;
+}
+
+// A time no kept report has yet: two reports of one second get "-2", "-3"...
+std::string freeRunTime(std::string const& base, std::string const& runTime) {
+    std::string candidate = runTime;
+    for (int next = 2; fs::exists(base + "index-" + candidate + ".html"); ++next) {
+        candidate = runTime + "-" + std::to_string(next);
+    }
+    return candidate;
+}
+
+void keepPreviousReport(std::string const& base) {
+    if (!fs::exists(base + "index.html")) {
+        return;
+    }
+    std::string const runTime = freeRunTime(base, runTimeOfReport(base));
+    for (ReportFile const& file : gc_ReportFiles) {
+        std::string const current = base + file.stem + file.extension;
+        std::string const kept = base + file.stem + "-" + runTime + file.extension;
+        if (fs::exists(current) && std::rename(current.c_str(), kept.c_str()) != 0) {
+            throw util::SystemError("rename", current, errno);
+        }
+    }
+}
+
 } // namespace
 
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
@@ -35,6 +100,7 @@ void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFo
         throw util::SystemError("create", folder, error.value());
     }
     std::string const base = fs::path(folder).string() + "/";
+    keepPreviousReport(base);
     writeFileAtomically(base + "summary.json", summaryText(summary));
     writeFileAtomically(base + "partitions.csv", partitionsCsv(summary));
     writeFileAtomically(base + "index.html",

@@ -11,6 +11,8 @@
 
 #include <cerrno>
 #include <filesystem>
+#include <regex>
+#include <vector>
 
 namespace {
 
@@ -55,6 +57,60 @@ TEST(ReportWriter, FolderUnderARegularFileThrowsCreateWithThePathAndEnotdir) {
     ASSERT_TRUE(error);
     EXPECT_EQ(ENOTDIR, error->errorNumber());
     EXPECT_EQ("cannot create " + folder + ": Not a directory", std::string(error->what()));
+}
+
+Json startedAt(std::string const& started) {
+    Json summary;
+    summary["started"] = started;
+    summary["machines"] = Json::array();
+    return summary;
+}
+
+TEST(ReportWriter, APreviousReportIsKeptUnderTheTimeItsRunStarted) {
+    QuorvexTest::TemporaryDirectory root;
+    report::writeReport(startedAt("2026-11-24T10:00:00+01:00"), root.file("VPD"),
+                        root.file("report"));
+    std::string const firstPage = QuorvexTest::readFile(root.file("report/index.html"));
+    report::writeReport(startedAt("2026-11-24T11:00:00+01:00"), root.file("VPD"),
+                        root.file("report"));
+    EXPECT_EQ(firstPage,
+              QuorvexTest::readFile(root.file("report/index-2026-11-24T100000+0100.html")));
+    EXPECT_TRUE(QuorvexTest::fileExists(root.file("report/partitions-2026-11-24T100000+0100.csv")));
+    EXPECT_NE(std::string::npos,
+              QuorvexTest::readFile(root.file("report/summary-2026-11-24T100000+0100.json"))
+                  .find("10:00:00"));
+    EXPECT_NE(std::string::npos,
+              QuorvexTest::readFile(root.file("report/summary.json")).find("11:00:00"));
+    EXPECT_EQ(6, std::distance(fs::directory_iterator(root.file("report")),
+                               fs::directory_iterator()));
+}
+
+TEST(ReportWriter, TwoKeptReportsOfOneRunTimeAreNumberedNeverReplaced) {
+    QuorvexTest::TemporaryDirectory root;
+    for (int run = 0; run < 3; ++run) {
+        report::writeReport(startedAt("2026-11-24T10:00:00Z"), root.file("VPD"),
+                            root.file("report"));
+    }
+    EXPECT_TRUE(QuorvexTest::fileExists(root.file("report/index-2026-11-24T100000Z.html")));
+    EXPECT_TRUE(QuorvexTest::fileExists(root.file("report/index-2026-11-24T100000Z-2.html")));
+    EXPECT_EQ(9, std::distance(fs::directory_iterator(root.file("report")),
+                               fs::directory_iterator()));
+}
+
+TEST(ReportWriter, APreviousPageWithoutSummaryIsKeptUnderItsModificationTime) {
+    QuorvexTest::TemporaryDirectory root;
+    fs::create_directories(root.file("report"));
+    QuorvexTest::writeFile(root.file("report/index.html"), "old page");
+    report::writeReport(startedAt("2026-11-24T11:00:00Z"), root.file("VPD"), root.file("report"));
+    std::vector<std::string> kept;
+    for (auto const& entry : fs::directory_iterator(root.file("report"))) {
+        if (QuorvexTest::readFile(entry.path().string()) == "old page") {
+            kept.push_back(entry.path().filename().string());
+        }
+    }
+    ASSERT_EQ(kept.size(), 1U);
+    EXPECT_TRUE(std::regex_match(kept.front(), std::regex(R"(index-\d{4}-\d\d-\d\dT\d{6}[-+]\d{4}\.html)")))
+        << kept.front();
 }
 
 } // namespace
