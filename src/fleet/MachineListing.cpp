@@ -63,9 +63,8 @@ MachineListing listInto(std::string const& tracePath, unsigned int timeoutSecond
     {
         // The pool ends a stopped worker with everything it started.
         WorkerPool pool(signalPipeDescriptor());
-        if (std::optional<std::string> const failure =
-                pool.start(0, UnitKind::MachineListing,
-                           [tracePath] { return listMachines(tracePath); })) {
+        if (std::optional<std::string> const failure = pool.start(
+                0, UnitKind::MachineListing, [tracePath] { return listMachines(tracePath); })) {
             return MachineListing{{}, failureOf(*failure)};
         }
         result = awaitListing(pool, limits);

@@ -24,7 +24,8 @@ namespace {
 
 // Who holds the result folder, as a second run reads it in the lock file.
 std::string holderText() {
-    return "PID " + std::to_string(getpid()) + ", started " + util::localTimeText(std::time(nullptr));
+    return "PID " + std::to_string(getpid()) + ", started " +
+           util::localTimeText(std::time(nullptr));
 }
 
 // The holder as a message gives it; a run that has just made the file may
@@ -72,8 +73,7 @@ fleet::MachineListing machinesToSurvey(fleet::Options const& options) {
 // A console whose machines cannot be listed is unavailable (sysexits.h's
 // EX_UNAVAILABLE), unless a signal ended the run first.
 int exitStatusOf(fleet::SurveyRun const& run, int runStatus, fleet::MachineListing const& listing) {
-    return listing.failure && run.interruptingSignal() == 0 ? fleet::gc_ExitUnavailable
-                                                            : runStatus;
+    return listing.failure && run.interruptingSignal() == 0 ? fleet::gc_ExitUnavailable : runStatus;
 }
 
 // The summary and the report of a run that has ended. What cannot be

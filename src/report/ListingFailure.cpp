@@ -18,8 +18,7 @@ constexpr char gc_StderrRedirection[] = " 2> ";
 constexpr char gc_ExitStatusMark[] = "RC = ";
 constexpr char gc_StdoutTitle[] = "STDOUT";
 constexpr char gc_StderrTitle[] = "STDERR";
-constexpr char gc_NotRun[] =
-    "the command did not run: its output files in /tmp could not be made";
+constexpr char gc_NotRun[] = "the command did not run: its output files in /tmp could not be made";
 constexpr char gc_NoMessage[] = "the console gave no message";
 
 std::vector<std::string> linesFrom(std::string const& text, std::size_t start) {
@@ -109,7 +108,8 @@ ListingFailure stoppedListing(std::string const& trace, unsigned int timeoutSeco
 }
 
 std::string listingFailureText(ListingFailure const& failure) {
-    std::string text = failure.command.empty() ? std::string("the listing command") : failure.command;
+    std::string text =
+        failure.command.empty() ? std::string("the listing command") : failure.command;
     if (failure.exitStatus) {
         text += " exited with status " + std::to_string(*failure.exitStatus);
     }

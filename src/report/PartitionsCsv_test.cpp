@@ -61,8 +61,8 @@ TEST(PartitionsCsv, BytesThatAreNotUtf8AreReplaced) {
 }
 
 Json const gc_Failure = {{"command", "/opt/vtc/bin/lspartition -ix -c 1-A_B"},
-                        {"exit_status", 1},
-                        {"message", "managed system not found, really"}};
+                         {"exit_status", 1},
+                         {"message", "managed system not found, really"}};
 
 TEST(PartitionsCsv, AMachineWhoseListingFailedHasARowSayingListingFailed) {
     Json summary = summaryWith(Json::object());

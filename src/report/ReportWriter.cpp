@@ -13,8 +13,8 @@
 
 #include <algorithm>
 #include <cerrno>
-#include <ctime>
 #include <cstdio>
+#include <ctime>
 #include <filesystem>
 
 namespace report {
@@ -59,9 +59,8 @@ std::string runTimeOfReport(std::string const& base) {
     }
     if (started.empty()) {
         struct stat page {};
-        started = util::localTimeText(stat((base + "index.html").c_str(), &page) == 0
-                                          ? page.st_mtime
-                                          : std::time(nullptr));
+        started = util::localTimeText(
+            stat((base + "index.html").c_str(), &page) == 0 ? page.st_mtime : std::time(nullptr));
     }
     started.erase(std::remove(started.begin(), started.end(), ':'), started.end());
     return started;

@@ -81,8 +81,8 @@ TEST(ReportWriter, APreviousReportIsKeptUnderTheTimeItsRunStarted) {
                   .find("10:00:00"));
     EXPECT_NE(std::string::npos,
               QuorvexTest::readFile(root.file("report/summary.json")).find("11:00:00"));
-    EXPECT_EQ(6, std::distance(fs::directory_iterator(root.file("report")),
-                               fs::directory_iterator()));
+    EXPECT_EQ(6,
+              std::distance(fs::directory_iterator(root.file("report")), fs::directory_iterator()));
 }
 
 TEST(ReportWriter, TwoKeptReportsOfOneRunTimeAreNumberedNeverReplaced) {
@@ -93,8 +93,8 @@ TEST(ReportWriter, TwoKeptReportsOfOneRunTimeAreNumberedNeverReplaced) {
     }
     EXPECT_TRUE(QuorvexTest::fileExists(root.file("report/index-2026-11-24T100000Z.html")));
     EXPECT_TRUE(QuorvexTest::fileExists(root.file("report/index-2026-11-24T100000Z-2.html")));
-    EXPECT_EQ(9, std::distance(fs::directory_iterator(root.file("report")),
-                               fs::directory_iterator()));
+    EXPECT_EQ(9,
+              std::distance(fs::directory_iterator(root.file("report")), fs::directory_iterator()));
 }
 
 TEST(ReportWriter, APreviousPageWithoutSummaryIsKeptUnderItsModificationTime) {
@@ -109,7 +109,8 @@ TEST(ReportWriter, APreviousPageWithoutSummaryIsKeptUnderItsModificationTime) {
         }
     }
     ASSERT_EQ(kept.size(), 1U);
-    EXPECT_TRUE(std::regex_match(kept.front(), std::regex(R"(index-\d{4}-\d\d-\d\dT\d{6}[-+]\d{4}\.html)")))
+    EXPECT_TRUE(
+        std::regex_match(kept.front(), std::regex(R"(index-\d{4}-\d\d-\d\dT\d{6}[-+]\d{4}\.html)")))
         << kept.front();
 }
 

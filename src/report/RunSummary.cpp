@@ -100,19 +100,19 @@ Json optionsDocument(SummaryOptions const& options) {
 
 Json summaryDocument(RunSummary const& summary) {
     Json document = {{"schema_version", gc_SchemaVersion},
-            {"tool", summary.tool},
-            {"version", QUORVEX_VERSION},
-            {"console_host", summary.consoleHost},
-            {"started", summary.started},
-            {"ended", summary.ended},
-            {"elapsed_seconds",
-             std::visit([](auto seconds) { return Json(seconds); }, summary.elapsedSeconds)},
-            {"options", optionsDocument(summary.options)},
-            {"interrupted", orNull(summary.interruptedBy)},
-            {"return_code", overallCode(summary.machines)},
-            {"exit_status", orNull(summary.exitStatus)},
-            {"totals", totalsOf(summary.machines)},
-            {"machines", arrayOf(summary.machines, &machineDocument)}};
+                     {"tool", summary.tool},
+                     {"version", QUORVEX_VERSION},
+                     {"console_host", summary.consoleHost},
+                     {"started", summary.started},
+                     {"ended", summary.ended},
+                     {"elapsed_seconds", std::visit([](auto seconds) { return Json(seconds); },
+                                                    summary.elapsedSeconds)},
+                     {"options", optionsDocument(summary.options)},
+                     {"interrupted", orNull(summary.interruptedBy)},
+                     {"return_code", overallCode(summary.machines)},
+                     {"exit_status", orNull(summary.exitStatus)},
+                     {"totals", totalsOf(summary.machines)},
+                     {"machines", arrayOf(summary.machines, &machineDocument)}};
     addListingFailure(document, summary.listingFailure);
     return document;
 }

@@ -27,9 +27,9 @@ protected:
     }
 
     std::vector<std::string> _survey(std::vector<std::string> const& arguments) const {
-        std::vector<std::string> argv{FleetTest::consoleWideTool(), "-q", "--summary",
-                                      _work.file("summary.json"), "--report",
-                                      _work.file("report")};
+        std::vector<std::string> argv{
+            FleetTest::consoleWideTool(), "-q",       "--summary",
+            _work.file("summary.json"),   "--report", _work.file("report")};
         argv.insert(argv.end(), arguments.begin(), arguments.end());
         return argv;
     }
@@ -55,9 +55,10 @@ protected:
 TEST_F(FleetListingFailure, AMissingMachineListingToolEndsWith69NamingTheCommand) {
     QuorvexTest::TemporaryDirectory const emptyBin;
     SimulatedConsole const console("");
-    CommandResult const result = QuorvexTest::runInSandbox(
-        {"--bind", emptyBin.path() + ":/opt/lsvtc/bin", "--bind", _work.path() + ":" + _work.path()},
-        _survey({"--all"}));
+    CommandResult const result =
+        QuorvexTest::runInSandbox({"--bind", emptyBin.path() + ":/opt/lsvtc/bin", "--bind",
+                                   _work.path() + ":" + _work.path()},
+                                  _survey({"--all"}));
     // What the shell says of a missing command is the shell's own text.
     std::string const failure = "/opt/lsvtc/bin/lsvtc -t0 exited with status 127: ";
     ASSERT_EQ(result.stderrText.rfind(gc_MachineListingFailed + failure, 0), 0U)
@@ -74,7 +75,8 @@ TEST_F(FleetListingFailure, AFailingMachineListingEndsWith69WithTheConsolesFirst
     SimulatedConsole const console("[lsvtc]\nstdout \nstderr lsvtc: console busy\n"
                                    "stderr second line\nexit 5\n");
     CommandResult const result = QuorvexTest::runCommand(_survey({"--all"}));
-    _expectUnavailable(result, "/opt/lsvtc/bin/lsvtc -t0 exited with status 5: lsvtc: console busy");
+    _expectUnavailable(result,
+                       "/opt/lsvtc/bin/lsvtc -t0 exited with status 5: lsvtc: console busy");
     FleetTest::SummaryFile const summary(_work.file("summary.json"));
     EXPECT_EQ(summary.field("/listing_failure"),
               R"({"command":"/opt/lsvtc/bin/lsvtc -t0","exit_status":5,)"
@@ -98,8 +100,8 @@ TEST_F(FleetListingFailure, ABadScenarioOfTheConsoleEndsWith69WithItsMessage) {
 TEST_F(FleetListingFailure, AnIdentityTheConsoleDoesNotKnowIsListingFailedWithTheConsolesText) {
     SimulatedConsole const console(
         QuorvexTest::ScenarioFile{QuorvexTest::shippedScenario("demo.scn")});
-    std::string const status = QuorvexTest::gc_VPD_Folder +
-                               std::string("/quorvexPYLON_VPD_Survey_ClientPartition_");
+    std::string const status =
+        QuorvexTest::gc_VPD_Folder + std::string("/quorvexPYLON_VPD_Survey_ClientPartition_");
     CommandResult const tool =
         QuorvexTest::runCommand({FleetTest::oneMachineTool(), "-c", "9119-MHE_21ABCDX"});
     std::string const toolStatus = QuorvexTest::readFile(status + "9119-MHE_21ABCDX.status");

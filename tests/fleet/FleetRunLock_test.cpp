@@ -90,7 +90,8 @@ TEST_F(FleetRunLock, WithWaitASecondRunGoesOnOnceTheFirstHasEnded) {
                          _work.file("stderr2"));
     ASSERT_TRUE(waitForText([this] { return textSoFar(_work.file("stderr2")); },
                             "quorvex-survey: waiting for the run that uses /var/adm/quorvex/VPD "
-                            "(PID " + std::to_string(first.pid()) + ", started "));
+                            "(PID " +
+                                std::to_string(first.pid()) + ", started "));
     EXPECT_EQ(console.invocations().size(), 1U) << "the waiting run called the console";
 
     first.signal(SIGTERM);
@@ -105,12 +106,13 @@ TEST_F(FleetRunLock, ASignalEndsTheWait) {
     ASSERT_TRUE(waitForText([&console] { return console.logText(); }, "lspartition"));
     SurveyProcess second({FleetTest::consoleWideTool(), "--all", "--wait"}, _work.file("stdout2"),
                          _work.file("stderr2"));
-    ASSERT_TRUE(waitForText([this] { return textSoFar(_work.file("stderr2")); },
-                            "waiting for the run"));
+    ASSERT_TRUE(
+        waitForText([this] { return textSoFar(_work.file("stderr2")); }, "waiting for the run"));
     second.signal(SIGINT);
     EXPECT_EQ(second.waitForExit(30.0), 128 + SIGINT);
     EXPECT_EQ(console.invocations().size(), 1U) << "the interrupted wait called the console";
-    EXPECT_TRUE(QuorvexTest::fileExists(gc_LockFile)) << "the waiting run removed the holder's lock";
+    EXPECT_TRUE(QuorvexTest::fileExists(gc_LockFile))
+        << "the waiting run removed the holder's lock";
 }
 
 TEST_F(FleetRunLock, ASecondReportIntoTheSameFolderKeepsTheFirst) {
