@@ -66,10 +66,16 @@ std::string runTimeOfReport(std::string const& base) {
     return started;
 }
 
+std::string keptName(std::string const& base, ReportFile const& file, std::string const& runTime) {
+    std::string name = base;
+    name.append(file.stem).append("-").append(runTime).append(file.extension);
+    return name;
+}
+
 // A time no kept report has yet: two reports of one second get "-2", "-3"...
 std::string freeRunTime(std::string const& base, std::string const& runTime) {
     std::string candidate = runTime;
-    for (int next = 2; fs::exists(base + "index-" + candidate + ".html"); ++next) {
+    for (int next = 2; fs::exists(keptName(base, {"index", ".html"}, candidate)); ++next) {
         candidate = runTime + "-" + std::to_string(next);
     }
     return candidate;
@@ -82,7 +88,7 @@ void keepPreviousReport(std::string const& base) {
     std::string const runTime = freeRunTime(base, runTimeOfReport(base));
     for (ReportFile const& file : gc_ReportFiles) {
         std::string const current = base + file.stem + file.extension;
-        std::string const kept = base + file.stem + "-" + runTime + file.extension;
+        std::string const kept = keptName(base, file, runTime);
         if (fs::exists(current) && std::rename(current.c_str(), kept.c_str()) != 0) {
             throw util::SystemError("rename", current, errno);
         }
