@@ -36,7 +36,10 @@ RunLock::~RunLock() {
 int RunLock::_open() const {
     int const descriptor =
         open(_path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW, gc_LockFileMode);
-    return descriptor >= 0 ? descriptor : open(_path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW);
+    if (descriptor >= 0) {
+        return descriptor;
+    }
+    return open(_path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW);
 }
 
 bool RunLock::_isStillThePath(int descriptor) const {

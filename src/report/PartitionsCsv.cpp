@@ -68,11 +68,12 @@ void appendListingFailure(std::string& csv, Json const& failure, std::string con
         return;
     }
     std::vector<std::string> row = {machine, machineCode, ""};
-    for (std::string const& column : partitionColumns()) {
-        row.push_back(column == "outcome"  ? std::string(gc_ListingFailedName)
-                      : column == "reason" ? validUtf8(listingFailureText(failure))
-                                           : std::string());
-    }
+    std::transform(partitionColumns().begin(), partitionColumns().end(), std::back_inserter(row),
+                   [&failure](std::string const& column) {
+                       return column == "outcome"  ? std::string(gc_ListingFailedName)
+                              : column == "reason" ? validUtf8(listingFailureText(failure))
+                                                   : std::string();
+                   });
     appendRow(csv, row);
 }
 

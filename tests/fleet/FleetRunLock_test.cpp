@@ -8,8 +8,10 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <csignal>
 #include <functional>
+#include <iterator>
 #include <thread>
 
 namespace {
@@ -122,12 +124,10 @@ TEST_F(FleetRunLock, ASecondReportIntoTheSameFolderKeepsTheFirst) {
     ASSERT_EQ(QuorvexTest::runCommand(survey).exitStatus, 8);
     std::string const firstPage = QuorvexTest::readFile(_work.file("report/index.html"));
     ASSERT_EQ(QuorvexTest::runCommand(survey).exitStatus, 8);
+    std::vector<std::string> const names = QuorvexTest::listFolder(_work.file("report"));
     std::vector<std::string> kept;
-    for (std::string const& name : QuorvexTest::listFolder(_work.file("report"))) {
-        if (name.rfind("index-", 0) == 0) {
-            kept.push_back(name);
-        }
-    }
+    std::copy_if(names.begin(), names.end(), std::back_inserter(kept),
+                 [](std::string const& name) { return name.rfind("index-", 0) == 0; });
     ASSERT_EQ(kept.size(), 1U);
     EXPECT_EQ(QuorvexTest::readFile(_work.file("report/" + kept.front())), firstPage);
     EXPECT_EQ(QuorvexTest::listFolder(_work.file("report")).size(), 6U);
