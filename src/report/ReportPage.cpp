@@ -1,14 +1,18 @@
 #include "report/ReportPage.h"
 
+#include "report/DocumentCopies.h"
 #include "report/JsonMember.h"
 #include "report/ListingFailure.h"
 #include "report/Outcome.h"
 #include "report/PageAssets.h"
 #include "report/PageSkeleton.h"
+#include "report/ReadableTime.h"
 #include "report/ReportCommand.h"
 #include "utility/TextSafety.h"
 
 #include <cstdio>
+#include <optional>
+#include <set>
 #include <vector>
 
 namespace report {
@@ -91,18 +95,37 @@ std::string urlPath(std::string const& path) {
     return encoded;
 }
 
+// A summary's time as people read it; the text as it is when it is no time
+// the page knows how to read.
+std::string timeText(Json const& value) {
+    std::optional<std::string> const readable =
+        value.is_string() ? readableTime(value.get<std::string>()) : std::nullopt;
+    return readable ? *readable : htmlText(value);
+}
+
+// The time in an element that keeps the summary's text for programs.
+std::string timeElement(Json const& value) {
+    if (!value.is_string()) {
+        return htmlText(value);
+    }
+    return "<time datetime=\"" + htmlText(value) + "\">" + timeText(value) + "</time>";
+}
+
+// Each option with its value, and each identity, is kept whole on its line
+// (a line may break after the "-" of "-j" or inside "9119-MHE_21ABCDE");
+// lines break between them.
 std::string optionsText(Json const& summary) {
     if (htmlText(member(summary, "tool")) != gc_ProgramName) {
         return "read from the files earlier runs left";
     }
     Json const& options = member(summary, "options");
-    std::string text = "-j " + htmlText(member(options, "jobs")) + " -t " +
-                       htmlText(member(options, "timeout_seconds"));
+    std::string text = "<span>-j " + htmlText(member(options, "jobs")) + "</span> <span>-t " +
+                       htmlText(member(options, "timeout_seconds")) + "</span>";
     if (member(options, "all").is_boolean() && member(options, "all").get<bool>()) {
-        return text + " --all";
+        return text + " <span>--all</span>";
     }
     for (Json const& identity : member(options, "identities")) {
-        text += " " + htmlText(identity);
+        text += " <span>" + htmlText(identity) + "</span>";
     }
     return text;
 }
@@ -115,17 +138,15 @@ std::string interruptionText(Json const& summary) {
     return " &middot; <b>interrupted by " + htmlText(interrupted) + "</b>";
 }
 
-// What the report says for a machine, or a run, whose listing failed: the
-// outcome's name, then the command, its exit status and the console's message.
-std::string listingFailureNote(Json const& failure) {
-    return std::string(gc_ListingFailedName) + ": " + escapeHtml(listingFailureText(failure));
-}
-
-// Beside the times: an interruption, and a machine listing that failed.
+// Beside the times: an interruption, and a machine listing (--all) that
+// failed, with the command, its exit status and the console's message.
 std::string runNotesText(Json const& summary) {
     Json const& failure = member(summary, "listing_failure");
+    if (failure.is_null()) {
+        return interruptionText(summary);
+    }
     return interruptionText(summary) +
-           (failure.is_null() ? "" : " &middot; <b>" + listingFailureNote(failure) + "</b>");
+           " &middot; <b>listing failed</b>: " + escapeHtml(listingFailureText(failure));
 }
 
 // One item per outcome; the page's script finds them by data-outcome, and
@@ -138,8 +159,9 @@ void appendOutcomeTotals(std::string& page, Json const& totals) {
     }
 }
 
-// noneText describes a machine without partitions.
-std::string barOf(Json const& counts, std::string const& noneText) {
+// A machine's counts under its bar: one item per outcome present, kept
+// whole on its line ("1 channel failure"), so the cell wraps between items.
+std::string barOf(Json const& counts) {
     long long const partitions = countOf(counts, "partitions");
     std::string bar = "<div class=\"bar\">";
     std::string described;
@@ -154,17 +176,29 @@ std::string barOf(Json const& counts, std::string const& noneText) {
         std::string const text = std::to_string(count) + " " + outcome.label;
         bar += "<i class=\"" + std::string(outcome.pageClass) + "\" style=\"width:" + width +
                "\" title=\"" + text + "\"></i>";
-        described += (described.empty() ? "" : ", ") + text;
+        described += "<span><span class=\"key " + std::string(outcome.pageClass) + "\"></span>" +
+                     text + "</span> ";
     }
-    return bar + "</div><td class=\"legend\">" + (described.empty() ? noneText : described);
+    return bar + "</div><p class=\"counts\">" +
+           (described.empty() ? "none listed" : described.substr(0, described.size() - 1)) + "</p>";
+}
+
+// A machine whose partitions the console could not list: the command, its
+// exit status and the console's message, in place of the counts.
+std::string listingFailure(Json const& failure) {
+    return R"(<div class="bar listing-failed"></div><p class="counts"><b>listing failed</b>: )" +
+           escapeHtml(listingFailureText(failure)) + "</p>";
+}
+
+bool listingFailed(Json const& machine) {
+    return !member(machine, "listing_failure").is_null();
 }
 
 void appendMachineRow(std::string& page, Json const& machine, std::size_t index) {
     std::string const identity = htmlText(member(machine, "identity"));
     std::string const code = htmlText(member(machine, "return_code"));
-    Json const& failure = member(machine, "listing_failure");
-    std::string const noneText = failure.is_null() ? "none listed" : listingFailureNote(failure);
-    page += R"(<tr><th scope="row">)";
+    page += listingFailed(machine) ? R"(<tr class="listing-failed"><th scope="row">)"
+                                   : R"(<tr><th scope="row">)";
     if (member(machine, "partitions").empty()) {
         page += identity;
     } else {
@@ -173,7 +207,10 @@ void appendMachineRow(std::string& page, Json const& machine, std::size_t index)
     }
     page += R"(<td class="code code)" + code + R"(">)" + code + R"(<td class="number">)" +
             std::to_string(countOf(member(machine, "counts"), "partitions")) +
-            R"(<td class="bar-cell">)" + barOf(member(machine, "counts"), noneText) + "\n";
+            R"(<td class="bar-cell">)" +
+            (listingFailed(machine) ? listingFailure(member(machine, "listing_failure"))
+                                    : barOf(member(machine, "counts"))) +
+            "\n";
 }
 
 void appendMachineRows(std::string& page, Json const& machines) {
@@ -184,11 +221,14 @@ void appendMachineRows(std::string& page, Json const& machines) {
     }
 }
 
+// The outcomes' keys, and the mark of a machine whose listing failed, each
+// key kept on the line of its name.
 void appendOutcomeKeys(std::string& page) {
     for (OutcomeText const& outcome : outcomeTable()) {
-        page +=
-            "<span class=\"key " + std::string(outcome.pageClass) + "\"></span>" + outcome.label;
+        page += "<span><span class=\"key " + std::string(outcome.pageClass) + "\"></span>" +
+                outcome.label + "</span> ";
     }
+    page += R"(<span><span class="key listing-failed"></span>listing failed</span>)";
 }
 
 // The filter's boxes: the value is the class of the rows a box keeps.
@@ -212,13 +252,18 @@ void appendMachineOptions(std::string& page, Json const& machines) {
     }
 }
 
-std::string documentLink(Json const& document, std::string const& documentFolder) {
-    if (!document.is_string()) {
+// A link to the document's copy beside the page; none for a document that
+// was not copied, as the link would lead nowhere.
+std::string documentLink(Json const& document, std::set<std::string> const& linkedDocuments) {
+    if (!document.is_string() || linkedDocuments.count(document.get<std::string>()) == 0) {
         return "";
     }
-    std::string const path = document.get<std::string>();
-    std::string const file = path.substr(path.rfind('/') + 1);
-    return "<a href=\"" + escapeHtml(urlPath(documentFolder + "/" + file)) + "\">XML</a>";
+    std::optional<std::string> const file = documentFileName(document.get<std::string>());
+    if (!file) {
+        return "";
+    }
+    return "<a href=\"" + escapeHtml(urlPath(std::string(gc_DocumentFolder) + "/" + *file)) +
+           "\">XML</a>";
 }
 
 std::string reasonDetails(Json const& reason) {
@@ -232,7 +277,7 @@ std::string reasonDetails(Json const& reason) {
 // Cells are left open (HTML closes them) to keep 50,000 rows small; only
 // the cells the style sheet colours or aligns carry a class.
 void appendPartitionRow(std::string& page, Json const& partition, std::string const& identity,
-                        std::string const& anchor, std::string const& documentFolder) {
+                        std::string const& anchor, std::set<std::string> const& linkedDocuments) {
     RowOutcome const outcome = rowOutcome(member(partition, "outcome"));
     page += "<tr" + anchor + " class=" + outcome.pageClass + "><td>" + identity +
             "<td class=number>" + htmlText(member(partition, "id")) + "<td>" +
@@ -240,7 +285,7 @@ void appendPartitionRow(std::string& page, Json const& partition, std::string co
             "<td class=outcome>" + outcome.label + "<td>" +
             htmlText(member(partition, "status_text")) + "<td class=number>" +
             secondsText(member(partition, "seconds")) + "<td>" +
-            documentLink(member(partition, "document"), documentFolder) + "<td>" +
+            documentLink(member(partition, "document"), linkedDocuments) + "<td>" +
             reasonDetails(member(partition, "reason"));
     // The row is closed before the line end: left open, the line end would
     // belong to the last cell, and an empty reason cell would lose the dash
@@ -249,13 +294,13 @@ void appendPartitionRow(std::string& page, Json const& partition, std::string co
 }
 
 void appendPartitionRows(std::string& page, Json const& machines,
-                         std::string const& documentFolder) {
+                         std::set<std::string> const& linkedDocuments) {
     std::size_t index = 0;
     for (Json const& machine : machines) {
         std::string const identity = htmlText(member(machine, "identity"));
         std::string anchor = " id=m" + std::to_string(index);
         for (Json const& partition : member(machine, "partitions")) {
-            appendPartitionRow(page, partition, identity, anchor, documentFolder);
+            appendPartitionRow(page, partition, identity, anchor, linkedDocuments);
             anchor.clear();
         }
         ++index;
@@ -278,8 +323,9 @@ std::vector<Placeholder> runPlaceholders(Json const& summary) {
     Json const& totals = member(summary, "totals");
     return {
         textPlaceholder("console-host", htmlText(member(summary, "console_host"))),
-        textPlaceholder("started", htmlText(member(summary, "started"))),
-        textPlaceholder("ended", htmlText(member(summary, "ended"))),
+        textPlaceholder("started", timeElement(member(summary, "started"))),
+        textPlaceholder("ended", timeElement(member(summary, "ended"))),
+        textPlaceholder("started-text", timeText(member(summary, "started"))),
         textPlaceholder("elapsed-seconds", secondsText(member(summary, "elapsed_seconds"))),
         textPlaceholder("return-code", htmlText(member(summary, "return_code"))),
         textPlaceholder("interruption", runNotesText(summary)),
@@ -296,7 +342,7 @@ std::vector<Placeholder> runPlaceholders(Json const& summary) {
 
 } // namespace
 
-std::string reportPage(Json const& summary, std::string const& documentFolder) {
+std::string reportPage(Json const& summary, std::set<std::string> const& linkedDocuments) {
     Json const& machines = member(summary, "machines");
     std::vector<Placeholder> placeholders = runPlaceholders(summary);
     placeholders.push_back(
@@ -307,7 +353,7 @@ std::string reportPage(Json const& summary, std::string const& documentFolder) {
                                 appendMachineOptions(page, machines);
                             }});
     placeholders.push_back({"partition-rows", [&](std::string& page) {
-                                appendPartitionRows(page, machines, documentFolder);
+                                appendPartitionRows(page, machines, linkedDocuments);
                             }});
     std::string page;
     page.reserve(expectedSize(summary));

@@ -2,6 +2,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include <set>
 #include <string>
 
 namespace report {
@@ -12,8 +13,10 @@ namespace report {
 // a stacked bar of its outcomes, its code and a link to its first partition
 // row; the table of every partition with its reason in a <details> element.
 // The script only adds sorting, filters and paging. Every console text is
-// escaped for HTML. documentFolder is the folder of the VPD documents as a
-// URL relative to the page ("../VPD"); each document links to its file there.
-std::string reportPage(nlohmann::ordered_json const& summary, std::string const& documentFolder);
+// escaped for HTML. linkedDocuments are the documents, as the summary names
+// them, that have a copy in the report folder's documents/ (copyDocuments());
+// each links to its copy relative to the page.
+std::string reportPage(nlohmann::ordered_json const& summary,
+                       std::set<std::string> const& linkedDocuments);
 
 } // namespace report

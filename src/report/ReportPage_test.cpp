@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include <regex>
+#include <set>
 
 namespace {
 
@@ -55,8 +56,17 @@ Json summary(Json partitions) {
         {"machines", Json::array({machine})}};
 }
 
+// Every document named is linked, as though each had been copied.
+std::set<std::string> documentsOf(Json const& partitions) {
+    std::set<std::string> documents;
+    for (Json const& partition : partitions) {
+        documents.insert(partition["document"].get<std::string>());
+    }
+    return documents;
+}
+
 std::string page(Json const& partitions) {
-    return report::reportPage(summary(partitions), "../VPD");
+    return report::reportPage(summary(partitions), documentsOf(partitions));
 }
 
 std::size_t occurrences(std::string const& text, std::string const& what) {
@@ -81,9 +91,16 @@ TEST(ReportPage, IsOneDocumentWithStyleAndScriptInlineAndNothingFetched) {
 TEST(ReportPage, HeaderShowsConsoleTimesOptionsAndTotals) {
     std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
     EXPECT_NE(std::string::npos, html.find("of console console&lt;1&gt;</span>"));
-    EXPECT_NE(std::string::npos, html.find("Started <b>2026-11-23T14:05:09+01:00</b>, ended "
-                                           "<b>2026-11-23T14:06:10+01:00</b> (61.0 s)"));
-    EXPECT_NE(std::string::npos, html.find("options: <b>-j 8 -t 1800 --all</b>"));
+    EXPECT_NE(std::string::npos,
+              html.find("Started <b><time datetime=\"2026-11-23T14:05:09+01:00\">Mon 23 Nov 2026 "
+                        "14:05:09 UTC+01:00</time></b>, ended <b><time "
+                        "datetime=\"2026-11-23T14:06:10+01:00\">Mon 23 Nov 2026 14:06:10 "
+                        "UTC+01:00</time></b> (61.0&nbsp;s)"));
+    EXPECT_NE(std::string::npos,
+              html.find("<title>Partition survey of console&lt;1&gt;, Mon 23 Nov 2026 14:05:09 "
+                        "UTC+01:00</title>"));
+    EXPECT_NE(std::string::npos, html.find("options: <b class=\"options\"><span>-j 8</span> "
+                                           "<span>-t 1800</span> <span>--all</span></b>"));
     EXPECT_NE(
         std::string::npos,
         html.find("<li class=\"c\" data-outcome=\"channel_failure\"><b>1</b>channel failure"));
@@ -125,19 +142,34 @@ TEST(ReportPage, FullTableIsInsideNoscriptForTheScriptToRead) {
     EXPECT_LT(html.find("<div id=\"live-rows\"></div>"), start);
 }
 
-TEST(ReportPage, DocumentsLinkRelativeToThePage) {
+TEST(ReportPage, TimeThatIsNoIsoTimeShowsAsItIs) {
+    Json odd = summary(Json::array());
+    odd["started"] = "yesterday <noon>";
+    std::string const html = report::reportPage(odd, {});
+    EXPECT_NE(std::string::npos,
+              html.find("Started <b><time datetime=\"yesterday &lt;noon&gt;\">yesterday "
+                        "&lt;noon&gt;</time></b>"));
+}
+
+TEST(ReportPage, DocumentsLinkToTheirCopiesBesideThePage) {
     std::string const html = page(Json::array({partitionEntry("1", "a", "surveyed")}));
-    EXPECT_NE(
-        std::string::npos,
-        html.find("<a href=\"../VPD/quorvexPYLON_VPD_Survey_ClientPartition_1-A_S-1.VPD.xml\">"
-                  "XML</a>"));
+    EXPECT_NE(std::string::npos,
+              html.find("<a href=\"documents/quorvexPYLON_VPD_Survey_ClientPartition_1-A_S-1.VPD."
+                        "xml\">XML</a>"));
+}
+
+TEST(ReportPage, DocumentWithoutACopyHasNoLink) {
+    Json const partitions = Json::array({partitionEntry("1", "a", "surveyed")});
+    std::string const html = report::reportPage(summary(partitions), {});
+    EXPECT_EQ(std::string::npos, html.find("XML</a>"));
+    EXPECT_NE(std::string::npos, html.find("<td class=number>2.5<td><td>"));
 }
 
 TEST(ReportPage, DocumentLinkEncodesCharactersThatAreSpecialInUrls) {
     Json odd = partitionEntry("1", "a", "surveyed");
     odd["document"] = "VPD/x #?%\"<.VPD.xml";
     std::string const html = page(Json::array({odd}));
-    EXPECT_NE(std::string::npos, html.find("href=\"../VPD/x%20%23%3F%25%22%3C.VPD.xml\""));
+    EXPECT_NE(std::string::npos, html.find("href=\"documents/x%20%23%3F%25%22%3C.VPD.xml\""));
 }
 
 TEST(ReportPage, ReasonOnlyOnDemandAndOnlyForFailures) {
@@ -152,18 +184,42 @@ TEST(ReportPage, MachineBarHasOneSegmentPerOutcomePresent) {
     EXPECT_NE(std::string::npos,
               html.find("<div class=\"bar\"><i class=\"s\" style=\"width:50.000%\" title=\"1 "
                         "surveyed\"></i><i class=\"c\" style=\"width:50.000%\" title=\"1 channel "
-                        "failure\"></i></div><td class=\"legend\">1 surveyed, 1 channel failure"));
+                        "failure\"></i></div><p class=\"counts\"><span><span class=\"key "
+                        "s\"></span>1 surveyed</span> <span><span class=\"key c\"></span>1 "
+                        "channel failure</span></p>"));
+}
+
+TEST(ReportPage, MachineWhoseListingFailedShowsTheConsolesMessageInPlaceOfCounts) {
+    Json failed = summary(Json::array());
+    failed["machines"][0]["listing_failure"] = {{"command", "/opt/vtc/bin/lspartition -ix -c X"},
+                                                {"exit_status", 1},
+                                                {"message", "managed system <not> found"}};
+    std::string const html = report::reportPage(failed, {});
+    EXPECT_NE(std::string::npos, html.find("<tr class=\"listing-failed\"><th scope=\"row\">1-A_S"));
+    EXPECT_NE(std::string::npos,
+              html.find("<div class=\"bar listing-failed\"></div><p class=\"counts\"><b>listing "
+                        "failed</b>: /opt/vtc/bin/lspartition -ix -c X exited with status 1: "
+                        "managed system &lt;not&gt; found</p>"));
+}
+
+TEST(ReportPage, MachineWithoutListingFailureHasCountsAndNoMark) {
+    Json listed = summary(Json::array());
+    listed["machines"][0]["listing_failure"] = nullptr;
+    std::string const html = report::reportPage(listed, {});
+    EXPECT_EQ(std::string::npos, html.find("<tr class=\"listing-failed\">"));
+    EXPECT_EQ(std::string::npos, html.find("<div class=\"bar listing-failed\">"));
+    EXPECT_NE(std::string::npos, html.find("<tr><th scope=\"row\">1-A_S"));
 }
 
 TEST(ReportPage, SummaryWithFieldsMissingStillGivesAPage) {
-    std::string const html = report::reportPage(Json::object(), "../VPD");
+    std::string const html = report::reportPage(Json::object(), {});
     EXPECT_NE(std::string::npos, html.find("</html>"));
     EXPECT_NE(std::string::npos, html.find("read from the files earlier runs left"));
 }
 
 TEST(ReportPage, EveryPlaceholderOfTheSkeletonIsFilled) {
     std::string const full = page(Json::array({partitionEntry("1", "a", "surveyed")}));
-    std::string const empty = report::reportPage(Json::object(), "../VPD");
+    std::string const empty = report::reportPage(Json::object(), {});
     EXPECT_FALSE(report::placeholderNames(report::gc_PageSkeleton).empty());
     EXPECT_EQ(std::string::npos, full.find("<!--{{"));
     EXPECT_EQ(std::string::npos, empty.find("<!--{{"));
@@ -220,26 +276,14 @@ TEST(ReportPage, RowMarkupStaysSmallForLargeConsoles) {
     EXPECT_LT(page(partitions).size(), 20U * 1000 * 1000 / 50);
 }
 
-TEST(ReportPage, AMachineWhoseListingFailedSaysListingFailedWithTheConsolesMessage) {
-    Json run = summary(Json::array());
-    run["machines"][0]["listing_failure"] = {{"command", "/opt/vtc/bin/lspartition -ix -c X"},
-                                             {"exit_status", 1},
-                                             {"message", "managed system <not> found"}};
-    std::string const html = report::reportPage(run, "../VPD");
-    EXPECT_NE(std::string::npos,
-              html.find("<td class=\"legend\">listing_failed: /opt/vtc/bin/lspartition -ix -c X "
-                        "exited with status 1: managed system &lt;not&gt; found\n"));
-}
-
 TEST(ReportPage, ARunWhoseMachineListingFailedSaysSoBesideItsTimes) {
     Json run = summary(Json::array());
     run["machines"] = Json::array();
     run["listing_failure"] = {
         {"command", "/opt/lsvtc/bin/lsvtc -t0"}, {"exit_status", 127}, {"message", "not found"}};
-    std::string const html = report::reportPage(run, "../VPD");
-    EXPECT_NE(std::string::npos,
-              html.find("overall code <b>4</b> &middot; <b>listing_failed: /opt/lsvtc/bin/lsvtc "
-                        "-t0 exited with status 127: not found</b>"));
+    std::string const html = report::reportPage(run, {});
+    EXPECT_NE(std::string::npos, html.find("<b>listing failed</b>: /opt/lsvtc/bin/lsvtc -t0 exited "
+                                           "with status 127: not found"));
 }
 
 } // namespace

@@ -1,5 +1,6 @@
 #include "report/ReportWriter.h"
 
+#include "report/DocumentCopies.h"
 #include "report/JsonMember.h"
 #include "report/PartitionsCsv.h"
 #include "report/ReportPage.h"
@@ -25,13 +26,12 @@ namespace fs = std::filesystem;
 
 namespace {
 
-// The documents' folder as seen from the report's folder, "/"-separated.
-std::string documentFolderFrom(std::string const& vpdFolder, std::string const& folder) {
+void createFolder(std::string const& folder) {
     std::error_code error;
-    fs::path const documents = fs::weakly_canonical(fs::absolute(vpdFolder), error);
-    fs::path const report = fs::weakly_canonical(fs::absolute(folder), error);
-    fs::path const relative = documents.lexically_relative(report);
-    return relative.empty() ? documents.generic_string() : relative.generic_string();
+    fs::create_directories(folder, error);
+    if (error) {
+        throw util::SystemError("create", folder, error.value());
+    }
 }
 
 // The report's files, each kept beside the next report under the run time of
@@ -99,17 +99,16 @@ void keepPreviousReport(std::string const& base) {
 
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
                  std::string const& folder) {
-    std::error_code error;
-    fs::create_directories(folder, error);
-    if (error) {
-        throw util::SystemError("create", folder, error.value());
-    }
+    createFolder(folder);
     std::string const base = fs::path(folder).string() + "/";
     keepPreviousReport(base);
+    // Made even when no document is named: every report folder has the
+    // same shape.
+    createFolder(base + gc_DocumentFolder);
     writeFileAtomically(base + "summary.json", summaryText(summary));
     writeFileAtomically(base + "partitions.csv", partitionsCsv(summary));
-    writeFileAtomically(base + "index.html",
-                        reportPage(summary, documentFolderFrom(vpdFolder, folder)));
+    std::set<std::string> const copied = copyDocuments(summary, vpdFolder, folder);
+    writeFileAtomically(base + "index.html", reportPage(summary, copied));
 }
 
 } // namespace report

@@ -8,8 +8,9 @@ namespace report {
 
 // Writes the report of a summary into folder (made when missing):
 // index.html, partitions.csv and summary.json, each through a temporary
-// name renamed when complete. vpdFolder is where the summary's documents
-// lie; the page links to them relative to folder. Throws util::SystemError
+// name renamed when complete, and a copy of each document the summary names
+// from vpdFolder in folder/documents, where the page links to them: the
+// folder holds all the page needs wherever it is copied. Throws util::SystemError
 // when the folder cannot be made or a file cannot be written.
 //
 // A folder that already holds a report keeps it: its index.html,

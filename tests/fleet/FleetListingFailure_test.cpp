@@ -134,8 +134,9 @@ TEST_F(FleetListingFailure, AnIdentityTheConsoleDoesNotKnowIsListingFailedWithTh
               std::string::npos)
         << csv;
     EXPECT_NE(QuorvexTest::readFile(_work.file("report/index.html"))
-                  .find("listing_failed: /opt/vtc/bin/lspartition -ix -c 9119-MHE_21ABCDX exited "
-                        "with status 1: lspartition: managed system not found"),
+                  .find("<b>listing failed</b>: /opt/vtc/bin/lspartition -ix -c "
+                        "9119-MHE_21ABCDX exited with status 1: lspartition: managed system "
+                        "not found"),
               std::string::npos);
 }
 

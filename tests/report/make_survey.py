@@ -22,6 +22,8 @@ import sys
 MACHINES = ["9119-MHE_21ABCDE", "8286-42A_10XYZ99", "1234-ABC_10ABCDE"]
 HANGING_MACHINE = "7063-CR2_06SLOW1"
 MARKUP_HOST = "<img src=x onerror=alert(1)>"
+# UTC+05:30.
+RUN_ZONE = "<+0530>-05:30"
 
 
 def fetched_document(machine, partition_id, host):
@@ -109,9 +111,12 @@ def main():
             sys.stderr.write(f"{' '.join(command)} ended with {run.returncode}:\n"
                              f"{run.stderr.decode(errors='replace')}")
             return 1
+    # The report's times in a zone of their own, half an hour off any whole
+    # hour (POSIX form: no time zone files needed), so that a test can tell
+    # them from UTC and from a reader's zone.
     report = subprocess.run(
         [args.fleet, "report", "--from", os.path.join(out, "VPD"), os.path.join(out, "report")],
-        capture_output=True, check=False)
+        env=dict(os.environ, TZ=RUN_ZONE), capture_output=True, check=False)
     if report.returncode != 0:
         sys.stderr.write(report.stderr.decode(errors="replace"))
         return 1

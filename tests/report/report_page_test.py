@@ -8,6 +8,7 @@ Usage: report_page_test.py REPORT_FOLDER TEST_NAME
 Exit status 0 passed, 1 failed, 77 skipped (the reason is printed).
 """
 import csv
+import datetime
 import io
 import json
 import os
@@ -16,6 +17,7 @@ import shutil
 import sys
 import tempfile
 import unittest
+import urllib.parse
 
 SKIP = 77
 MARKUP_HOST = "<img src=x onerror=alert(1)>"
@@ -47,7 +49,7 @@ def browser_missing():
     return None
 
 
-def start_chromium(profile, script=True):
+def start_chromium(profile, script=True, environment=None):
     from selenium import webdriver  # pylint: disable=import-outside-toplevel
     from selenium.webdriver.chrome.service import Service  # pylint: disable=import-outside-toplevel
     options = webdriver.ChromeOptions()
@@ -59,7 +61,8 @@ def start_chromium(profile, script=True):
         options.add_argument(argument)
     if not script:
         options.add_argument("--blink-settings=scriptEnabled=false")
-    driver = webdriver.Chrome(service=Service(shutil.which("chromedriver")), options=options)
+    service = Service(shutil.which("chromedriver"), env=environment)
+    driver = webdriver.Chrome(service=service, options=options)
     # Any alert the page might raise is recorded instead of shown.
     driver.execute_cdp_cmd("Page.addScriptToEvaluateOnNewDocument", {
         "source": "window.__alerts = []; window.alert = function (m) { window.__alerts.push(String(m)); };"})
@@ -292,6 +295,216 @@ class PageTest(unittest.TestCase):
             self.assertEqual("none", filters["result"]["value"])
         finally:
             driver.quit()
+
+
+# Where a text of the page is laid out on more lines than one: every
+# word (a run of non-blanks of one text node: an ID, a host name, an IP, a
+# heading's word) of the elements of arguments[0], and the whole text of
+# those of arguments[1]. Each finding names the element and the text.
+BROKEN_TEXTS = """
+// Boxes that overlap from top to bottom share a line: a key beside a text
+// sits lower than the text's top but on its line.
+function lineCount(range) {
+    const boxes = Array.from(range.getClientRects()).filter(r => r.width > 0 && r.height > 0);
+    boxes.sort((a, b) => a.top - b.top);
+    let lines = 0;
+    let bottom = -Infinity;
+    for (const box of boxes) {
+        if (box.top >= bottom - 1) { lines += 1; bottom = box.bottom; }
+        bottom = Math.max(bottom, box.bottom);
+    }
+    return lines;
+}
+function where(element) {
+    return element.tagName + ' ' + JSON.stringify(element.textContent.trim().slice(0, 60));
+}
+const found = [];
+for (const element of document.querySelectorAll(arguments[0])) {
+    const walker = document.createTreeWalker(element, NodeFilter.SHOW_TEXT);
+    for (let node = walker.nextNode(); node; node = walker.nextNode()) {
+        for (const word of node.data.matchAll(/\\S+/g)) {
+            const range = document.createRange();
+            range.setStart(node, word.index);
+            range.setEnd(node, word.index + word[0].length);
+            if (lineCount(range) > 1) { found.push('word ' + word[0] + ' broken in ' + where(element)); }
+        }
+    }
+}
+for (const element of document.querySelectorAll(arguments[1])) {
+    const range = document.createRange();
+    range.selectNodeContents(element);
+    if (lineCount(range) > 1) { found.push('more than one line: ' + where(element)); }
+}
+return found;
+"""
+
+# Texts whose words must stay whole: everything a person reads.
+WORDS = "h1, h2, .run, .totals li, .machines th, .machines td, #reading dt, #reading dd, " \
+        "#filters label, #parts th, #parts td"
+# Texts that must stay on one line: headings of columns, a partition's cells
+# (of a reason, its summary: its text is laid out even while closed), a
+# machine's identity, code and count, each outcome count, each key with its
+# name, a total, a time, an option.
+ONE_LINE = "#parts thead th, #parts tbody td:not(:has(details)), #parts summary, .machines th, " \
+           ".machines td.code, .machines td.number, .counts > span, .keys > span, .totals li b, " \
+           "time, .options span, #reading dt"
+# Boxes whose content must not be cut off: headings and the cells.
+NOT_CUT = "h1, h2, th, td, #reading dt, .totals li"
+
+
+class LayoutTest(unittest.TestCase):
+    """The page at the widths people read it at, from a small laptop to a
+    large screen: no word broken across lines, no heading cut off, and the
+    page itself no wider than the window (a table too wide scrolls inside
+    it)."""
+    driver = None
+    maxDiff = None
+
+    @classmethod
+    def setUpClass(cls):
+        reason = browser_missing()
+        if reason:
+            raise unittest.SkipTest(reason)
+        cls.profile = tempfile.mkdtemp(prefix="report-chromium-")
+        cls.driver = start_chromium(cls.profile)
+
+    @classmethod
+    def tearDownClass(cls):
+        if cls.driver is not None:
+            cls.driver.quit()
+            shutil.rmtree(cls.profile, ignore_errors=True)
+
+    def check_width(self, width):
+        self.driver.execute_cdp_cmd("Emulation.setDeviceMetricsOverride", {
+            "width": width, "height": 1000, "deviceScaleFactor": 1, "mobile": False})
+        self.driver.get("file://" + os.path.join(REPORT, "index.html"))
+        self.assertEqual(width, self.driver.execute_script("return window.innerWidth;"))
+        self.assertEqual([], self.driver.execute_script(BROKEN_TEXTS, WORDS, ONE_LINE))
+        cut = self.driver.execute_script(
+            "return Array.from(document.querySelectorAll(arguments[0]))"
+            ".filter(e => e.scrollWidth > e.clientWidth).map(e => e.textContent.trim());",
+            NOT_CUT)
+        self.assertEqual([], cut)
+        self.assertLessEqual(self.driver.execute_script(
+            "return document.documentElement.scrollWidth;"), width)
+        # Opened, the reasons wrap between their words only.
+        self.driver.execute_script(
+            "document.querySelectorAll('#parts details').forEach(d => { d.open = true; });")
+        self.assertEqual([], self.driver.execute_script(BROKEN_TEXTS, "#parts td", "#parts th"))
+
+    def test_no_word_broken_nor_heading_cut_at_800_px(self):
+        self.check_width(800)
+
+    def test_no_word_broken_nor_heading_cut_at_900_px(self):
+        self.check_width(900)
+
+    def test_no_word_broken_nor_heading_cut_at_1600_px(self):
+        self.check_width(1600)
+
+    def test_no_word_broken_nor_heading_cut_at_2560_px(self):
+        self.check_width(2560)
+
+
+def readable_time(iso):
+    """The time as the page is to show it, worked out here apart from the
+    program: "Mon 23 Nov 2026 14:05:09 UTC+01:00", in the time's own zone."""
+    time = datetime.datetime.fromisoformat(iso)
+    offset = time.strftime("%z")
+    zone = "UTC" if offset in ("+0000", "-0000") else f"UTC{offset[:3]}:{offset[3:]}"
+    weekdays = ["Mon", "Tue", "Wed", "Thu", "Fri", "Sat", "Sun"]
+    months = ["Jan", "Feb", "Mar", "Apr", "May", "Jun", "Jul", "Aug", "Sep", "Oct", "Nov", "Dec"]
+    return (f"{weekdays[time.weekday()]} {time.day} {months[time.month - 1]} {time.year} "
+            f"{time:%H:%M:%S} {zone}")
+
+
+class ReaderTest(unittest.TestCase):
+    """What the page says beyond its data: times, links, colours and notes,
+    wherever and by whomever it is read."""
+
+    @classmethod
+    def setUpClass(cls):
+        reason = browser_missing()
+        if reason:
+            raise unittest.SkipTest(reason)
+        cls.summary = load_summary()
+
+    def open_page(self, page, environment=None):
+        profile = tempfile.mkdtemp(prefix="report-chromium-")
+        self.addCleanup(shutil.rmtree, profile, True)
+        driver = start_chromium(profile, environment=environment)
+        self.addCleanup(driver.quit)
+        driver.get("file://" + page)
+        return driver
+
+    def test_times_show_in_the_runs_zone_whatever_the_readers_zone(self):
+        """A reader in Berlin (TZ given to Chromium) sees the run's times as
+        the run's machine wrote them, byte for byte, with their zone."""
+        driver = self.open_page(os.path.join(REPORT, "index.html"),
+                                dict(os.environ, TZ="Europe/Berlin"))
+        self.assertEqual("Europe/Berlin", driver.execute_script(
+            "return Intl.DateTimeFormat().resolvedOptions().timeZone;"))
+        times = driver.execute_script(
+            "return Array.from(document.querySelectorAll('.run time'))"
+            ".map(t => [t.getAttribute('datetime'), t.textContent]);")
+        started, ended = self.summary["started"], self.summary["ended"]
+        # The report was written in UTC+05:30 (make_survey.py), not the reader's zone.
+        self.assertTrue(started.endswith("+05:30"), started)
+        self.assertEqual([[started, readable_time(started)], [ended, readable_time(ended)]], times)
+        self.assertEqual(f"Partition survey of {self.summary['console_host']}, "
+                         f"{readable_time(started)}", driver.title)
+
+    def test_every_document_link_of_a_copied_report_folder_resolves(self):
+        """The report folder copied elsewhere, its VPD folder left behind:
+        every link leads to a copy of its document inside the copied folder."""
+        copy = os.path.join(tempfile.mkdtemp(prefix="report-copy-"), "a", "copied report")
+        self.addCleanup(shutil.rmtree, os.path.dirname(os.path.dirname(copy)), True)
+        shutil.copytree(REPORT, copy)
+        driver = self.open_page(os.path.join(copy, "index.html"))
+        links = driver.execute_script(
+            "return Array.from(document.querySelectorAll('#parts a')).map(a => a.href);")
+        documents = [p["document"] for _, p in all_partitions(self.summary) if p["document"]]
+        self.assertEqual(len(documents), len(links))
+        vpd = os.path.join(os.path.dirname(REPORT), "VPD")
+        for link, document in zip(links, documents):
+            path = urllib.parse.unquote(urllib.parse.urlparse(link).path)
+            self.assertEqual(os.path.join(copy, "documents", os.path.basename(document)), path)
+            with open(path, "rb") as copied, \
+                    open(os.path.join(vpd, os.path.basename(document)), "rb") as original:
+                self.assertEqual(original.read(), copied.read(), link)
+
+    def test_document_links_of_the_report_after_a_run_resolve_in_its_folder(self):
+        run = os.path.join(os.path.dirname(REPORT), "run-report")
+        driver = self.open_page(os.path.join(run, "index.html"))
+        links = driver.execute_script(
+            "return Array.from(document.querySelectorAll('#parts a')).map(a => a.href);")
+        self.assertEqual(1, len(links))
+        path = urllib.parse.unquote(urllib.parse.urlparse(links[0]).path)
+        self.assertEqual(os.path.join(run, "documents"), os.path.dirname(path))
+        self.assertTrue(os.path.isfile(path), path)
+
+    def test_outcome_colours_differ_and_no_outcome_name_looks_like_a_link(self):
+        driver = self.open_page(os.path.join(REPORT, "index.html"))
+        colours = driver.execute_script(
+            "const colours = {}; document.querySelectorAll('.totals li[data-outcome]')"
+            ".forEach(li => { colours[li.dataset.outcome] = getComputedStyle(li).borderLeftColor; });"
+            "return colours;")
+        self.assertEqual(len(colours), len(set(colours.values())), colours)
+        names = driver.execute_script(
+            "return Array.from(document.querySelectorAll('#parts td.outcome')).map(td => {"
+            " const style = getComputedStyle(td);"
+            " return [style.color, style.textDecorationLine]; });")
+        body = driver.execute_script("return getComputedStyle(document.body).color;")
+        link = driver.execute_script(
+            "return getComputedStyle(document.querySelector('#parts a')).color;")
+        self.assertNotEqual(body, link)
+        self.assertEqual({(body, "none")}, {tuple(name) for name in names})
+
+    def test_notes_explain_the_codes_and_the_kept_status_texts(self):
+        driver = self.open_page(os.path.join(REPORT, "index.html"))
+        terms = driver.execute_script(
+            "return Array.from(document.querySelectorAll('#reading dt')).map(dt => dt.textContent);")
+        for term in ("Code 0, 4, 8", "4et result Failed, rc =", "rc = 4294967295", "listing failed"):
+            self.assertIn(term, terms)
 
 
 def main():
