@@ -54,25 +54,6 @@ protected:
     QuorvexTest::TemporaryDirectory _work;
 };
 
-TEST_F(FleetListingFailure, AMissingMachineListingToolEndsWith69NamingTheCommand) {
-    QuorvexTest::TemporaryDirectory const emptyBin;
-    SimulatedConsole const console("");
-    CommandResult const result =
-        QuorvexTest::runInSandbox({"--bind", emptyBin.path() + ":/opt/lsvtc/bin", "--bind",
-                                   _work.path() + ":" + _work.path()},
-                                  _survey({"--all"}));
-    // What the shell says of a missing command is the shell's own text.
-    std::string const failure = "/opt/lsvtc/bin/lsvtc -t0 exited with status 127: ";
-    ASSERT_EQ(result.stderrText.rfind(gc_MachineListingFailed + failure, 0), 0U)
-        << result.stderrText;
-    EXPECT_NE(result.stderrText.find("not found"), std::string::npos) << result.stderrText;
-    EXPECT_EQ(result.exitStatus, 69);
-    FleetTest::SummaryFile const summary(_work.file("summary.json"));
-    EXPECT_EQ(summary.validationProblems(), "");
-    EXPECT_EQ(summary.field("/listing_failure/exit_status"), "127");
-    EXPECT_EQ(summary.field("/listing_failure/command"), "\"/opt/lsvtc/bin/lsvtc -t0\"");
-}
-
 TEST_F(FleetListingFailure, AFailingMachineListingEndsWith69WithTheConsolesFirstErrorLine) {
     SimulatedConsole const console("[lsvtc]\nstdout \nstderr lsvtc: console busy\n"
                                    "stderr second line\nexit 5\n");

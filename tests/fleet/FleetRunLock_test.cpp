@@ -115,6 +115,10 @@ TEST_F(FleetRunLock, ASignalEndsTheWait) {
     EXPECT_EQ(console.invocations().size(), 1U) << "the interrupted wait called the console";
     EXPECT_TRUE(QuorvexTest::fileExists(gc_LockFile))
         << "the waiting run removed the holder's lock";
+
+    // Ended as a run ends, with every process it started.
+    first.signal(SIGTERM);
+    EXPECT_EQ(first.waitForExit(30.0), 128 + SIGTERM);
 }
 
 TEST_F(FleetRunLock, ASecondReportIntoTheSameFolderKeepsTheFirst) {
