@@ -1,7 +1,9 @@
 #include "fleet/ChildProcess.h"
 
 #include "fleet/ProcessTree.h"
+#include "fleet/WorkerLife.h"
 #include "utility/FileText.h"
+#include "utility/TemporaryFile.h"
 
 #include <fcntl.h>
 #include <sys/mman.h>
@@ -27,7 +29,15 @@ namespace {
 void restoreDefaultSignals() {
     std::signal(SIGINT, SIG_DFL);
     std::signal(SIGTERM, SIG_DFL);
+    std::signal(SIGHUP, SIG_DFL);
     std::signal(SIGPIPE, SIG_DFL);
+}
+
+// What the worker does once its parent is gone: it is about to end.
+[[noreturn]] void waitForTheEnd() {
+    while (true) {
+        pause();
+    }
 }
 
 } // namespace
@@ -51,10 +61,11 @@ ChildProcess::ChildProcess(Body const& body) {
     // Nothing buffered in the parent may be written twice by a child.
     std::cout.flush();
     std::cerr.flush();
+    pid_t const parent = getpid();
     _pid = fork();
     if (_pid == 0) {
         close(ends[0]);
-        _runChild(body, ends[1]);
+        _runChild(body, ends[1], parent);
     }
     if (_pid < 0) {
         _fail("cannot fork");
@@ -72,23 +83,25 @@ void ChildProcess::_fail(char const* operation) {
     _startFailure = std::string(operation) + ": " + std::strerror(errno);
 }
 
-void ChildProcess::_runChild(Body const& body, int writeEnd) {
+void ChildProcess::_runChild(Body const& body, int writeEnd, pid_t parent) {
     restoreDefaultSignals();
     setpgid(0, 0);
     prctl(PR_SET_CHILD_SUBREAPER, 1);
     ms_ownSlot = _slot;
+    Utility::TemporaryFile::ms_Observer = &ChildProcess::_recordTemporaryFile;
     bool delivered = false;
     try {
-        delivered = util::writeAll(writeEnd, body());
+        tieToParent(parent);
+        keepDescriptorsFromActions();
+        std::string const text = body();
+        keepBrokenPipeFromEndingWorker();
+        delivered = util::writeAll(writeEnd, text);
     } catch (...) {
-        _exit(1);
+        delivered = false;
     }
     close(writeEnd);
-    // Adopted orphans of a stopped action are reaped before the child goes.
-    while (waitpid(-1, nullptr, WNOHANG) > 0) {
-    }
     // The parent reads a result cut short as it is; the status says so.
-    _exit(delivered ? 0 : 1);
+    endWorker(delivered ? 0 : 1);
 }
 
 ChildProcess::~ChildProcess() {
@@ -154,14 +167,79 @@ bool ChildProcess::reap() {
     }
     int status = 0;
     pid_t const ended = waitpid(_pid, &status, WNOHANG);
-    if (ended == _pid || (ended < 0 && errno == ECHILD)) {
-        _reaped = true;
+    if (ended == _pid) {
+        _settleReaped(status);
+    } else if (ended < 0 && errno == ECHILD) {
+        _settleReaped(std::nullopt);
     }
     return _reaped;
 }
 
 bool ChildProcess::isReaped() const {
     return _reaped || _pid <= 0;
+}
+
+std::optional<int> ChildProcess::waitStatus() const {
+    return _waitStatus;
+}
+
+void ChildProcess::_settleReaped(std::optional<int> status) {
+    _reaped = true;
+    _stopped = false;
+    _waitStatus = status;
+    _removeTemporaryFiles(_slot);
+}
+
+void ChildProcess::removeOwnTemporaryFiles() {
+    _removeTemporaryFiles(ms_ownSlot);
+}
+
+// The child is gone, or ends: a file it recorded as made and not yet as
+// removed is its own (made exclusively, under a name no other process can
+// have made while it exists), and no process uses it any more.
+void ChildProcess::_removeTemporaryFiles(Slot* slot) {
+    if (slot == nullptr) {
+        return;
+    }
+    for (FileEntry& entry : slot->files) {
+        if (entry.inUse.load() != 0) {
+            unlink(entry.name);
+            entry.inUse.store(0);
+        }
+    }
+}
+
+// Child side. The entry is filled before it is marked in use, and marked
+// free before the file is deleted, so the parent only ever removes a name
+// that is still the child's file. A killed child leaves a file behind only
+// when it dies between making the file and recording it, or between
+// freeing the entry and deleting the file.
+// A file made once the parent is gone is removed here, before any command
+// can use it; one made before is recorded in time for the thread that ends
+// the worker, which marks the parent gone before it removes what is recorded.
+void ChildProcess::_recordTemporaryFile(std::string const& name, bool made) {
+    _noteTemporaryFile(name, made);
+    if (made && isParentGone()) {
+        unlink(name.c_str());
+        waitForTheEnd();
+    }
+}
+
+void ChildProcess::_noteTemporaryFile(std::string const& name, bool made) {
+    if (ms_ownSlot == nullptr || name.size() >= sizeof(FileEntry::name)) {
+        return;
+    }
+    for (FileEntry& entry : ms_ownSlot->files) {
+        if (made && entry.inUse.load() == 0) {
+            std::memcpy(entry.name, name.c_str(), name.size() + 1);
+            entry.inUse.store(1);
+            return;
+        }
+        if (!made && entry.inUse.load() != 0 && name == entry.name) {
+            entry.inUse.store(0);
+            return;
+        }
+    }
 }
 
 bool ChildProcess::stop() {
@@ -174,7 +252,11 @@ bool ChildProcess::stop() {
     ChildStop const outcome = stopChild(_pid);
     // Ended: reaped by the wait. Gone: no wait can find it any more.
     _stopped = outcome.state == ChildStop::State::Stopped;
-    _reaped = !_stopped;
+    if (outcome.state == ChildStop::State::Ended) {
+        _settleReaped(outcome.waitStatus);
+    } else if (outcome.state == ChildStop::State::Gone) {
+        _settleReaped(std::nullopt);
+    }
     return _stopped;
 }
 
@@ -198,10 +280,10 @@ void ChildProcess::killAndReap() {
     }
     killDescendants(_pid);
     kill(_pid, SIGKILL);
-    while (waitpid(_pid, nullptr, 0) < 0 && errno == EINTR) {
+    int status = 0;
+    while (waitpid(_pid, &status, 0) < 0 && errno == EINTR) {
     }
-    _reaped = true;
-    _stopped = false;
+    _settleReaped(status);
 }
 
 std::string ChildProcess::stopNote() {

@@ -2,6 +2,7 @@
 
 #include <sys/types.h>
 
+#include <array>
 #include <atomic>
 #include <functional>
 #include <optional>
@@ -13,8 +14,11 @@ namespace fleet {
 // process group of its own (a terminal's Ctrl-C reaches only the run's
 // parent), adopts the orphans of what it starts (so a stopped action's
 // processes stay findable under it), writes its result text into a pipe and
-// ends with _exit. A shared slot made before the fork lets the parent tell
-// the child, while it is stopped, why one of its actions was stopped.
+// ends with _exit. It dies with the parent: when the parent is gone it kills
+// everything it started and ends. A shared slot made before the fork lets
+// the parent tell the child, while it is stopped, why one of its actions
+// was stopped, and lets the child record the temporary files it has on
+// disk, which the parent removes once the child is reaped.
 class ChildProcess {
 public:
     using Body = std::function<std::string()>;
@@ -41,6 +45,9 @@ public:
     // Reaps the child when it has ended; true once reaped.
     bool reap();
     bool isReaped() const;
+    // The wait status of the reaped child; nullopt while it is not reaped,
+    // or when it was reaped before it could be waited for.
+    std::optional<int> waitStatus() const;
     // Stops the child with SIGSTOP, so that it starts nothing new while what
     // it started is looked at or killed. True once it is stopped (at once
     // when it already was); false when it ended first, and is then reaped.
@@ -56,16 +63,34 @@ public:
     static std::string stopNote();
     // Leaves the line in the slot of this child (parent side).
     void setStopNote(std::string const& note);
+    // Removes the temporary files the calling child has recorded and not
+    // removed: the child ends without its parent to do it.
+    static void removeOwnTemporaryFiles();
+
+    // The exit status of a child that ended because its parent was gone.
+    static constexpr int ms_ParentGoneStatus = 125;
 
 private:
+    // A temporary file the child has on disk; name is valid while inUse is 1.
+    struct FileEntry {
+        std::atomic<int> inUse;
+        char name[128];
+    };
     struct Slot {
         std::atomic<int> hasNote;
         char note[240];
+        // A survey has at most two temporary files at a time; a name that
+        // finds no free entry is not recorded.
+        std::array<FileEntry, 8> files;
     };
     static Slot* ms_ownSlot;
 
-    [[noreturn]] void _runChild(Body const& body, int writeEnd);
+    [[noreturn]] void _runChild(Body const& body, int writeEnd, pid_t parent);
     void _fail(char const* operation);
+    static void _recordTemporaryFile(std::string const& name, bool made);
+    static void _noteTemporaryFile(std::string const& name, bool made);
+    static void _removeTemporaryFiles(Slot* slot);
+    void _settleReaped(std::optional<int> status);
 
     pid_t _pid = -1;
     std::optional<std::string> _startFailure;
@@ -74,6 +99,7 @@ private:
     std::string _result;
     bool _reaped = false;
     bool _stopped = false;
+    std::optional<int> _waitStatus;
 };
 
 } // namespace fleet

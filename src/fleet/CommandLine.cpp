@@ -106,6 +106,17 @@ void addWholeNumber(CLI::App& app, WholeNumber const& number, Number& target,
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
 }
 
+// Whether the run ends with a recap: by default when a person is likely to
+// read it (standard error is a terminal and the run is not quiet).
+void addRecapOptions(CLI::App& app, Options& options) {
+    CLI::Option* const recap = app.add_flag_callback(
+        "--recap", [&options] { options.recap = true; },
+        "end with a recap on standard error even when it is not a terminal");
+    CLI::Option* const noRecap = app.add_flag_callback(
+        "--no-recap", [&options] { options.recap = false; }, "no recap, even on a terminal");
+    recap->excludes(noRecap);
+}
+
 // The survey's options; the report subcommand adds its own.
 void addSurveyOptions(CLI::App& app, Options& options) {
     addWholeNumber(app, gc_Jobs, options.jobs,
@@ -115,7 +126,8 @@ void addSurveyOptions(CLI::App& app, Options& options) {
     app.add_option("--summary", options.summaryFile, "write a summary of the run (JSON) to FILE")
         ->type_name("FILE")
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
-    app.add_flag("-q,--quiet", options.quiet, "no progress line");
+    app.add_flag("-q,--quiet", options.quiet, "no progress line, and no recap unless --recap");
+    addRecapOptions(app, options);
     app.add_flag("--all", options.all, "every managed machine the console lists");
     app.add_flag("--wait", options.waitForFolder,
                  "wait for another run using the result folder to end, rather than exit 75");

@@ -17,6 +17,9 @@ struct Options {
     // --report DIR: the run's report is written there.
     std::string reportFolder;
     bool quiet = false;
+    // --recap (true) or --no-recap (false); nullopt: a recap when standard
+    // error is a terminal and the run is not quiet.
+    std::optional<bool> recap;
     bool all = false;
     // --wait: wait for another run using the same result folder to end,
     // rather than exit with gc_ExitTemporaryFailure.
@@ -40,6 +43,9 @@ struct ParsedCommandLine {
 };
 
 constexpr int gc_ExitUsage = 64;
+// An output of the run (a result folder, the summary, the report, a
+// machine's file) cannot be written: sysexits.h's EX_CANTCREAT.
+constexpr int gc_ExitCannotCreate = 73;
 
 ParsedCommandLine parseCommandLine(int argc, char const* const* argv);
 

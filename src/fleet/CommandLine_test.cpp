@@ -71,6 +71,16 @@ TEST(CommandLine, EveryOptionIsRead) {
     EXPECT_TRUE(run.parsed.options.all);
 }
 
+TEST(CommandLine, RecapIsLeftToTheTerminalUnlessAskedFor) {
+    EXPECT_EQ(parse({"A_1"}).parsed.options.recap, std::nullopt);
+    EXPECT_EQ(parse({"--recap", "A_1"}).parsed.options.recap, std::optional<bool>(true));
+    EXPECT_EQ(parse({"--no-recap", "A_1"}).parsed.options.recap, std::optional<bool>(false));
+}
+
+TEST(CommandLine, RecapAndNoRecapTogetherAreRefused) {
+    expectRefused({"--recap", "--no-recap", "A_1"}, "--recap excludes --no-recap");
+}
+
 TEST(CommandLine, IdentitiesKeepTheirOrder) {
     ParseRun const run = parse({"B_2", "A_1", "--jobs=2", "C_3"});
     EXPECT_EQ(run.parsed.options.identities, (std::vector<std::string>{"B_2", "A_1", "C_3"}));
@@ -225,7 +235,10 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
               "  -t, --timeout SECONDS   time limit of one remote action, 0 for none "
               "(default 1800)\n"
               "  --summary FILE          write a summary of the run (JSON) to FILE\n"
-              "  -q, --quiet             no progress line\n"
+              "  -q, --quiet             no progress line, and no recap unless --recap\n"
+              "  --recap                 end with a recap on standard error even when it is "
+              "not a terminal\n"
+              "  --no-recap              no recap, even on a terminal\n"
               "  --all                   every managed machine the console lists\n"
               "  --wait                  wait for another run using the result folder to end, "
               "rather than exit 75\n"

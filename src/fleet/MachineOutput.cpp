@@ -5,6 +5,7 @@
 
 #include "fleet/MachineReport.h"
 #include "fleet/RunFiles.h"
+#include "survey/Survey_Files.h"
 #include "survey/calculate_ReturnCode.h"
 
 #include <algorithm>
@@ -56,6 +57,10 @@ bool MachineOutput::isAllWritten() const {
     return _written == _machines.size();
 }
 
+std::vector<std::string> const& MachineOutput::writeFailures() const {
+    return _writeFailures;
+}
+
 void MachineOutput::_write(std::size_t index) {
     MachineRecord const& machine = _machines[index];
     _removeTracePieces(machine.identity);
@@ -71,15 +76,30 @@ void MachineOutput::_write(std::size_t index) {
     if (auto const trace = machineTraceText(machine)) {
         _writeFile(traceFilePath(machine.identity), *trace);
     }
+    _noteDocumentFailures(machine);
 }
 
+// The documents are written by the survey code in the workers, which says
+// nothing itself (the single-machine tool is silent there); its result
+// carries the error up to here.
+void MachineOutput::_noteDocumentFailures(MachineRecord const& machine) {
+    for (PartitionRecord const& record : machine.partitions) {
+        if (record.result.documentError != 0) {
+            std::string const path =
+                Quorvex::PYLON::VPD::get_LocalResultPath(record.result.fileName);
+            _writeFailures.emplace_back(
+                util::SystemError("write", path, record.result.documentError).what());
+        }
+    }
+}
+
+// A failure is kept for the end of the run, after every machine's block, so
+// that the blocks stay byte for byte what the single-machine tool prints.
 void MachineOutput::_writeFile(std::string const& path, std::string const& text) {
     try {
         util::writeFileAtomically(path, text);
-    } catch (util::SystemError const&) {
-        // The single-machine tool says nothing when its status file or trace
-        // cannot be written, and scripts compare the two programs' standard
-        // error byte for byte (tests/fleet/FleetDifferential_test.cpp).
+    } catch (util::SystemError const& failure) {
+        _writeFailures.emplace_back(failure.what());
     }
 }
 

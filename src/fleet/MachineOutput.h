@@ -34,9 +34,14 @@ public:
     void writeRest();
     std::size_t writtenCount() const;
     bool isAllWritten() const;
+    // Every file of the machines written so far that could not be written
+    // (status file, trace, default document), as "cannot write PATH: reason",
+    // in the order met.
+    std::vector<std::string> const& writeFailures() const;
 
 private:
     void _write(std::size_t index);
+    void _noteDocumentFailures(MachineRecord const& machine);
     void _removeTracePieces(std::string const& identity) const;
     void _writeFile(std::string const& path, std::string const& text);
 
@@ -44,6 +49,7 @@ private:
     ProgressLine& _line;
     std::vector<bool> _slotInUse;
     std::size_t _written = 0;
+    std::vector<std::string> _writeFailures;
 };
 
 } // namespace fleet

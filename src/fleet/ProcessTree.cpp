@@ -4,9 +4,14 @@
 #include "utility/SystemError.h"
 
 #include <sys/wait.h>
+// The C library of Debian 12 (2.36) declares these without C linkage for C++.
+extern "C" {
+#include <sys/pidfd.h>
+}
 #include <unistd.h>
 
 #include <algorithm>
+#include <array>
 #include <cerrno>
 #include <chrono>
 #include <csignal>
@@ -48,6 +53,63 @@ std::optional<std::string> statFields(pid_t pid) {
     return stat.substr(end + 2);
 }
 
+// A process below root together with its parent when it was listed.
+struct Link {
+    pid_t parent = 0;
+    pid_t pid = 0;
+};
+
+std::vector<Link> linksBelow(pid_t root) {
+    std::vector<Link> found{{0, root}};
+    for (std::size_t i = 0; i < found.size(); ++i) {
+        for (pid_t child : childrenOf(found[i].pid)) {
+            found.push_back({found[i].pid, child});
+        }
+    }
+    // The root itself is not below the root.
+    found.erase(found.begin());
+    return found;
+}
+
+// The state letter of /proc/<pid>/stat: 'R', 'S', 'D', 'T', 'Z'...; 'X' when gone.
+char stateOf(pid_t pid) {
+    std::optional<std::string> const fields = statFields(pid);
+    return fields && !fields->empty() ? (*fields)[0] : 'X';
+}
+
+std::optional<pid_t> parentOf(pid_t pid) {
+    std::optional<std::string> const fields = statFields(pid);
+    std::istringstream stream(fields.value_or(""));
+    char state = 0;
+    pid_t parent = 0;
+    if (!(stream >> state >> parent)) {
+        return std::nullopt;
+    }
+    return parent;
+}
+
+bool isStoppedState(char state) {
+    return state == 'T' || state == 't';
+}
+
+bool hasEndedState(char state) {
+    return state == 'Z' || state == 'X';
+}
+
+// One round of the freeze: true when every process found was already
+// stopped or ended.
+bool freezeRound(pid_t root) {
+    bool allStill = true;
+    for (Link const& link : linksBelow(root)) {
+        char const state = stateOf(link.pid);
+        if (!isStoppedState(state) && !hasEndedState(state)) {
+            allStill = false;
+            signalChildOf(link.parent, link.pid, SIGSTOP);
+        }
+    }
+    return allStill;
+}
+
 } // namespace
 
 double secondsSinceBoot() {
@@ -70,11 +132,10 @@ std::vector<pid_t> childrenOf(pid_t pid) {
 }
 
 std::vector<pid_t> descendantsOf(pid_t pid) {
-    std::vector<pid_t> found = childrenOf(pid);
-    for (std::size_t i = 0; i < found.size(); ++i) {
-        std::vector<pid_t> const grandchildren = childrenOf(found[i]);
-        found.insert(found.end(), grandchildren.begin(), grandchildren.end());
-    }
+    std::vector<Link> const links = linksBelow(pid);
+    std::vector<pid_t> found(links.size());
+    std::transform(links.begin(), links.end(), found.begin(),
+                   [](Link const& link) { return link.pid; });
     return found;
 }
 
@@ -105,8 +166,20 @@ std::optional<double> ageOf(pid_t pid) {
 }
 
 bool hasEnded(pid_t pid) {
-    std::optional<std::string> const fields = statFields(pid);
-    return !fields || fields->empty() || (*fields)[0] == 'Z' || (*fields)[0] == 'X';
+    return hasEndedState(stateOf(pid));
+}
+
+// The descriptor is opened first and the parent checked after: if pid is
+// still the parent's child then, the descriptor refers to that child.
+bool signalChildOf(pid_t parent, pid_t pid, int signalNumber) {
+    int const descriptor = pidfd_open(pid, 0);
+    if (descriptor < 0) {
+        return false;
+    }
+    bool const sent =
+        parentOf(pid) == parent && pidfd_send_signal(descriptor, signalNumber, nullptr, 0) == 0;
+    close(descriptor);
+    return sent;
 }
 
 ChildStop stopChild(pid_t child) {
@@ -129,15 +202,19 @@ ChildStop stopChild(pid_t child) {
     }
 }
 
+// Frozen first, so that nothing forks meanwhile, then killed children
+// before parents: a parent killed first would leave its live children to a
+// subreaper above root, or to init, out of reach of the next round.
 std::size_t killDescendants(pid_t root) {
+    freezeDescendants(root);
     std::size_t signalsSent = 0;
     for (int round = 0; round < gc_KillRounds; ++round) {
         bool anyAlive = false;
-        for (pid_t pid : descendantsOf(root)) {
-            if (!hasEnded(pid)) {
+        std::vector<Link> const links = linksBelow(root);
+        for (auto link = links.rbegin(); link != links.rend(); ++link) {
+            if (!hasEnded(link->pid)) {
                 anyAlive = true;
-                kill(pid, SIGKILL);
-                ++signalsSent;
+                signalsSent += signalChildOf(link->parent, link->pid, SIGKILL) ? 1 : 0;
             }
         }
         if (!anyAlive) {
@@ -146,6 +223,38 @@ std::size_t killDescendants(pid_t root) {
         std::this_thread::sleep_for(gc_PauseBetweenRounds);
     }
     return signalsSent;
+}
+
+void freezeDescendants(pid_t root) {
+    for (int round = 0; round < gc_KillRounds && !freezeRound(root); ++round) {
+        std::this_thread::sleep_for(gc_PauseBetweenRounds);
+    }
+}
+
+void thawDescendants(pid_t root) {
+    for (Link const& link : linksBelow(root)) {
+        if (isStoppedState(stateOf(link.pid))) {
+            signalChildOf(link.parent, link.pid, SIGCONT);
+        }
+    }
+}
+
+// Each child is a child of the caller until reaped: its PID cannot be reused
+// meanwhile.
+std::size_t endChildrenExcept(std::vector<pid_t> const& kept) {
+    std::size_t ended = 0;
+    for (pid_t child : childrenOf(getpid())) {
+        if (std::find(kept.begin(), kept.end(), child) != kept.end()) {
+            continue;
+        }
+        kill(child, SIGSTOP);
+        killDescendants(child);
+        kill(child, SIGKILL);
+        while (waitpid(child, nullptr, 0) < 0 && errno == EINTR) {
+        }
+        ++ended;
+    }
+    return ended;
 }
 
 } // namespace fleet

@@ -45,9 +45,25 @@ struct ChildStop {
 // child already stopped and waited for must not be stopped again: no stop
 // would be reported a second time and the wait would never end.
 [[nodiscard]] ChildStop stopChild(pid_t child);
-// Kills every descendant of root with SIGKILL, again and again until no
-// live one is left (a stopped root cannot start new ones). root itself is
-// left alone. Returns the number of kill signals sent.
+// Sends signalNumber to pid only while pid is still a child of parent,
+// through a process descriptor: a PID read from /proc may belong to another
+// process by the time it is signalled, a descriptor cannot. True once sent.
+bool signalChildOf(pid_t parent, pid_t pid, int signalNumber);
+// Kills every descendant of root with SIGKILL: freezes the tree, then kills
+// children before their parents, again and again until no live one is left
+// (a stopped root cannot start new ones). root itself is left alone.
+// Returns the number of kill signals sent.
 std::size_t killDescendants(pid_t root);
+// Stops every descendant of root with SIGSTOP and waits until each is
+// stopped or has ended, round after round until none is left running (a
+// stopped root cannot start new ones). Afterwards nothing below root can
+// end on its own: what has not ended is stopped until thawed or killed.
+void freezeDescendants(pid_t root);
+// Lets every stopped descendant of root go on.
+void thawDescendants(pid_t root);
+// Kills every child of the calling process but those kept, with all they
+// started, and reaps it: what a subreaper adopted when a process below it
+// died. Returns the number of children ended.
+std::size_t endChildrenExcept(std::vector<pid_t> const& kept);
 
 } // namespace fleet

@@ -30,6 +30,11 @@ std::string runSleepingTree() {
     return "survived " + std::to_string(status);
 }
 
+std::string sleepLongForTree() {
+    std::system("sleep 300");
+    return "went on";
+}
+
 std::vector<pid_t> liveDescendants(pid_t root) {
     std::vector<pid_t> const all = fleet::descendantsOf(root);
     std::vector<pid_t> live;
@@ -152,6 +157,65 @@ TEST(ProcessTree, ProcessThatIsGoneHasEndedAndNoAge) {
     EXPECT_FALSE(fleet::ageOf(0x7ffffff0).has_value());
     EXPECT_EQ(fleet::commandLineOf(0x7ffffff0), "");
     EXPECT_TRUE(fleet::childrenOf(0x7ffffff0).empty());
+}
+
+// The state letter of /proc/<pid>/stat.
+char stateOf(pid_t pid) {
+    std::string const stat = QuorvexTest::readFile("/proc/" + std::to_string(pid) + "/stat");
+    std::size_t const end = stat.rfind(')');
+    return end == std::string::npos || end + 2 >= stat.size() ? 'X' : stat[end + 2];
+}
+
+TEST(ProcessTree, FrozenTreeIsStoppedThroughoutUntilThawed) {
+    ChildProcess worker(&runSleepingTree);
+    ASSERT_TRUE(worker.isStarted());
+    std::vector<pid_t> const tree = waitForLiveDescendants(worker.pid(), 4);
+    ASSERT_GE(tree.size(), 4U);
+    ASSERT_TRUE(worker.stop());
+    fleet::freezeDescendants(worker.pid());
+    for (pid_t pid : tree) {
+        EXPECT_EQ(stateOf(pid), 'T') << pid;
+    }
+    fleet::thawDescendants(worker.pid());
+    for (pid_t pid : tree) {
+        EXPECT_NE(stateOf(pid), 'T') << pid;
+    }
+    worker.killAndReap();
+}
+
+TEST(ProcessTree, SignalReachesOnlyAChildOfTheGivenParent) {
+    pid_t const child = fork();
+    ASSERT_GE(child, 0);
+    if (child == 0) {
+        pause();
+        _exit(0);
+    }
+    EXPECT_FALSE(fleet::signalChildOf(getppid(), child, SIGKILL)) << "not the parent";
+    EXPECT_FALSE(fleet::hasEnded(child));
+    EXPECT_TRUE(fleet::signalChildOf(getpid(), child, SIGKILL));
+    int status = 0;
+    ASSERT_EQ(waitpid(child, &status, 0), child);
+    EXPECT_TRUE(WIFSIGNALED(status));
+    EXPECT_FALSE(fleet::signalChildOf(getpid(), 0x7ffffff0, SIGKILL)) << "no such process";
+}
+
+TEST(ProcessTree, ChildrenNotKeptAreEndedWithWhatTheyStartedAndReaped) {
+    ChildProcess kept([] { return sleepLongForTree(); });
+    pid_t const other = fork();
+    ASSERT_GE(other, 0);
+    if (other == 0) {
+        std::system("sleep 300");
+        _exit(0);
+    }
+    std::vector<pid_t> const below = waitForLiveDescendants(other, 1);
+    ASSERT_FALSE(below.empty());
+    EXPECT_EQ(fleet::endChildrenExcept({kept.pid()}), 1U);
+    EXPECT_EQ(waitpid(other, nullptr, WNOHANG), -1) << "reaped";
+    for (pid_t pid : below) {
+        EXPECT_TRUE(fleet::hasEnded(pid)) << pid;
+    }
+    EXPECT_FALSE(fleet::hasEnded(kept.pid()));
+    kept.killAndReap();
 }
 
 } // namespace

@@ -1,8 +1,7 @@
 #include "fleet/ProgressLine.h"
 
 #include "fleet/Progress.h"
-
-#include <sys/ioctl.h>
+#include "fleet/TerminalWidth.h"
 
 #include <ostream>
 
@@ -28,9 +27,8 @@ bool ProgressLine::isDue(Clock::time_point now) const {
     return _enabled && now - _lastDraw >= gc_ProgressInterval;
 }
 
-std::size_t ProgressLine::_terminalColumns() const {
-    winsize size{};
-    return ioctl(_descriptor, TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
+std::size_t ProgressLine::columns() const {
+    return terminalColumns(_descriptor);
 }
 
 void ProgressLine::draw(std::string const& line, Clock::time_point now) {
@@ -39,7 +37,7 @@ void ProgressLine::draw(std::string const& line, Clock::time_point now) {
     }
     _lastDraw = now;
     _shown = true;
-    std::string const fitted = fitToWidth(line, _terminalColumns());
+    std::string const fitted = fitToWidth(line, columns());
     if (_openColumns == 0) {
         _out << gc_EraseLine << fitted << std::flush;
         return;
@@ -63,8 +61,8 @@ bool ProgressLine::isRowOpen() const {
     return _openColumns > 0;
 }
 
-void ProgressLine::leaveOpenRow(std::size_t columns) {
-    _openColumns = columns;
+void ProgressLine::leaveOpenRow(std::size_t openColumns) {
+    _openColumns = openColumns;
 }
 
 } // namespace fleet

@@ -32,13 +32,14 @@ public:
     // The output just written ends its last row after this many characters
     // without a line end (a machine's block ends with its code digit, and
     // the next machine's output continues that row); 0 for an empty row.
-    void leaveOpenRow(std::size_t columns);
+    void leaveOpenRow(std::size_t openColumns);
     // The output's last row has text and no line end yet.
     bool isRowOpen() const;
+    // The terminal's width now, read at every draw so that a resized
+    // terminal gets a line that fits; 0 when unknown (not a terminal).
+    std::size_t columns() const;
 
 private:
-    std::size_t _terminalColumns() const;
-
     bool _enabled;
     std::ostream& _out;
     int _descriptor;

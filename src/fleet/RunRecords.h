@@ -34,11 +34,25 @@ struct PartitionRecord {
     std::optional<std::string> trace;
 };
 
+// How a partition's worker ended when it died before telling how the survey
+// ended: its wait status and how long it ran.
+struct WorkerDeath {
+    int waitStatus = 0;
+    double seconds = 0;
+};
+
 // The one place a partition's outcome is decided: from what its survey left
-// and whether the run stopped one of its actions. A partition an interruption
-// stopped reads report::gc_InterruptedStatusText with code 8, whatever its
-// survey left.
+// and whether the run stopped one of its actions, or from its worker's
+// death. A survey that ended surveyed is surveyed, stop or not: the stop
+// came after the answer and cost the partition nothing, so it is not
+// recorded. Otherwise a partition an interruption stopped reads
+// report::gc_InterruptedStatusText with code 8, and one the time limit
+// stopped is timed out with the status text of the failure it ended as.
 void settlePartition(PartitionRecord& record, Quorvex::PYLON::VPD::PartitionOutcome result);
+// A partition whose worker died reads report::gc_WorkerDiedStatusText with
+// code 8, names its default document and gives as reason what ended the
+// worker, such as "The survey's worker was killed by SIGKILL after 3.2 s.".
+void settlePartition(PartitionRecord& record, WorkerDeath const& death);
 // A partition whose survey never ended because the run was interrupted.
 void settleUnfinished(PartitionRecord& record);
 

@@ -11,6 +11,8 @@ namespace fleet {
 
 namespace {
 
+constexpr int gc_HandledSignals[] = {SIGINT, SIGTERM, SIGHUP, SIGPIPE};
+
 int gs_ReadEnd = -1;
 int gs_WriteEnd = -1;
 int gs_FirstSignal = 0;
@@ -22,6 +24,15 @@ void handleSignal(int signalNumber) {
     ssize_t const written = write(gs_WriteEnd, &byte, 1);
     static_cast<void>(written);
     errno = savedErrno;
+}
+
+sigset_t handledSignals() {
+    sigset_t set;
+    sigemptyset(&set);
+    for (int const signalNumber : gc_HandledSignals) {
+        sigaddset(&set, signalNumber);
+    }
+    return set;
 }
 
 std::string failure(char const* operation) {
@@ -41,10 +52,20 @@ std::optional<std::string> installSignalPipe() {
     action.sa_handler = &handleSignal;
     sigemptyset(&action.sa_mask);
     action.sa_flags = SA_RESTART;
-    if (sigaction(SIGINT, &action, nullptr) != 0 || sigaction(SIGTERM, &action, nullptr) != 0) {
-        return failure("cannot handle SIGINT and SIGTERM");
+    for (int const signalNumber : gc_HandledSignals) {
+        if (sigaction(signalNumber, &action, nullptr) != 0) {
+            return failure((std::string("cannot handle ") + signalName(signalNumber)).c_str());
+        }
     }
+    // A signal blocked by whoever started the run would never reach the pipe.
+    sigset_t const handled = handledSignals();
+    sigprocmask(SIG_UNBLOCK, &handled, nullptr);
     return std::nullopt;
+}
+
+void holdSignals() {
+    sigset_t const handled = handledSignals();
+    sigprocmask(SIG_BLOCK, &handled, nullptr);
 }
 
 int signalPipeDescriptor() {
@@ -62,7 +83,16 @@ int takeSignal() {
 }
 
 char const* signalName(int signalNumber) {
-    return signalNumber == SIGTERM ? "SIGTERM" : "SIGINT";
+    switch (signalNumber) {
+    case SIGTERM:
+        return "SIGTERM";
+    case SIGHUP:
+        return "SIGHUP";
+    case SIGPIPE:
+        return "SIGPIPE";
+    default:
+        return "SIGINT";
+    }
 }
 
 } // namespace fleet

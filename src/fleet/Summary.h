@@ -16,7 +16,8 @@ struct RunFacts {
     std::string started;
     std::string ended;
     double elapsedSeconds = 0;
-    // "SIGINT", "SIGTERM", or empty when the run was not interrupted.
+    // The interrupting signal's name (fleet::signalName), or empty when the
+    // run was not interrupted.
     std::string interruptedBy;
     int exitStatus = 0;
     // Why the console's machines could not be listed (--all).

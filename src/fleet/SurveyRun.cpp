@@ -1,10 +1,12 @@
 #include "fleet/SurveyRun.h"
 
 #include "fleet/MachineReport.h"
+#include "fleet/PartitionName.h"
 #include "fleet/RunFiles.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/WorkUnits.h"
 #include "report/StatusText.h"
+#include "survey/Quorvex_PYLON_VPD_Survey_ClientPartition_Utility.h"
 #include "survey/calculate_ReturnCode.h"
 
 #include <unistd.h>
@@ -67,9 +69,9 @@ int SurveyRun::run() {
     _start = Clock::now();
     // A signal may have come while the machines were listed, and a run
     // without machines never enters the loop.
-    _takeSignal();
+    noteSignal();
     while (!_scheduler.isFinished()) {
-        _takeSignal();
+        noteSignal();
         for (auto const& unit : _scheduler.takeStartable()) {
             _startUnit(unit);
         }
@@ -77,7 +79,7 @@ int SurveyRun::run() {
             break;
         }
         std::vector<WorkerEvent> const ended = _pool.waitForEvents();
-        _takeSignal();
+        noteSignal();
         _handle(ended);
         _handle(_pool.stopDueActions(_limits));
         _output.writeReady(_scheduler);
@@ -88,11 +90,24 @@ int SurveyRun::run() {
     }
     _output.writeRest();
     _progress.erase();
-    int const signalNumber = _limits.interruptingSignal();
-    return signalNumber != 0 ? 128 + signalNumber : std::atoi(overallCode().c_str());
+    // A signal may have come while the last machines were written.
+    noteSignal();
+    return exitStatus();
 }
 
-void SurveyRun::_takeSignal() {
+int SurveyRun::exitStatus() const {
+    int const signalNumber = _limits.interruptingSignal();
+    if (signalNumber != 0) {
+        return 128 + signalNumber;
+    }
+    return _output.writeFailures().empty() ? std::atoi(overallCode().c_str()) : gc_ExitCannotCreate;
+}
+
+std::vector<std::string> const& SurveyRun::writeFailures() const {
+    return _output.writeFailures();
+}
+
+void SurveyRun::noteSignal() {
     int const signalNumber = takeSignal();
     if (signalNumber != 0 && !_limits.isInterrupted()) {
         _limits.interrupt(signalNumber);
@@ -147,21 +162,21 @@ void SurveyRun::_notStarted(Scheduler::Unit const& unit, std::string const& fail
 void SurveyRun::_handle(std::vector<WorkerEvent> const& events) {
     for (auto const& event : events) {
         if (event.kind == WorkerEvent::Kind::Ended) {
-            _finish(event.tag, event.text);
+            _finish(event);
         } else {
             _recordStop(*_inFlight[event.tag], event);
         }
     }
 }
 
-void SurveyRun::_finish(std::size_t slot, std::string const& result) {
-    InFlight const running = *_inFlight[slot];
-    _inFlight[slot].reset();
-    _output.releaseSlot(slot);
+void SurveyRun::_finish(WorkerEvent const& ended) {
+    InFlight const running = *_inFlight[ended.tag];
+    _inFlight[ended.tag].reset();
+    _output.releaseSlot(ended.tag);
     if (running.unit.partition) {
-        _finishSurvey(running, result);
+        _finishSurvey(running, ended);
     } else {
-        _finishListing(running, result);
+        _finishListing(running, ended.text);
     }
 }
 
@@ -197,12 +212,25 @@ SurveyRun::_listingFailure(InFlight const& running, std::optional<std::string> c
     return trace ? report::listingFailureInTrace(*trace) : std::nullopt;
 }
 
-void SurveyRun::_finishSurvey(InFlight const& running, std::string const& result) {
+void SurveyRun::_finishSurvey(InFlight const& running, WorkerEvent const& ended) {
     PartitionRecord& record = _record(running.unit);
     record.seconds = secondsSince(running.started);
     record.trace = takeTracePiece(_output.tracePiece(running.unit.machine, running.slot));
-    settlePartition(record, decodeOutcome(result).value_or(notStartedOutcome()));
+    if (std::optional<Quorvex::PYLON::VPD::PartitionOutcome> result = decodeOutcome(ended.text)) {
+        settlePartition(record, std::move(*result));
+    } else {
+        _settleWorkerDeath(record, ended);
+    }
     _scheduler.finish(running.unit);
+}
+
+// A worker that died left its actions to this process, which ends them
+// before it writes the partition's default document in their place.
+void SurveyRun::_settleWorkerDeath(PartitionRecord& record, WorkerEvent const& ended) {
+    _pool.endAdopted();
+    settlePartition(record, WorkerDeath{ended.waitStatus.value_or(0), record.seconds.value_or(0)});
+    Quorvex_PYLON_VPD_Survey_ClientPartition_Utility::u_create_DefaultXML_forFailedPartition(
+        record.partition, record.result.reason, record.result.fileName);
 }
 
 // The outcome itself is settled when the unit ends, from what its survey left.
@@ -222,35 +250,44 @@ void SurveyRun::_drawProgress() {
     if (_output.isAllWritten() || !_progress.isDue(Clock::now())) {
         return;
     }
-    _progress.draw(formatProgress(_progressFigures()), Clock::now());
+    _progress.draw(formatProgress(_progressFigures(), _progress.columns()), Clock::now());
+}
+
+void SurveyRun::_countMachines(ProgressFigures& figures) const {
+    figures.machines = _machines.size();
+    for (std::size_t index = 0; index < _machines.size(); ++index) {
+        MachineRecord const& machine = _machines[index];
+        figures.listingsPending += machine.listed ? 0 : 1;
+        figures.machinesDone += _scheduler.isMachineDone(index) ? 1 : 0;
+        figures.partitions += machine.partitions.size();
+        for (auto const& record : machine.partitions) {
+            if (record.outcome) {
+                ++(report::isFailure(*record.outcome) ? figures.failed
+                                                      : figures.endedWithoutFailure);
+            }
+        }
+    }
 }
 
 ProgressFigures SurveyRun::_progressFigures() const {
     ProgressFigures figures;
-    figures.machinesDone = _output.writtenCount();
-    figures.machines = _machines.size();
-    for (auto const& machine : _machines) {
-        figures.partitions += machine.partitions.size();
-        for (auto const& record : machine.partitions) {
-            if (record.outcome) {
-                ++(record.result.returnCode == report::gc_SurveyedCode ? figures.surveyed
-                                                                       : figures.failed);
-            }
-        }
-    }
+    _countMachines(figures);
+    RunningSurveys surveys;
+    surveys.timeoutSeconds = _options.timeoutSeconds;
     for (auto const& running : _inFlight) {
         if (!running || !running->unit.partition) {
             continue;
         }
         ++figures.running;
         double const seconds = secondsSince(running->started);
+        surveys.seconds.push_back(seconds);
         if (seconds >= figures.longestSeconds) {
             figures.longestSeconds = seconds;
-            figures.longestName = std::string(_record(running->unit).partition);
+            figures.longestName = shownName(_record(running->unit).partition);
         }
     }
     figures.elapsedSeconds = secondsSince(_start);
-    figures.leftSeconds = estimateLeft(figures);
+    figures.left = estimateLeft(figures, surveys);
     return figures;
 }
 

@@ -2,6 +2,7 @@
 
 #include "fleet/ChildProcess.h"
 #include "fleet/FieldCodec.h"
+#include "fleet/WorkerLife.h"
 #include "pylon/ListOf_Machines.h"
 #include "pylon/ListOf_Partitions.h"
 #include "pylon/Machine.h"
@@ -23,7 +24,7 @@ using Quorvex::PYLON::VPD::PartitionOutcomeKind;
 constexpr unsigned int gc_ManagedMachineType = 0;
 constexpr char gc_MainLine[] = "PYLON_VPD_Survey_ClientPartition::main";
 constexpr std::size_t gc_PartitionFields = 6;
-constexpr std::size_t gc_OutcomeFields = 7;
+constexpr std::size_t gc_OutcomeFields = 8;
 
 std::string optionalText(std::optional<int> const& value) {
     return value ? std::to_string(*value) : std::string();
@@ -76,6 +77,7 @@ std::string listPartitions(std::string const& identity, std::string const& trace
     std::string encoded;
     {
         Utility::Trace trace(tracePiece);
+        keepDescriptorsFromActions();
         trace << gc_MainLine << std::endl;
         Quorvex::System::MTMS const mtms(identity);
         Quorvex::PYLON::ListOf_Partitions partitions;
@@ -121,13 +123,15 @@ std::string surveyPartition(Quorvex::System::Partition const& partition,
     PartitionOutcome outcome;
     {
         Utility::Trace trace(tracePiece);
+        keepDescriptorsFromActions();
         outcome = Quorvex::PYLON::VPD::Survey_ClientPartition::survey_Partition(
             partition, &ChildProcess::stopNote);
     }
     closeTrace();
     return encodeFields({outcome.fileName, outcome.returnCode, outcome.statusText,
                          std::to_string(static_cast<int>(outcome.kind)), optionalText(outcome.rc),
-                         optionalText(outcome.rcCmd), outcome.reason});
+                         optionalText(outcome.rcCmd), outcome.reason,
+                         std::to_string(outcome.documentError)});
 }
 
 std::optional<PartitionOutcome> decodeOutcome(std::string const& text) {
@@ -148,6 +152,7 @@ std::optional<PartitionOutcome> decodeOutcome(std::string const& text) {
     outcome.rc = optionalNumber(fields[4]);
     outcome.rcCmd = optionalNumber(fields[5]);
     outcome.reason = fields[6];
+    outcome.documentError = optionalNumber(fields[7]).value_or(0);
     return outcome;
 }
 

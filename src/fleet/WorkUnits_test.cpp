@@ -38,7 +38,7 @@ TEST(WorkUnits, EmptyListingGivesNoPartitions) {
 
 TEST(WorkUnits, OutcomeFieldsAreReadBack) {
     std::string const text = encodeFields(
-        {"VPD/f.VPD.xml", "8", "get result Failed, rc = 3", "4", "3", "0", "reason\n"});
+        {"VPD/f.VPD.xml", "8", "get result Failed, rc = 3", "4", "3", "0", "reason\n", "28"});
     auto const outcome = fleet::decodeOutcome(text);
     ASSERT_TRUE(outcome.has_value());
     EXPECT_EQ(outcome->fileName, "VPD/f.VPD.xml");
@@ -48,10 +48,11 @@ TEST(WorkUnits, OutcomeFieldsAreReadBack) {
     EXPECT_EQ(outcome->rc, 3);
     EXPECT_EQ(outcome->rcCmd, 0);
     EXPECT_EQ(outcome->reason, "reason\n");
+    EXPECT_EQ(outcome->documentError, 28) << "the default document could not be written";
 }
 
 TEST(WorkUnits, MissingCodesStayUnknown) {
-    auto const outcome = fleet::decodeOutcome(encodeFields({"", "8", "x", "1", "", "", ""}));
+    auto const outcome = fleet::decodeOutcome(encodeFields({"", "8", "x", "1", "", "", "", "0"}));
     ASSERT_TRUE(outcome.has_value());
     EXPECT_EQ(outcome->kind, Kind::Inactive);
     EXPECT_FALSE(outcome->rc.has_value());
@@ -61,7 +62,8 @@ TEST(WorkUnits, MissingCodesStayUnknown) {
 TEST(WorkUnits, OutcomeOfAChildThatDiedIsRejected) {
     EXPECT_FALSE(fleet::decodeOutcome("").has_value());
     EXPECT_FALSE(fleet::decodeOutcome(encodeFields({"a", "b"})).has_value());
-    EXPECT_FALSE(fleet::decodeOutcome(encodeFields({"", "8", "x", "9", "", "", ""})).has_value());
+    EXPECT_FALSE(
+        fleet::decodeOutcome(encodeFields({"", "8", "x", "9", "", "", "", "0"})).has_value());
 }
 
 TEST(WorkUnits, MachineListIsOneRecordOfIdentities) {

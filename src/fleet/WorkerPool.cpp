@@ -72,7 +72,8 @@ std::vector<WorkerEvent> WorkerPool::waitForEvents() {
         }
         child.readAvailable();
         if (child.resultDescriptor() < 0 && child.reap()) {
-            events.push_back({WorkerEvent::Kind::Ended, _workers[i].tag, child.takeResult(), 0});
+            events.push_back({WorkerEvent::Kind::Ended, _workers[i].tag, child.takeResult(), 0,
+                              child.waitStatus()});
             _workers.erase(_workers.begin() + static_cast<std::ptrdiff_t>(i));
         } else {
             ++i;
@@ -116,9 +117,10 @@ std::optional<WorkerEvent> WorkerPool::_stopFirstDue(Worker& worker, TimeLimits 
     return stopped;
 }
 
-// The worker is stopped first, so that it starts nothing new while its
-// action's tree is killed, and the action is looked at again while it is:
-// an action that ended meanwhile leaves whatever runs now alone.
+// The worker and the whole tree below it are frozen first, so that nothing
+// starts or ends while the action is looked at again: an action that ended
+// before the freeze ended on its own and is not recorded as stopped, and
+// one still there when frozen cannot end before it is killed.
 std::optional<WorkerEvent> WorkerPool::_stopAction(Worker& worker, pid_t action,
                                                    TimeLimits const& limits) {
     ChildProcess& child = *worker.child;
@@ -126,13 +128,15 @@ std::optional<WorkerEvent> WorkerPool::_stopAction(Worker& worker, pid_t action,
         // It ended; its pipe tells the rest.
         return std::nullopt;
     }
+    freezeDescendants(child.pid());
     auto const children = childrenOf(child.pid());
     if (std::find(children.begin(), children.end(), action) == children.end() || hasEnded(action)) {
+        thawDescendants(child.pid());
         child.resume();
         return std::nullopt;
     }
     WorkerEvent event{WorkerEvent::Kind::ActionStopped, worker.tag, commandLineOf(action),
-                      ageOf(action).value_or(0)};
+                      ageOf(action).value_or(0), std::nullopt};
     killDescendants(child.pid());
     if (std::optional<std::string> const note = limits.stopNote(worker.kind, event.seconds)) {
         child.setStopNote(*note);
@@ -141,6 +145,16 @@ std::optional<WorkerEvent> WorkerPool::_stopAction(Worker& worker, pid_t action,
         child.resume();
     }
     return event;
+}
+
+void WorkerPool::endAdopted() {
+    std::vector<pid_t> workers;
+    for (auto const& worker : _workers) {
+        if (!worker.child->isReaped()) {
+            workers.push_back(worker.child->pid());
+        }
+    }
+    endChildrenExcept(workers);
 }
 
 } // namespace fleet

@@ -31,6 +31,8 @@ struct WorkerEvent {
     std::size_t tag = 0;
     std::string text;
     double seconds = 0;
+    // How an ended worker ended, as waitpid tells it; nullopt when unknown.
+    std::optional<int> waitStatus;
 };
 
 // The forked workers of a run and what the run does to their processes:
@@ -61,6 +63,10 @@ public:
     // before it goes on; a machine listing's worker stays stopped until the
     // pool ends it.
     std::vector<WorkerEvent> stopDueActions(TimeLimits const& limits);
+    // Kills and reaps what the calling process adopted when a worker died
+    // (the caller is a subreaper and starts children through the pool
+    // alone): every child that is not one of the pool's workers.
+    void endAdopted();
 
 private:
     struct Worker {

@@ -6,6 +6,7 @@
 
 #include <gtest/gtest.h>
 
+#include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -66,6 +67,11 @@ bool waitForCommand(std::string const& text) {
 
 // A remote action as the survey runs it: a command whose name is the
 // console's remote action tool (here a link to sleep).
+std::string sleepForever() {
+    pause();
+    return "woke";
+}
+
 class RemoteAction {
 public:
     RemoteAction() { symlink("/bin/sleep", _folder.file("runact-api").c_str()); }
@@ -93,6 +99,21 @@ TEST(WorkerPool, EndedWorkerIsReportedOnceWithItsTagAndResult) {
         EXPECT_EQ(event.text, "result of " + std::to_string(event.tag));
     }
     EXPECT_NE(ended[0].tag, ended[1].tag);
+}
+
+TEST(WorkerPool, KilledWorkerIsReportedEndedWithItsWaitStatusAndNoResult) {
+    WorkerPool pool(gc_NoWake);
+    ASSERT_EQ(pool.start(3, UnitKind::Survey, [] { return sleepForever(); }), std::nullopt);
+    std::vector<pid_t> const workers = fleet::childrenOf(getpid());
+    ASSERT_EQ(workers.size(), 1U);
+    ASSERT_EQ(kill(workers.front(), SIGKILL), 0);
+    std::vector<WorkerEvent> const events = waitFor(pool, WorkerEvent::Kind::Ended);
+    ASSERT_EQ(events.size(), 1U);
+    EXPECT_EQ(events[0].tag, 3U);
+    EXPECT_EQ(events[0].text, "");
+    ASSERT_TRUE(events[0].waitStatus.has_value());
+    EXPECT_TRUE(WIFSIGNALED(*events[0].waitStatus));
+    EXPECT_EQ(WTERMSIG(*events[0].waitStatus), SIGKILL);
 }
 
 TEST(WorkerPool, WorkerThatCannotStartIsNotKeptAndSaysWhy) {
@@ -143,6 +164,23 @@ TEST(WorkerPool, InterruptionStopsAListingsActionAndTheWorkerGoesOn) {
     EXPECT_GE(events[0].seconds, 0.0);
     EXPECT_EQ(events.back().kind, WorkerEvent::Kind::Ended);
     EXPECT_EQ(events.back().text.rfind("went on ", 0), 0U) << events.back().text;
+}
+
+// The action ends (exit 7) as soon as it sees its worker stopped: the pool
+// may freeze it before or after that. Either way one story: a stop is
+// reported exactly when the action was killed (SIGKILL, status 9), never
+// beside an action that ended on its own (status 7 << 8).
+TEST(WorkerPool, ActionEndingAsItsWorkerIsStoppedIsReportedStoppedOnlyWhenKilled) {
+    TimeLimits limits(0);
+    std::string const command =
+        "while read -r line < /proc/$PPID/stat; do set -- $line; [ \"$3\" = T ] && exit 7; done";
+    std::vector<WorkerEvent> const events = interruptWhileRunning(
+        UnitKind::PartitionListing,
+        [command] { return std::to_string(std::system(command.c_str())); }, "while read", limits);
+    ASSERT_FALSE(events.empty());
+    ASSERT_EQ(events.back().kind, WorkerEvent::Kind::Ended);
+    bool const reportedStopped = events.front().kind == WorkerEvent::Kind::ActionStopped;
+    EXPECT_EQ(events.back().text, reportedStopped ? "9" : std::to_string(7 << 8));
 }
 
 TEST(WorkerPool, StoppedSurveyActionLeavesTheNoteOfItsAgeForTheWorker) {

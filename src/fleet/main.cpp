@@ -1,10 +1,15 @@
+#include "fleet/ChildProcess.h"
 #include "fleet/CommandLine.h"
 #include "fleet/MachineListing.h"
+#include "fleet/OutputFolders.h"
+#include "fleet/ProcessTree.h"
+#include "fleet/Recap.h"
 #include "fleet/RunFiles.h"
 #include "fleet/RunLock.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
+#include "fleet/TerminalWidth.h"
 #include "report/ReportCommand.h"
 #include "report/RunSummary.h"
 #include "utility/AtomicFile.h"
@@ -12,15 +17,40 @@
 #include "utility/SystemError.h"
 #include "utility/Trace.h"
 
+#include <poll.h>
+#include <sys/prctl.h>
 #include <unistd.h>
 
 #include <chrono>
+#include <csignal>
 #include <ctime>
 #include <filesystem>
 #include <iostream>
-#include <sstream>
 
 namespace {
+
+// When the run started, and on which console, for its summary and report.
+struct RunClock {
+    std::time_t started;
+    std::chrono::steady_clock::time_point startedAt;
+    std::string consoleHost;
+};
+
+// A signal outweighs a file that could not be written, which outweighs a
+// console whose machines could not be listed (sysexits.h's EX_UNAVAILABLE),
+// which outweighs the overall code: 128 + signal, then 73, then 69, then 0,
+// 4 or 8.
+int finalExitStatus(fleet::SurveyRun const& run, std::vector<std::string> const& failures,
+                    fleet::MachineListing const& listing) {
+    int const status = run.exitStatus();
+    if (status >= 128) {
+        return status;
+    }
+    if (!failures.empty()) {
+        return fleet::gc_ExitCannotCreate;
+    }
+    return listing.failure ? fleet::gc_ExitUnavailable : status;
+}
 
 // Who holds the result folder, as a second run reads it in the lock file.
 std::string holderText() {
@@ -70,55 +100,142 @@ fleet::MachineListing machinesToSurvey(fleet::Options const& options) {
     return listing;
 }
 
-// A console whose machines cannot be listed is unavailable (sysexits.h's
-// EX_UNAVAILABLE), unless a signal ended the run first.
-int exitStatusOf(fleet::SurveyRun const& run, int runStatus, fleet::MachineListing const& listing) {
-    return listing.failure && run.interruptingSignal() == 0 ? fleet::gc_ExitUnavailable : runStatus;
-}
-
-// The summary and the report of a run that has ended. What cannot be
-// written is said in messages, one line each.
-void writeRunFiles(fleet::Options const& options, fleet::SurveyRun const& run, int exitStatus,
-                   std::time_t started, std::chrono::steady_clock::time_point startedAt,
-                   std::optional<report::ListingFailure> const& listingFailure,
-                   std::ostream& messages) {
+// The summary of the run as it stands, with the exit status it ends with so
+// far.
+report::RunSummary summaryOf(fleet::Options const& options, fleet::SurveyRun const& run,
+                             RunClock const& clock, fleet::MachineListing const& listing) {
     fleet::RunFacts facts;
-    facts.listingFailure = listingFailure;
+    facts.listingFailure = listing.failure;
     facts.options = options;
-    // Every unit of work has ended: the host name command may trace here.
-    facts.consoleHost = Utility::get_HostName();
-    facts.started = util::localTimeText(started);
+    facts.consoleHost = clock.consoleHost;
+    facts.started = util::localTimeText(clock.started);
     facts.ended = util::localTimeText(std::time(nullptr));
     facts.elapsedSeconds =
-        std::chrono::duration<double>(std::chrono::steady_clock::now() - startedAt).count();
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - clock.startedAt).count();
     if (run.interruptingSignal() != 0) {
         facts.interruptedBy = fleet::signalName(run.interruptingSignal());
     }
-    facts.exitStatus = exitStatus;
-    nlohmann::ordered_json const summary =
-        report::summaryDocument(fleet::runSummary(facts, run.machines()));
-    try {
-        if (!options.summaryFile.empty()) {
-            util::writeFileAtomically(options.summaryFile, report::summaryText(summary));
-        }
-    } catch (util::SystemError const& failure) {
-        messages << report::gc_ProgramName << ": " << failure.what() << "\n";
-    }
-    if (!options.reportFolder.empty()) {
-        report::writeRunReport(summary, options.reportFolder, messages);
-    }
+    facts.exitStatus = run.exitStatus();
+    return fleet::runSummary(facts, run.machines());
 }
 
-// Diagnostics after the machines' blocks, each on a line of its own,
-// though the last block ends with its code digit and no line end.
-void printAfterBlocks(fleet::SurveyRun const& run, std::string const& messages) {
-    if (messages.empty()) {
+// The report first, then the summary, so that the summary's exit status
+// counts a report that could not be written. Returns what could not be
+// written, "cannot write PATH: reason" each.
+std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::SurveyRun const& run,
+                                       RunClock const& clock,
+                                       fleet::MachineListing const& listing) {
+    std::vector<std::string> failures = run.writeFailures();
+    report::RunSummary summary = summaryOf(options, run, clock, listing);
+    if (!options.reportFolder.empty()) {
+        if (std::optional<std::string> const failure =
+                report::writeRunReport(report::summaryDocument(summary), options.reportFolder)) {
+            failures.push_back(*failure);
+        }
+    }
+    summary.exitStatus = finalExitStatus(run, failures, listing);
+    try {
+        if (!options.summaryFile.empty()) {
+            util::writeFileAtomically(options.summaryFile,
+                                      report::summaryText(report::summaryDocument(summary)));
+        }
+    } catch (util::SystemError const& failure) {
+        failures.emplace_back(failure.what());
+    }
+    return failures;
+}
+
+// The console's host name when the run writes a summary or report, asked in
+// a child process once every unit of work has ended: the host name command
+// runs through system(), which ignores SIGINT in its caller meanwhile, and a
+// signal then must still reach the run. Asked here when no child can be made.
+std::string consoleHostFor(fleet::Options const& options) {
+    if (options.summaryFile.empty() && options.reportFolder.empty()) {
+        return {};
+    }
+    fleet::ChildProcess child([] { return Utility::get_HostName(); });
+    if (!child.isStarted()) {
+        return Utility::get_HostName();
+    }
+    while (child.readAvailable()) {
+        pollfd result{child.resultDescriptor(), POLLIN, 0};
+        // A signal ends the wait early; it is noted once the name is known.
+        ::poll(&result, 1, -1);
+    }
+    return child.takeResult();
+}
+
+// Writes the run's last files. A signal that comes while they are written
+// makes them be written again saying so; once they are in place the
+// signals are held, and the run is finished.
+std::vector<std::string> finishRun(fleet::Options const& options, fleet::SurveyRun& run,
+                                   RunClock clock, fleet::MachineListing const& listing) {
+    clock.consoleHost = consoleHostFor(options);
+    run.noteSignal();
+    int const signalSeen = run.interruptingSignal();
+    std::vector<std::string> failures = writeRunFiles(options, run, clock, listing);
+    fleet::holdSignals();
+    run.noteSignal();
+    if (run.interruptingSignal() != signalSeen) {
+        failures = writeRunFiles(options, run, clock, listing);
+    }
+    return failures;
+}
+
+// The recap of the run, when one is wanted: by default only for a person at
+// a terminal, so that scripts read the blocks alone.
+std::string recapText(fleet::Options const& options, fleet::SurveyRun const& run,
+                      RunClock const& clock) {
+    if (!options.recap.value_or(!options.quiet && isatty(STDERR_FILENO) == 1)) {
+        return "";
+    }
+    fleet::RecapEnding ending;
+    ending.elapsedSeconds =
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - clock.startedAt).count();
+    if (run.interruptingSignal() != 0) {
+        ending.interruptedBy = fleet::signalName(run.interruptingSignal());
+    }
+    ending.summaryFile = options.summaryFile;
+    ending.reportFolder = options.reportFolder;
+    return fleet::Recap(run.machines()).text(ending, fleet::terminalColumns(STDERR_FILENO));
+}
+
+// Diagnostics, then the recap, after the machines' blocks, on lines of their
+// own, though the last block ends with its code digit and no line end.
+void printAfterBlocks(fleet::SurveyRun const& run, std::vector<std::string> const& messages,
+                      std::string const& recap) {
+    if (messages.empty() && recap.empty()) {
         return;
     }
     if (run.endsOnOpenRow()) {
         std::cerr << "\n";
     }
-    std::cerr << messages << std::flush;
+    for (std::string const& message : messages) {
+        std::cerr << report::gc_ProgramName << ": " << message << "\n";
+    }
+    std::cerr << recap << std::flush;
+}
+
+// What ends the run's standard error: the files that could not be written,
+// then, for a run stopped by SIGHUP or SIGPIPE, which nobody sends on
+// purpose (a closed terminal, a reader gone), why it stopped. SIGINT and
+// SIGTERM are asked for, and the summary records every one.
+std::vector<std::string> closingMessages(fleet::SurveyRun const& run,
+                                         std::vector<std::string> messages) {
+    int const signalNumber = run.interruptingSignal();
+    if (signalNumber == SIGHUP || signalNumber == SIGPIPE) {
+        messages.push_back(std::string("stopped by ") + fleet::signalName(signalNumber));
+    }
+    return messages;
+}
+
+// Each output that cannot be written is said before anything runs.
+bool areOutputsWritable(fleet::Options const& options) {
+    std::vector<std::string> const failures = fleet::unwritableOutputs(options);
+    for (std::string const& failure : failures) {
+        std::cerr << report::gc_ProgramName << ": " << failure << std::endl;
+    }
+    return failures.empty();
 }
 
 } // namespace
@@ -134,25 +251,26 @@ int main(int argc, char** argv) {
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;
     }
+    fleet::Options const& options = parsed.options;
+    if (!areOutputsWritable(options)) {
+        return fleet::gc_ExitCannotCreate;
+    }
+    // What a dying worker leaves comes to this process, which ends it.
+    prctl(PR_SET_CHILD_SUBREAPER, 1);
     if (std::optional<std::string> const failure = fleet::installSignalPipe()) {
         std::cerr << report::gc_ProgramName << ": " << *failure << std::endl;
     }
     fleet::RunLock lock(fleet::runLockPath());
-    if (std::optional<int> const refused = lockResultFolder(lock, parsed.options.waitForFolder)) {
+    if (std::optional<int> const refused = lockResultFolder(lock, options.waitForFolder)) {
         return *refused;
     }
-    auto const startedAt = std::chrono::steady_clock::now();
-    std::time_t const started = std::time(nullptr);
-
-    fleet::Options const& options = parsed.options;
+    RunClock const clock{std::time(nullptr), std::chrono::steady_clock::now(), {}};
     fleet::MachineListing const listing = machinesToSurvey(options);
     fleet::SurveyRun run(options, listing.identities);
-    int const exitStatus = exitStatusOf(run, run.run(), listing);
-
-    std::ostringstream messages;
-    if (!options.summaryFile.empty() || !options.reportFolder.empty()) {
-        writeRunFiles(options, run, exitStatus, started, startedAt, listing.failure, messages);
-    }
-    printAfterBlocks(run, messages.str());
-    return exitStatus;
+    run.run();
+    std::vector<std::string> const failures = finishRun(options, run, clock, listing);
+    // Nothing the run started outlives it.
+    fleet::endChildrenExcept({});
+    printAfterBlocks(run, closingMessages(run, failures), recapText(options, run, clock));
+    return finalExitStatus(run, failures, listing);
 }

@@ -29,7 +29,7 @@ std::optional<StopLine> parseStopLine(std::string const& reason) {
     static std::regex const timeLimit(
         R"((?:^|\n)Stopped by the time limit of [^\n]* s after ([0-9]+(?:\.[0-9]+)?) s\.)");
     static std::regex const signal(
-        R"((?:^|\n)Stopped by (SIGINT|SIGTERM) after ([0-9]+(?:\.[0-9]+)?) s\.)");
+        R"((?:^|\n)Stopped by (SIGINT|SIGTERM|SIGHUP|SIGPIPE) after ([0-9]+(?:\.[0-9]+)?) s\.)");
     std::smatch match;
     if (std::regex_search(reason, match, timeLimit)) {
         return StopLine{Stopper::TimeLimit, "", std::stod(match[1].str())};

@@ -17,7 +17,8 @@ enum class Stopper {
 // time limit of T s after S s." or "Stopped by SIGINT after S s.".
 struct StopLine {
     Stopper stopper = Stopper::TimeLimit;
-    // "SIGINT" or "SIGTERM" when a signal stopped the action; else empty.
+    // "SIGINT", "SIGTERM", "SIGHUP" or "SIGPIPE" when a signal stopped the
+    // action; else empty.
     std::string signalName;
     // S: how long the action had run.
     double afterSeconds = 0;

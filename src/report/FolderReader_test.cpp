@@ -77,9 +77,10 @@ TEST(FolderReader, RunWithEveryFailureKindGivesEachPartitionItsFacts) {
               R"("return_code":"8","rc":null,"rc_cmd":null,"document":null,"reason":null,)"
               R"("seconds":null})",
               partitions[3].dump());
-    EXPECT_EQ(R"({"partitions":4,"surveyed":0,"inactive":1,"channel_failure":1,)"
-              R"("client_failure":1,"fetch_failure":1,"timed_out":0,"interrupted":0})",
-              machine["counts"].dump());
+    EXPECT_EQ(
+        R"({"partitions":4,"surveyed":0,"inactive":1,"channel_failure":1,)"
+        R"("client_failure":1,"fetch_failure":1,"timed_out":0,"interrupted":0,"worker_died":0})",
+        machine["counts"].dump());
 }
 
 TEST(FolderReader, ShippedDemoRunIsReadWithSurveyedDocumentsMatched) {
@@ -96,9 +97,10 @@ TEST(FolderReader, ShippedDemoRunIsReadWithSurveyedDocumentsMatched) {
     EXPECT_EQ("", partitions[6]["host"]);
     EXPECT_EQ("surveyed", partitions[6]["outcome"]);
     EXPECT_EQ("4", summary["return_code"]);
-    EXPECT_EQ(R"({"machines":1,"partitions":7,"surveyed":3,"inactive":1,"channel_failure":1,)"
-              R"("client_failure":1,"fetch_failure":1,"timed_out":0,"interrupted":0})",
-              summary["totals"].dump());
+    EXPECT_EQ(
+        R"({"machines":1,"partitions":7,"surveyed":3,"inactive":1,"channel_failure":1,)"
+        R"("client_failure":1,"fetch_failure":1,"timed_out":0,"interrupted":0,"worker_died":0})",
+        summary["totals"].dump());
 }
 
 TEST(FolderReader, SummaryHeadSaysWhatFilesCannotTell) {

@@ -16,6 +16,7 @@ std::array<OutcomeText, gc_OutcomeCount> const gc_OutcomeTable = {{
     {Outcome::FetchFailure, "fetch_failure", "fetch failure", "f"},
     {Outcome::TimedOut, "timed_out", "timed out", "t"},
     {Outcome::Interrupted, "interrupted", "interrupted", "x"},
+    {Outcome::WorkerDied, "worker_died", "worker died", "w"},
 }};
 
 } // namespace
@@ -40,6 +41,10 @@ std::optional<Outcome> outcomeNamed(std::string const& name) {
         return std::nullopt;
     }
     return found->outcome;
+}
+
+bool isFailure(Outcome outcome) {
+    return outcome != Outcome::Surveyed && outcome != Outcome::Inactive;
 }
 
 Outcome outcomeOf(Kind kind) {

@@ -19,6 +19,7 @@ enum class Outcome {
     FetchFailure,
     TimedOut,
     Interrupted,
+    WorkerDied,
 };
 
 // One row of the outcome table.
@@ -33,7 +34,7 @@ struct OutcomeText {
     char const* pageClass;
 };
 
-constexpr std::size_t gc_OutcomeCount = 7;
+constexpr std::size_t gc_OutcomeCount = 8;
 
 // Every outcome once, in the order summaries count them and the report
 // shows them.
@@ -43,6 +44,9 @@ OutcomeText const& textOf(Outcome outcome);
 char const* outcomeName(Outcome outcome);
 // The outcome of a summary name; nullopt for a name the table lacks.
 std::optional<Outcome> outcomeNamed(std::string const& name);
+// Whether a partition that ended so failed: every outcome but surveyed and
+// inactive (a partition that is not running is no failure of the run).
+bool isFailure(Outcome outcome);
 // The outcome of a survey that ran to its end.
 Outcome outcomeOf(Quorvex::PYLON::VPD::PartitionOutcomeKind kind);
 

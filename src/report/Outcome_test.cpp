@@ -12,7 +12,7 @@ TEST(Outcome, TableListsEveryOutcomeInEnumeratorOrder) {
     for (std::size_t i = 0; i < table.size(); ++i) {
         EXPECT_EQ(static_cast<std::size_t>(table[i].outcome), i) << table[i].name;
     }
-    EXPECT_EQ(table.back().outcome, Outcome::Interrupted);
+    EXPECT_EQ(table.back().outcome, Outcome::WorkerDied);
 }
 
 TEST(Outcome, NamesLabelsAndPageClassesAreDistinct) {
@@ -43,4 +43,11 @@ TEST(Outcome, SurveyKindsMapToTheirOutcomes) {
     EXPECT_EQ(report::outcomeOf(Kind::ChannelFailure), Outcome::ChannelFailure);
     EXPECT_EQ(report::outcomeOf(Kind::ClientFailure), Outcome::ClientFailure);
     EXPECT_EQ(report::outcomeOf(Kind::FetchFailure), Outcome::FetchFailure);
+}
+
+TEST(Outcome, EveryOutcomeButSurveyedAndInactiveIsAFailure) {
+    for (auto const& row : report::outcomeTable()) {
+        bool const isFine = row.outcome == Outcome::Surveyed || row.outcome == Outcome::Inactive;
+        EXPECT_EQ(report::isFailure(row.outcome), !isFine) << row.name;
+    }
 }

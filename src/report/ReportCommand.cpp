@@ -12,15 +12,15 @@ namespace report {
 
 namespace {
 
-bool writeReportReporting(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
-                          std::string const& folder, std::ostream& errors) {
+// Why the report could not be written ("report: cannot write ..."), or nothing.
+std::optional<std::string> reportFailure(nlohmann::ordered_json const& summary,
+                                         std::string const& vpdFolder, std::string const& folder) {
     try {
         writeReport(summary, vpdFolder, folder);
     } catch (std::exception const& failure) {
-        errors << gc_ProgramName << ": report: " << failure.what() << "\n";
-        return false;
+        return std::string("report: ") + failure.what();
     }
-    return true;
+    return std::nullopt;
 }
 
 // The summary of the files in vpdFolder; nothing, the reason said on errors,
@@ -76,17 +76,18 @@ int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::os
     if (!summary) {
         return gc_ExitNothingToRead;
     }
-    if (!writeReportReporting(*summary, request.vpdFolder, request.folder, errors)) {
+    if (std::optional<std::string> const failure =
+            reportFailure(*summary, request.vpdFolder, request.folder)) {
+        errors << gc_ProgramName << ": " << *failure << "\n";
         return 1;
     }
     out << request.folder << "/index.html\n";
     return 0;
 }
 
-void writeRunReport(nlohmann::ordered_json const& summary, std::string const& folder,
-                    std::ostream& errors) {
-    // Its failure is said on errors and leaves the run's exit status as it is.
-    static_cast<void>(writeReportReporting(summary, gc_DefaultVpdFolder, folder, errors));
+std::optional<std::string> writeRunReport(nlohmann::ordered_json const& summary,
+                                          std::string const& folder) {
+    return reportFailure(summary, gc_DefaultVpdFolder, folder);
 }
 
 } // namespace report

@@ -3,6 +3,7 @@
 #include <CLI/App.hpp>
 #include <nlohmann/json.hpp>
 
+#include <optional>
 #include <ostream>
 #include <string>
 
@@ -47,10 +48,10 @@ CLI::Option* addReportOption(CLI::App& app, std::string& folder);
 int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors);
 
 // Writes the report of a run's summary into folder, its documents lying in
-// the console's VPD folder; prints nothing on success, so that the run's
-// standard output stays what the survey prints. A file that cannot be
-// written is said on errors with its reason.
-void writeRunReport(nlohmann::ordered_json const& summary, std::string const& folder,
-                    std::ostream& errors);
+// the console's VPD folder; prints nothing, so that the run's standard
+// streams stay what the survey prints. Why it could not be written
+// ("report: cannot write PATH: reason"), or nothing when it was.
+[[nodiscard]] std::optional<std::string> writeRunReport(nlohmann::ordered_json const& summary,
+                                                        std::string const& folder);
 
 } // namespace report

@@ -77,7 +77,7 @@ struct RunSummary {
     std::string ended;
     ElapsedSeconds elapsedSeconds = 0LL;
     SummaryOptions options;
-    // "SIGINT" or "SIGTERM" when a signal interrupted the run.
+    // The signal that interrupted the run (SIGINT, SIGTERM, SIGHUP, SIGPIPE).
     std::optional<std::string> interruptedBy;
     std::optional<int> exitStatus;
     std::vector<MachineSummary> machines;

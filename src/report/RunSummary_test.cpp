@@ -69,12 +69,14 @@ TEST(RunSummary, CountsAndCodesAreDerivedFromThePartitions) {
         oneMachine({partition(Outcome::Surveyed, "0"), partition(Outcome::FetchFailure, "8")}));
     Json const& machine = document["machines"][0];
     EXPECT_EQ("4", machine["return_code"]);
-    EXPECT_EQ(R"({"partitions":2,"surveyed":1,"inactive":0,"channel_failure":0,)"
-              R"("client_failure":0,"fetch_failure":1,"timed_out":0,"interrupted":0})",
-              machine["counts"].dump());
-    EXPECT_EQ(R"({"machines":1,"partitions":2,"surveyed":1,"inactive":0,"channel_failure":0,)"
-              R"("client_failure":0,"fetch_failure":1,"timed_out":0,"interrupted":0})",
-              document["totals"].dump());
+    EXPECT_EQ(
+        R"({"partitions":2,"surveyed":1,"inactive":0,"channel_failure":0,)"
+        R"("client_failure":0,"fetch_failure":1,"timed_out":0,"interrupted":0,"worker_died":0})",
+        machine["counts"].dump());
+    EXPECT_EQ(
+        R"({"machines":1,"partitions":2,"surveyed":1,"inactive":0,"channel_failure":0,)"
+        R"("client_failure":0,"fetch_failure":1,"timed_out":0,"interrupted":0,"worker_died":0})",
+        document["totals"].dump());
     EXPECT_EQ("4", document["return_code"]);
 }
 

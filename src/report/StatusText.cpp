@@ -47,6 +47,9 @@ std::optional<Outcome> outcomeOfStatusText(std::string const& statusText) {
     if (statusText == gc_InterruptedStatusText) {
         return Outcome::Interrupted;
     }
+    if (statusText == gc_WorkerDiedStatusText) {
+        return Outcome::WorkerDied;
+    }
     if (isCodeAfter(statusText, gc_ChannelFailedPrefix)) {
         return Outcome::ChannelFailure;
     }

@@ -10,6 +10,9 @@ namespace report {
 // The status text of a partition whose survey a signal to quorvex-survey
 // stopped or kept from starting; the survey itself never writes it.
 inline constexpr char gc_InterruptedStatusText[] = "Interrupted - not surveyed";
+// The status text of a partition whose worker died (killed by a signal,
+// crashed) before it told how the survey ended.
+inline constexpr char gc_WorkerDiedStatusText[] = "Worker died - not surveyed";
 // The status text of a partition whose worker could not be started.
 inline constexpr char gc_NotStartedStatusText[] = "Failed - not started";
 // A partition's code, as the survey prints it: surveyed, or not.

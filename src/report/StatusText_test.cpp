@@ -13,6 +13,11 @@ TEST(StatusText, FixedTextsOfSurveyedInactiveAndInterrupted) {
     EXPECT_EQ(Outcome::Interrupted, outcomeOfStatusText("Interrupted - not surveyed"));
 }
 
+TEST(StatusText, FixedTextOfADeadWorker) {
+    EXPECT_EQ(Outcome::WorkerDied, outcomeOfStatusText("Worker died - not surveyed"));
+    EXPECT_EQ(std::nullopt, outcomeOfStatusText("Worker died"));
+}
+
 TEST(StatusText, ChannelFailureWithItsCode) {
     EXPECT_EQ(Outcome::ChannelFailure, outcomeOfStatusText("RELAY Failed, rc = 4"));
     EXPECT_EQ(Outcome::ChannelFailure, outcomeOfStatusText("RELAY Failed, rc = 4294967295"));

@@ -29,6 +29,10 @@ struct PartitionOutcome {
     std::optional<int> rcCmd;
     // The default document's reason; empty when no default document was made.
     std::string reason;
+    // errno of the default document's failed open or write, 0 when it was
+    // written or none was due. The tool stays silent about it; quorvex-survey
+    // names the document on standard error.
+    int documentError = 0;
 };
 
 } // namespace Quorvex::PYLON::VPD

@@ -11,6 +11,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <cerrno>
 #include <cstdint>
 #include <fstream>
 #include <limits>
@@ -36,6 +37,12 @@ bool _u_build_DefaultDocument(Quorvex::System::Partition const& partition,
         return false;
     }
     return true;
+}
+
+// errno of the call a stream saw fail; a stream that failed without one
+// (it does not say why) reads as an input/output error.
+int _u_get_FailedCallError() {
+    return errno != 0 ? errno : EIO;
 }
 
 } // namespace
@@ -82,17 +89,29 @@ void u_create_VPD_ResourceSet_forFailedPartition(Quorvex::System::Partition cons
     set.get_Resource().insert_ResourceList(partitions);
 }
 
-void u_create_DefaultXML_forFailedPartition(Quorvex::System::Partition const& partition,
-                                            std::string const& reason,
-                                            std::string const& localFileName) {
+int u_create_DefaultXML_forFailedPartition(Quorvex::System::Partition const& partition,
+                                           std::string const& reason,
+                                           std::string const& localFileName) {
     Quorvex::VPD::ResourceSet set;
     if (!_u_build_DefaultDocument(partition, reason, set)) {
-        return;
+        return 0;
     }
+    errno = 0;
+    // Written in place, as the console places a fetched document. Kept for the
+    // inventory importers: see docs/compatibility.md#document-in-place
     std::ofstream document(Quorvex::PYLON::VPD::get_LocalResultPath(localFileName));
+    if (!document) {
+        return _u_get_FailedCallError();
+    }
     Transform::VPD_2_OStream{document}(set);
     document.flush();
+    // The first failing write leaves its errno; the stream writes nothing after it.
+    int const writeError = document ? 0 : _u_get_FailedCallError();
     document.close();
+    if (writeError == 0 && !document) {
+        return _u_get_FailedCallError();
+    }
+    return writeError;
 }
 
 // Kept for the inventory importers: see docs/compatibility.md#failure-reason

@@ -25,10 +25,13 @@ void u_create_VPD_ResourceSet_forFailedPartition(Quorvex::System::Partition cons
 // Writes the default document of a failed partition to the path of the
 // local result name localFileName (see Survey_Files.h), replacing an earlier
 // file. Nothing is written when the file cannot be opened or the machine's
-// identity cannot be put into the document.
-void u_create_DefaultXML_forFailedPartition(Quorvex::System::Partition const& partition,
-                                            std::string const& reason,
-                                            std::string const& localFileName);
+// identity cannot be put into the document. Returns errno of the open or
+// write that failed, 0 otherwise; the survey tool itself says nothing about
+// it, quorvex-survey reports it (its callers read the result, the bytes and
+// the name of the file stay as they are).
+[[nodiscard]] int
+u_create_DefaultXML_forFailedPartition(Quorvex::System::Partition const& partition,
+                                       std::string const& reason, std::string const& localFileName);
 
 // "\n", the return code's pairs one a line as "[key] = value" with the keys
 // right-aligned, then "\n" and a line end.

@@ -11,6 +11,11 @@
 
 #include <string>
 
+#include <sys/resource.h>
+
+#include <cerrno>
+#include <csignal>
+
 namespace {
 
 namespace Survey_Utility = ::Quorvex_PYLON_VPD_Survey_ClientPartition_Utility;
@@ -38,8 +43,9 @@ protected:
 };
 
 TEST_F(DefaultDocument, IsWrittenUnderTheConsoleFolderWithoutLineEndAfterItsLastLine) {
-    Survey_Utility::u_create_DefaultXML_forFailedPartition(u_make_Partition("1234-ABC_10ABCDE"),
-                                                           "why", gc_LocalFile);
+    EXPECT_EQ(Survey_Utility::u_create_DefaultXML_forFailedPartition(
+                  u_make_Partition("1234-ABC_10ABCDE"), "why", gc_LocalFile),
+              0);
     std::string const document = QuorvexTest::readFile(u_path(gc_LocalFile));
     EXPECT_EQ(document.rfind("<?xml version=\"1.0\" encoding=\"UTF-8\"?><com.zor.inventory "
                              "version=\"1.0\">\n",
@@ -51,8 +57,9 @@ TEST_F(DefaultDocument, IsWrittenUnderTheConsoleFolderWithoutLineEndAfterItsLast
 
 TEST_F(DefaultDocument, WritingItForAPartitionThatLeftARealResultReplacesThatFile) {
     QuorvexTest::writeFile(u_path(gc_LocalFile), std::string(10000, '#'));
-    Survey_Utility::u_create_DefaultXML_forFailedPartition(u_make_Partition("1234-ABC_10ABCDE"),
-                                                           "why", gc_LocalFile);
+    EXPECT_EQ(Survey_Utility::u_create_DefaultXML_forFailedPartition(
+                  u_make_Partition("1234-ABC_10ABCDE"), "why", gc_LocalFile),
+              0);
     std::string const document = QuorvexTest::readFile(u_path(gc_LocalFile));
     EXPECT_EQ(document.find('#'), std::string::npos);
     EXPECT_EQ(document.substr(document.size() - 20), "</com.zor.inventory>");
@@ -62,16 +69,37 @@ TEST_F(DefaultDocument, IsNotWrittenForAMachineWithoutDashAndAnEarlierFileStays)
     std::string const localFile =
         "VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234MMAERROR_10ABCDEERROR-2.VPD.xml";
     QuorvexTest::writeFile(u_path(localFile), "earlier");
-    Survey_Utility::u_create_DefaultXML_forFailedPartition(u_make_Partition("1234MMA_10ABCDE"),
-                                                           "why", localFile);
+    EXPECT_EQ(Survey_Utility::u_create_DefaultXML_forFailedPartition(
+                  u_make_Partition("1234MMA_10ABCDE"), "why", localFile),
+              0)
+        << "nothing was due";
     EXPECT_EQ(QuorvexTest::readFile(u_path(localFile)), "earlier");
 }
 
-TEST_F(DefaultDocument, FileThatCannotBeOpenedIsSilentlyMissing) {
+TEST_F(DefaultDocument, FileThatCannotBeOpenedIsMissingAndItsErrorIsReturned) {
     std::string const localFile = "no-such-folder/document.VPD.xml";
-    Survey_Utility::u_create_DefaultXML_forFailedPartition(u_make_Partition("1234-ABC_10ABCDE"),
-                                                           "why", localFile);
+    EXPECT_EQ(Survey_Utility::u_create_DefaultXML_forFailedPartition(
+                  u_make_Partition("1234-ABC_10ABCDE"), "why", localFile),
+              ENOENT);
     EXPECT_FALSE(QuorvexTest::fileExists(u_path(localFile)));
+}
+
+// A write cut short by the file size limit stands for a full disk: the
+// document is left cut short under its name, and the error is returned.
+TEST_F(DefaultDocument, WriteThatFailsReturnsItsErrorAndLeavesTheCutDocument) {
+    QuorvexTest::CommandResult const child = QuorvexTest::runInChild([] {
+        std::signal(SIGXFSZ, SIG_IGN);
+        rlimit const limit{100, 100};
+        if (setrlimit(RLIMIT_FSIZE, &limit) != 0) {
+            return 2;
+        }
+        return Survey_Utility::u_create_DefaultXML_forFailedPartition(
+                   u_make_Partition("1234-ABC_10ABCDE"), "why", gc_LocalFile) == EFBIG
+                   ? 0
+                   : 1;
+    });
+    EXPECT_EQ(child.exitStatus, 0);
+    EXPECT_EQ(QuorvexTest::readFile(u_path(gc_LocalFile)).size(), 100u);
 }
 
 } // namespace

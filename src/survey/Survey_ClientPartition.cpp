@@ -126,8 +126,8 @@ void u_write_DefaultDocument(::Quorvex::System::Partition const& partition,
     if (!note.empty()) {
         outcome.reason += note + "\n";
     }
-    Survey_Utility::u_create_DefaultXML_forFailedPartition(partition, outcome.reason,
-                                                           names.localResult);
+    outcome.documentError = Survey_Utility::u_create_DefaultXML_forFailedPartition(
+        partition, outcome.reason, names.localResult);
     if (!note.empty()) {
         g_Trace << note << ::std::endl;
     }

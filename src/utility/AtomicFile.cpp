@@ -39,18 +39,30 @@ mode_t newFileMode() {
 
 } // namespace
 
+void flushFolderToDisk(std::string const& folder) {
+    int const descriptor = ::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    if (descriptor < 0) {
+        throw SystemError(gc_Operation, folder, errno);
+    }
+    int const error = ::fsync(descriptor) == 0 ? 0 : errno;
+    ::close(descriptor);
+    if (error != 0 && error != EINVAL) {
+        throw SystemError(gc_Operation, folder, error);
+    }
+}
+
 void writeFileAtomically(std::string const& path, std::string const& text) {
     std::string const pattern = folderOf(path) + "/." + baseNameOf(path) + ".XXXXXX";
     std::vector<char> temporary(pattern.begin(), pattern.end());
     temporary.push_back('\0');
-    int const descriptor = ::mkstemp(temporary.data());
+    int const descriptor = ::mkostemp(temporary.data(), O_CLOEXEC);
     if (descriptor < 0) {
         throw SystemError(gc_Operation, path, errno);
     }
     // mkstemp makes the file readable by its owner only; the file gets the
     // mode any file written in place would get, as the survey tool's files do.
     ::fchmod(descriptor, newFileMode());
-    bool const complete = writeAll(descriptor, text);
+    bool const complete = writeAll(descriptor, text) && ::fsync(descriptor) == 0;
     int const error = errno;
     bool const closed = ::close(descriptor) == 0;
     if (!complete || !closed || std::rename(temporary.data(), path.c_str()) != 0) {
@@ -58,6 +70,7 @@ void writeFileAtomically(std::string const& path, std::string const& text) {
         ::unlink(temporary.data());
         throw SystemError(gc_Operation, path, reported);
     }
+    flushFolderToDisk(folderOf(path));
 }
 
 } // namespace util

@@ -6,9 +6,17 @@ namespace util {
 
 // Writes text into path through a temporary file in the same folder that is
 // renamed over path once complete, so a reader sees the old file or the new
-// one, never part of it. The file has the mode a new file gets under the
-// process's umask. Throws SystemError ("write", path, errno of the failing
-// call) when the file cannot be written; the temporary file is removed then.
+// one, never part of it. The temporary file is flushed to the disk before
+// the rename and the folder after it, so that a crash or a power loss also
+// leaves the old file or the new one, never an empty one. The file has the
+// mode a new file gets under the process's umask. Throws SystemError
+// ("write", path, errno of the failing call) when the file cannot be
+// written; the temporary file is removed then.
 void writeFileAtomically(std::string const& path, std::string const& text);
+
+// Flushes folder's entries to the disk, so that a rename in it lasts.
+// Throws SystemError ("write", folder, errno) when it cannot; a file system
+// that keeps no folder to flush (EINVAL) is no failure.
+void flushFolderToDisk(std::string const& folder);
 
 } // namespace util

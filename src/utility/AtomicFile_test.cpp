@@ -131,3 +131,39 @@ TEST(AtomicFile, FailedWriteThrowsItsErrnoAndRemovesTheTemporaryFile) {
 }
 
 } // namespace
+
+namespace {
+
+std::optional<util::SystemError> failureFlushing(std::string const& folder) {
+    try {
+        util::flushFolderToDisk(folder);
+    } catch (util::SystemError const& error) {
+        return error;
+    }
+    return std::nullopt;
+}
+
+TEST(AtomicFileFolderFlush, FolderIsFlushedWithoutFailure) {
+    QuorvexTest::TemporaryDirectory folder;
+    EXPECT_FALSE(failureFlushing(folder.path()).has_value());
+}
+
+// The folder flush after the rename says which folder it could not flush.
+TEST(AtomicFileFolderFlush, MissingFolderThrowsWriteWithTheFolderAndEnoent) {
+    QuorvexTest::TemporaryDirectory folder;
+    auto const error = failureFlushing(folder.file("gone"));
+    ASSERT_TRUE(error);
+    EXPECT_EQ(ENOENT, error->errorNumber());
+    EXPECT_EQ("cannot write " + folder.file("gone") + ": No such file or directory",
+              std::string(error->what()));
+}
+
+TEST(AtomicFileFolderFlush, RegularFileThrowsEnotdir) {
+    QuorvexTest::TemporaryDirectory folder;
+    QuorvexTest::writeFile(folder.file("file"), "x");
+    auto const error = failureFlushing(folder.file("file"));
+    ASSERT_TRUE(error);
+    EXPECT_EQ(ENOTDIR, error->errorNumber());
+}
+
+} // namespace

@@ -14,6 +14,8 @@ constexpr char gc_UniqueSuffix[] = ".XXXXXX";
 
 } // namespace
 
+TemporaryFile::Observer TemporaryFile::ms_Observer = nullptr;
+
 TemporaryFile::TemporaryFile(std::string const& baseFileName)
     : _baseFileName(baseFileName), _actualFileName() {
     // mkstemp writes the generated name into its argument.
@@ -25,6 +27,9 @@ TemporaryFile::TemporaryFile(std::string const& baseFileName)
     ::close(descriptor);
     _actualFileName = std::move(name);
     _valid = true;
+    if (ms_Observer != nullptr) {
+        ms_Observer(_actualFileName, true);
+    }
 }
 
 bool TemporaryFile::isValid() const {
@@ -44,6 +49,11 @@ std::string TemporaryFile::get_BaseFileName() const {
 }
 
 bool TemporaryFile::remove() {
+    // Told before the deletion: a name it was told of as deleted is never
+    // one the observer may still remove.
+    if (_valid && ms_Observer != nullptr) {
+        ms_Observer(_actualFileName, false);
+    }
     // The C library's remove: the member of the same name hides it here.
     if (!_valid || ::remove(_actualFileName.c_str()) != 0) {
         return false;

@@ -9,6 +9,13 @@ namespace Utility {
 // never deletes it.
 class TemporaryFile {
 public:
+    // Told the name of each file right after it is made (made true) and
+    // right before it is deleted (made false). The one-machine tool leaves it
+    // unset; quorvex-survey's workers set it, so that the run can remove what
+    // a worker killed midway leaves behind.
+    using Observer = void (*)(std::string const& name, bool made);
+    static Observer ms_Observer;
+
     // Creates baseFileName + ".XXXXXX" with the six X replaced; on failure the
     // object stays invalid and nothing is reported.
     explicit TemporaryFile(std::string const& baseFileName);

@@ -73,6 +73,25 @@ void DifferentialCase::expectSameAsReference(int jobs) const {
     _expectSameFolder(run, "Trace");
 }
 
+void DifferentialCase::expectRefusedUpFront(int jobs,
+                                            std::vector<std::string> const& stderrTexts) const {
+    std::string const run = "j" + std::to_string(jobs);
+    if (!QuorvexTest::fileExists(_file(run, "exit-status"))) {
+        ADD_FAILURE() << name() << " -j " << jobs << ": the run did not happen";
+        return;
+    }
+    std::string const printed = QuorvexTest::readFile(_file(run, "stderr"));
+    EXPECT_TRUE(QuorvexTest::contains(stderrTexts, printed))
+        << name() << " " << run << ": " << printed;
+    _expectEqual(run, "stdout", "", QuorvexTest::readFile(_file(run, "stdout")));
+    _expectEqual(run, "exit status", "73\n", QuorvexTest::readFile(_file(run, "exit-status")));
+    _expectEqual(run, "console command lines", "", QuorvexTest::readFile(_file(run, "calls")));
+    _expectEqual(run, "files left in /tmp", "", QuorvexTest::readFile(_file(run, "tmp")));
+    _expectEqual(run, "names in VPD", "", joinedLines(QuorvexTest::listFolder(_file(run, "VPD"))));
+    _expectEqual(run, "names in Trace", "",
+                 joinedLines(QuorvexTest::listFolder(_file(run, "Trace"))));
+}
+
 std::string DifferentialCase::_file(std::string const& run, std::string const& name) const {
     return _folder + "/" + run + "/" + name;
 }

@@ -25,6 +25,10 @@ public:
 
     std::string name() const;
     void expectSameAsReference(int jobs) const;
+    // The console-wide survey refused to start: exit status 73, standard
+    // error one of the given texts, nothing else printed, no console command
+    // run, nothing written, nothing left in /tmp.
+    void expectRefusedUpFront(int jobs, std::vector<std::string> const& stderrTexts) const;
 
 private:
     std::string _file(std::string const& run, std::string const& name) const;

@@ -48,15 +48,36 @@ TEST(FleetDifferential, ShippedScenariosGiveTheSameResults) {
     expectSameAsReference(batch);
 }
 
-// Result folders that are missing or read-only: whatever the one-machine
-// tool leaves and prints then, the console-wide survey does too.
+// Result folders that are missing or read-only: the one-machine tool runs
+// its whole survey and keeps what it can, silently; the console-wide survey
+// refuses to start, naming the folder and why, before any console command.
 class ResultFolders : public ::testing::TestWithParam<std::string> {};
 
-TEST_P(ResultFolders, GiveTheSameResults) {
+// The line quorvex-survey prints for the folder the sandbox option spoils. A
+// read-only folder refuses writes with "Read-only file system" in a mount
+// namespace and "Permission denied" under proot (docs/sandbox.md).
+std::vector<std::string> refusalLines(std::string const& sandboxOption) {
+    std::string const folder = sandboxOption.find("vpd") != std::string::npos
+                                   ? "/var/adm/quorvex/VPD"
+                                   : "/var/adm/quorvex/Trace";
+    std::string const line = "quorvex-survey: cannot write into " + folder + ": ";
+    if (sandboxOption.rfind("--no-", 0) == 0) {
+        return {line + "No such file or directory\n"};
+    }
+    return {line + "Read-only file system\n", line + "Permission denied\n"};
+}
+
+TEST_P(ResultFolders, RefuseToStartWithExitStatus73) {
     DifferentialBatch batch;
     batch.addShipped("demo", "demo.scn", {"9119-MHE_21ABCDE"}, false);
     batch.addShipped("odd-output", "odd-output.scn", {"9119-MHE_21ABCDE"}, false);
-    expectSameAsReference(batch, {GetParam()});
+    QuorvexTest::CommandResult const result = batch.run(gc_JobCounts, {GetParam()});
+    ASSERT_EQ(result.exitStatus, 0) << "the cases did not all run: " << result.stderrText;
+    for (FleetTest::DifferentialCase const& differentialCase : batch.cases()) {
+        for (int const jobs : gc_JobCounts) {
+            differentialCase.expectRefusedUpFront(jobs, refusalLines(GetParam()));
+        }
+    }
 }
 
 INSTANTIATE_TEST_SUITE_P(FleetDifferential, ResultFolders,

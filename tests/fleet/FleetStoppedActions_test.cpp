@@ -220,10 +220,24 @@ TEST(FleetTimeLimit, ZeroMeansNoLimit) {
 
 class FleetInterruption : public ::testing::TestWithParam<int> {};
 
+std::string signalNameOf(int signalNumber) {
+    switch (signalNumber) {
+    case SIGINT:
+        return "SIGINT";
+    case SIGHUP:
+        return "SIGHUP";
+    default:
+        return "SIGTERM";
+    }
+}
+
 // Partition 1 is surveyed at once; 2 and 3 hang in flight (-j 2); 4 never starts.
 TEST_P(FleetInterruption, StopsWhatIsInFlightAndMarksWhatDidNotFinish) {
     int const signalNumber = GetParam();
-    std::string const signalName = signalNumber == SIGINT ? "SIGINT" : "SIGTERM";
+    std::string const signalName = signalNameOf(signalNumber);
+    // A closed terminal is nobody's request: the run says why it stopped.
+    std::string const closing =
+        signalNumber == SIGHUP ? "\nquorvex-survey: stopped by SIGHUP\n" : "";
     clearResultFolders();
     SimulatedConsole const console(listing(4) + "[runCmdOnPartition 1]\n" + gc_Answer +
                                    "[runCmdOnPartition *]\n" + gc_Hang + fetchAnswer());
@@ -244,7 +258,7 @@ TEST_P(FleetInterruption, StopsWhatIsInFlightAndMarksWhatDidNotFinish) {
     EXPECT_EQ(QuorvexTest::readFile(work.file("stdout")),
               "VPD/" + document("1") + "\nVPD/" + document("2") + "\nVPD/" + document("3") + "\n");
     EXPECT_EQ(QuorvexTest::readFile(work.file("stderr")),
-              "0\n8\n8\n\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n4");
+              "0\n8\n8\n\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n4" + closing);
     EXPECT_EQ(
         QuorvexTest::listFolder(gc_VPD),
         (std::vector<std::string>{document("1"), document("2"), document("3"), gc_StatusFile}))
@@ -265,10 +279,100 @@ TEST_P(FleetInterruption, StopsWhatIsInFlightAndMarksWhatDidNotFinish) {
               (std::vector<std::string>{"surveyed", "interrupted", "interrupted", "interrupted"}));
 }
 
-INSTANTIATE_TEST_SUITE_P(Signals, FleetInterruption, ::testing::Values(SIGINT, SIGTERM),
+// The run's processes and files die with the run and with their worker.
+// Generous bound for the processes of a killed run to be gone: the
+// documented one is a second.
+constexpr double gc_GoneBound = 1.0 + gc_Margin;
+
+// The survey's own process: the test's one child.
+int surveyPid() {
+    std::vector<int> const children = FleetTest::childrenOf(::getpid());
+    return children.size() == 1 ? children.front() : -1;
+}
+
+// Waits up to the bound until no process of the console is left.
+std::vector<std::string> processesLeftAfter(SimulatedConsole const& console, double bound) {
+    double const until = FleetTest::monotonicSeconds() + bound;
+    std::vector<std::string> left = FleetTest::processesOfConsole(console.logPath());
+    while (!left.empty() && FleetTest::monotonicSeconds() < until) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(20));
+        left = FleetTest::processesOfConsole(console.logPath());
+    }
+    return left;
+}
+
+TEST(FleetSupervision, KilledRunLeavesNoProcessAndNoTemporaryFile) {
+    clearResultFolders();
+    SimulatedConsole const console(listing(3) + "[runCmdOnPartition *]\n" + gc_Hang);
+    QuorvexTest::TemporaryDirectory const work;
+    SurveyProcess survey = startSurvey(work, "0");
+    ASSERT_TRUE(waitForClientRuns(console, {"1", "2"})) << "partitions 1 and 2 never started";
+    survey.signal(SIGKILL);
+    EXPECT_EQ(survey.waitForExit(30.0), 128 + SIGKILL);
+    EXPECT_EQ(processesLeftAfter(console, gc_GoneBound), std::vector<std::string>{})
+        << "processes of the killed run left running";
+    expectNothingLeft(console);
+}
+
+// -j 1: while partition 2 hangs, its worker is the survey's one child.
+TEST(FleetSupervision, KilledWorkerIsRecordedAsDiedAndLeavesNothingBehind) {
+    clearResultFolders();
+    SimulatedConsole const console(listing(3) + "[runCmdOnPartition 2]\n" + gc_Hang +
+                                   "[runCmdOnPartition *]\n" + gc_Answer + fetchAnswer());
+    QuorvexTest::TemporaryDirectory const work;
+    SurveyProcess survey({FleetTest::consoleWideTool(), "-j", "1", "--summary",
+                          work.file("summary.json"), gc_Identity},
+                         work.file("stdout"), work.file("stderr"));
+    ASSERT_TRUE(waitForClientRuns(console, {"2"})) << "partition 2 never started";
+    std::vector<int> const workers = FleetTest::childrenOf(surveyPid());
+    ASSERT_EQ(workers.size(), 1u);
+    EXPECT_EQ(::kill(workers.front(), SIGKILL), 0);
+    EXPECT_EQ(survey.waitForExit(60.0), 4) << QuorvexTest::readFile(work.file("stderr"));
+    expectNothingLeft(console);
+
+    EXPECT_EQ(QuorvexTest::readFile(gc_VPD + std::string(gc_StatusFile)),
+              "host1 [10.1.1.11] - VPD Survey - Ok\n"
+              "host2 [10.1.1.12] - VPD Survey - Worker died - not surveyed\n"
+              "host3 [10.1.1.13] - VPD Survey - Ok\n");
+    EXPECT_EQ(QuorvexTest::readFile(work.file("stderr")),
+              "0\n8\n0\n\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n4");
+    std::regex const reason(R"(The survey's worker was killed by SIGKILL after [0-9]+\.[0-9] s\.)");
+    std::string const died = QuorvexTest::readFile(gc_VPD + document("2"));
+    EXPECT_TRUE(std::regex_search(died, reason)) << died;
+    FleetTest::SummaryFile const summary(work.file("summary.json"));
+    EXPECT_EQ(summary.validationProblems(), "");
+    EXPECT_EQ(summary.outcomes(),
+              (std::vector<std::string>{"surveyed", "worker_died", "surveyed"}));
+}
+
+// The hung action and the helper it left hold only standard input, output
+// and error: neither the trace piece nor a pipe of the run.
+TEST(FleetSupervision, ActionsInheritOnlyTheStandardDescriptors) {
+    clearResultFolders();
+    SimulatedConsole const console(listing(1) + "[runCmdOnPartition *]\n" + gc_Hang);
+    QuorvexTest::TemporaryDirectory const work;
+    SurveyProcess survey = startSurvey(work, "0");
+    ASSERT_TRUE(waitForClientRuns(console, {"1"})) << "partition 1 never started";
+    int const worker = FleetTest::childrenOf(surveyPid()).at(0);
+    std::vector<std::string> const actions = FleetTest::processesOfConsole(console.logPath());
+    std::size_t checked = 0;
+    // The shell keeps descriptors of its own for the redirections (10, 11).
+    for (std::string const& action : actions) {
+        int const pid = std::stoi(action);
+        bool const isShell = action.find(" sh -c ") != std::string::npos;
+        if (pid != worker && pid != surveyPid() && !isShell) {
+            EXPECT_EQ(FleetTest::descriptorsOf(pid), (std::vector<int>{0, 1, 2})) << action;
+            ++checked;
+        }
+    }
+    EXPECT_GE(checked, 2u) << "the action and its helper";
+    survey.signal(SIGTERM);
+    EXPECT_EQ(survey.waitForExit(30.0), 128 + SIGTERM);
+}
+
+INSTANTIATE_TEST_SUITE_P(Signals, FleetInterruption, ::testing::Values(SIGINT, SIGTERM, SIGHUP),
                          [](::testing::TestParamInfo<int> const& info) {
-                             return info.param == SIGINT ? std::string("SIGINT")
-                                                         : std::string("SIGTERM");
+                             return signalNameOf(info.param);
                          });
 
 } // namespace

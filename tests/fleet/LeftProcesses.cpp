@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <iterator>
 #include <sstream>
 #include <unistd.h>
 
@@ -45,6 +46,30 @@ std::string commandLineOf(std::filesystem::path const& process) {
 }
 
 } // namespace
+
+std::vector<int> childrenOf(int pid) {
+    std::vector<int> children;
+    std::string const path =
+        "/proc/" + std::to_string(pid) + "/task/" + std::to_string(pid) + "/children";
+    std::istringstream list(readProcFile(path));
+    int child = 0;
+    while (list >> child) {
+        children.push_back(child);
+    }
+    return children;
+}
+
+std::vector<int> descriptorsOf(int pid) {
+    std::vector<int> descriptors;
+    std::error_code ignored;
+    std::filesystem::path const folder = "/proc/" + std::to_string(pid) + "/fd";
+    std::filesystem::directory_iterator const entries(folder, ignored);
+    std::transform(std::filesystem::begin(entries), std::filesystem::end(entries),
+                   std::back_inserter(descriptors),
+                   [](auto const& entry) { return std::stoi(entry.path().filename().string()); });
+    std::sort(descriptors.begin(), descriptors.end());
+    return descriptors;
+}
 
 std::vector<std::string> processesOfConsole(std::string const& logPath) {
     std::string const setting = "PYLON_SIM_LOG=" + logPath;

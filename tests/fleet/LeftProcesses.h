@@ -11,5 +11,9 @@ namespace FleetTest {
 
 // "<pid> <command line>" of each such process.
 std::vector<std::string> processesOfConsole(std::string const& logPath);
+// The PIDs of the direct children of pid; none when it is gone.
+std::vector<int> childrenOf(int pid);
+// The numbers of the open descriptors of pid, in ascending order.
+std::vector<int> descriptorsOf(int pid);
 
 } // namespace FleetTest

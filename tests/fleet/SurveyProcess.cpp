@@ -20,8 +20,19 @@ int statusOf(int waitStatus) {
     return WIFSIGNALED(waitStatus) ? 128 + WTERMSIG(waitStatus) : WEXITSTATUS(waitStatus);
 }
 
+void limitFileSize(std::optional<rlim_t> const& fileSizeLimit) {
+    if (!fileSizeLimit) {
+        return;
+    }
+    std::signal(SIGXFSZ, SIG_IGN);
+    rlimit const limit{*fileSizeLimit, *fileSizeLimit};
+    if (::setrlimit(RLIMIT_FSIZE, &limit) != 0) {
+        ::_exit(125);
+    }
+}
+
 [[noreturn]] void execute(std::vector<std::string> const& argv, std::string const& stdoutPath,
-                          std::string const& stderrPath) {
+                          std::string const& stderrPath, std::optional<rlim_t> fileSizeLimit) {
     int const input = ::open("/dev/null", O_RDONLY);
     int const output = ::open(stdoutPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0644);
     int const error = ::open(stderrPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0644);
@@ -29,6 +40,7 @@ int statusOf(int waitStatus) {
         ::dup2(error, 2) < 0) {
         ::_exit(126);
     }
+    limitFileSize(fileSizeLimit);
     std::vector<char*> arguments = QuorvexTest::argumentPointers(argv);
     ::execv(arguments[0], arguments.data());
     ::_exit(127);
@@ -42,14 +54,14 @@ double monotonicSeconds() {
 }
 
 SurveyProcess::SurveyProcess(std::vector<std::string> const& argv, std::string const& stdoutPath,
-                             std::string const& stderrPath) {
+                             std::string const& stderrPath, std::optional<rlim_t> fileSizeLimit) {
     _started = monotonicSeconds();
     _pid = ::fork();
     if (_pid < 0) {
         throw std::runtime_error("cannot start " + argv.front());
     }
     if (_pid == 0) {
-        execute(argv, stdoutPath, stderrPath);
+        execute(argv, stdoutPath, stderrPath, fileSizeLimit);
     }
 }
 

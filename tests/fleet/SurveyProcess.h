@@ -4,7 +4,9 @@
 // for it with a bound: a run that does not end in time is killed and
 // reported, never left hanging the test.
 
+#include <optional>
 #include <string>
+#include <sys/resource.h>
 #include <sys/types.h>
 #include <vector>
 
@@ -12,9 +14,12 @@ namespace FleetTest {
 
 class SurveyProcess {
 public:
-    // Starts argv (argv[0] a path) with stdin from /dev/null.
+    // Starts argv (argv[0] a path) with stdin from /dev/null. With a file
+    // size limit, every file write of the process and of whatever it starts
+    // fails past that many bytes with EFBIG (SIGXFSZ ignored), as on a full
+    // disk, for root too; its standard output and error must stay below it.
     SurveyProcess(std::vector<std::string> const& argv, std::string const& stdoutPath,
-                  std::string const& stderrPath);
+                  std::string const& stderrPath, std::optional<rlim_t> fileSizeLimit = {});
     // Kills and reaps the process if it still runs.
     ~SurveyProcess();
     SurveyProcess(SurveyProcess const&) = delete;

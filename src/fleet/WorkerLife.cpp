@@ -1,0 +1,101 @@
+#include "fleet/WorkerLife.h"
+
+#include "fleet/ChildProcess.h"
+#include "fleet/ProcessTree.h"
+#include "utility/SystemError.h"
+
+#include <fcntl.h>
+#include <linux/close_range.h>
+#include <sys/prctl.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <atomic>
+#include <cerrno>
+#include <csignal>
+#include <thread>
+
+namespace fleet {
+
+namespace {
+
+// Sent by the kernel when the parent ends; nothing else sends it to a worker.
+constexpr int gc_ParentGoneSignal = SIGUSR1;
+
+// The pipe the signal handler writes to, read by the watching thread.
+int gs_ParentGoneWriteEnd = -1;
+std::atomic<bool> gs_ParentGone{false};
+
+void onParentGone(int) {
+    int const savedErrno = errno;
+    char const byte = 1;
+    // A full pipe already holds the news.
+    [[maybe_unused]] ssize_t const written = write(gs_ParentGoneWriteEnd, &byte, 1);
+    errno = savedErrno;
+}
+
+// The worker's other thread may run on meanwhile: it starts no new command
+// once the parent is marked gone, and it too ends the worker only after it
+// has killed everything below it.
+[[noreturn]] void endWithActions() {
+    gs_ParentGone.store(true);
+    killDescendants(getpid());
+    ChildProcess::removeOwnTemporaryFiles();
+    endWorker(ChildProcess::ms_ParentGoneStatus);
+}
+
+void watchParentGone(int readEnd) {
+    char byte = 0;
+    while (read(readEnd, &byte, 1) < 0 && errno == EINTR) {
+    }
+    endWithActions();
+}
+
+} // namespace
+
+// The handler and the thread are in place before the tie is made, and the
+// parent is checked after it: a parent that ended before the tie sends no
+// signal, but has left the worker to another parent.
+void tieToParent(pid_t parent) {
+    int ends[2];
+    if (pipe2(ends, O_CLOEXEC) != 0) {
+        throw util::SystemError("cannot create", "the parent watch pipe", errno);
+    }
+    gs_ParentGoneWriteEnd = ends[1];
+    struct sigaction action {};
+    action.sa_handler = &onParentGone;
+    action.sa_flags = SA_RESTART;
+    sigemptyset(&action.sa_mask);
+    sigaction(gc_ParentGoneSignal, &action, nullptr);
+    std::thread(&watchParentGone, ends[0]).detach();
+    if (prctl(PR_SET_PDEATHSIG, gc_ParentGoneSignal) != 0) {
+        throw util::SystemError("cannot tie the worker to", "its parent", errno);
+    }
+    if (getppid() != parent) {
+        endWithActions();
+    }
+}
+
+bool isParentGone() {
+    return gs_ParentGone.load();
+}
+
+void keepBrokenPipeFromEndingWorker() {
+    sigset_t brokenPipe;
+    sigemptyset(&brokenPipe);
+    sigaddset(&brokenPipe, SIGPIPE);
+    pthread_sigmask(SIG_BLOCK, &brokenPipe, nullptr);
+}
+
+void endWorker(int status) {
+    killDescendants(getpid());
+    while (waitpid(-1, nullptr, WNOHANG) > 0) {
+    }
+    _exit(status);
+}
+
+void keepDescriptorsFromActions() {
+    close_range(STDERR_FILENO + 1, ~0U, CLOSE_RANGE_CLOEXEC);
+}
+
+} // namespace fleet
