@@ -129,6 +129,8 @@ void addSurveyOptions(CLI::App& app, Options& options) {
     app.add_flag("-q,--quiet", options.quiet, "no progress line, and no recap unless --recap");
     addRecapOptions(app, options);
     app.add_flag("--all", options.all, "every managed machine the console lists");
+    app.add_flag("--wait", options.waitForFolder,
+                 "wait for another run using the result folder to end, rather than exit 75");
     app.add_option("IDENTITY", options.identities, "a managed machine (type-model_serial)");
     report::addReportOption(app, options.reportFolder);
 }

@@ -21,6 +21,9 @@ struct Options {
     // error is a terminal and the run is not quiet.
     std::optional<bool> recap;
     bool all = false;
+    // --wait: wait for another run using the same result folder to end,
+    // rather than exit with gc_ExitTemporaryFailure.
+    bool waitForFolder = false;
     // As given, an identity given more than once kept at its first place.
     std::vector<std::string> identities;
 };

@@ -207,6 +207,11 @@ TEST(CommandLine, SurveyHasNoReportRequest) {
     EXPECT_FALSE(parse({"A_1"}).parsed.reportRequest.has_value());
 }
 
+TEST(CommandLine, WaitIsOffUnlessGiven) {
+    EXPECT_FALSE(parse({"--all"}).parsed.options.waitForFolder);
+    EXPECT_TRUE(parse({"--all", "--wait"}).parsed.options.waitForFolder);
+}
+
 TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
     ParseRun const run = parse({"--help"});
     ASSERT_TRUE(run.parsed.exitStatus.has_value());
@@ -235,6 +240,8 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
               "not a terminal\n"
               "  --no-recap              no recap, even on a terminal\n"
               "  --all                   every managed machine the console lists\n"
+              "  --wait                  wait for another run using the result folder to end, "
+              "rather than exit 75\n"
               "  --report DIR            after the run, write its report into DIR\n"
               "\n"
               "Subcommands:\n"

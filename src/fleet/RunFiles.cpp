@@ -7,6 +7,7 @@
 #include <unistd.h>
 
 #include <cstdio>
+#include <filesystem>
 
 namespace fleet {
 
@@ -15,6 +16,7 @@ namespace {
 // Between a machine's trace name and the process and slot that own a piece.
 constexpr char gc_PieceMark[] = ".piece-";
 constexpr char gc_PieceSeparator[] = "-";
+constexpr char gc_RunLockName[] = ".quorvex-survey.lock";
 
 } // namespace
 
@@ -24,6 +26,11 @@ std::string statusFilePath(std::string const& identity) {
 
 std::string traceFilePath(std::string const& identity) {
     return Quorvex::PYLON::VPD::get_MachineTraceFileName(identity);
+}
+
+std::string runLockPath() {
+    // The folder of any machine's status file: the name does not change it.
+    return (std::filesystem::path(statusFilePath("x")).parent_path() / gc_RunLockName).string();
 }
 
 std::string tracePiecePath(std::string const& identity, std::size_t slot) {

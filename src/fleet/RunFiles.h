@@ -10,6 +10,10 @@ namespace fleet {
 // the identity before ".Trace", so that no machine's trace replaces another's.
 std::string statusFilePath(std::string const& identity);
 std::string traceFilePath(std::string const& identity);
+// The lock file that keeps a second run out of the same result folder
+// (RunLock): in the folder of the status files, hidden by its leading dot.
+std::string runLockPath();
+
 // The temporary piece of a machine's trace that the unit of work running
 // in one slot writes. The slot's next unit of the machine writes over it,
 // so a run creates at most one piece file per slot and machine rather than

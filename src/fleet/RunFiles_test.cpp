@@ -37,4 +37,8 @@ TEST(RunFiles, PiecesOfOneMachineDifferBySlotAndLieBesideItsTrace) {
     EXPECT_NE(tracePiecePath("9119-MHE_21ABCDF", 0), first);
 }
 
+TEST(RunFiles, TheRunLockLiesHiddenInTheFolderOfTheStatusFiles) {
+    EXPECT_EQ(fleet::runLockPath(), "/var/adm/quorvex/VPD/.quorvex-survey.lock");
+}
+
 } // namespace

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "report/ListingFailure.h"
 #include "report/Outcome.h"
 #include "report/RemoteAction.h"
 #include "survey/PartitionOutcome.h"
@@ -61,6 +62,13 @@ struct MachineRecord {
     bool listed = false;
     // The lines the listing unit wrote to the trace.
     std::optional<std::string> listingTrace;
+    // Set when the console's partition listing failed (an identity it does
+    // not know, say), read from listingTrace, or when the time limit stopped
+    // it. The machine then has no partitions, its status file reads as the
+    // tool writes it ("No ACTIVE Partition Found."), and the summary, the
+    // report and the recap say why. Unknown when the trace folder cannot be
+    // written, since the failure is read from the machine's trace.
+    std::optional<report::ListingFailure> listingFailure;
     std::vector<PartitionRecord> partitions;
 };
 

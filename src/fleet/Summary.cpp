@@ -46,6 +46,7 @@ report::MachineSummary machineSummary(MachineRecord const& machine) {
     summary.identity = machine.identity;
     summary.statusFile = statusFilePath(machine.identity);
     summary.traceFile = traceFilePath(machine.identity);
+    summary.listingFailure = machine.listingFailure;
     std::transform(machine.partitions.begin(), machine.partitions.end(),
                    std::back_inserter(summary.partitions), &partitionSummary);
     return summary;
@@ -72,6 +73,7 @@ report::RunSummary runSummary(RunFacts const& facts, std::vector<MachineRecord> 
     summary.options = summaryOptions(facts.options);
     summary.interruptedBy = unlessEmpty(facts.interruptedBy);
     summary.exitStatus = facts.exitStatus;
+    summary.listingFailure = facts.listingFailure;
     std::transform(machines.begin(), machines.end(), std::back_inserter(summary.machines),
                    &machineSummary);
     return summary;

@@ -20,6 +20,8 @@ struct RunFacts {
     // run was not interrupted.
     std::string interruptedBy;
     int exitStatus = 0;
+    // Why the console's machines could not be listed (--all).
+    std::optional<report::ListingFailure> listingFailure;
 };
 
 // The summary of a run (report::summaryDocument makes its document): every

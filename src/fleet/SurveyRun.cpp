@@ -189,6 +189,7 @@ void SurveyRun::_finishListing(InFlight const& running, std::string const& resul
     }
     MachineRecord& machine = _machines[running.unit.machine];
     machine.listingTrace = std::move(trace);
+    machine.listingFailure = _listingFailure(running, machine.listingTrace);
     auto const partitions = decodePartitions(machine.identity, result);
     std::vector<std::string> ids;
     for (auto const& partition : partitions.value_or(std::vector<Quorvex::System::Partition>{})) {
@@ -199,6 +200,16 @@ void SurveyRun::_finishListing(InFlight const& running, std::string const& resul
     }
     machine.listed = true;
     _scheduler.setListed(running.unit.machine, ids);
+}
+
+// The command runner reads a listing command the time limit killed as one
+// that exited 0, so the stop is known only here.
+std::optional<report::ListingFailure>
+SurveyRun::_listingFailure(InFlight const& running, std::optional<std::string> const& trace) const {
+    if (running.listingTimedOut) {
+        return report::stoppedListing(trace.value_or(""), _options.timeoutSeconds);
+    }
+    return trace ? report::listingFailureInTrace(*trace) : std::nullopt;
 }
 
 void SurveyRun::_finishSurvey(InFlight const& running, WorkerEvent const& ended) {
@@ -230,6 +241,8 @@ void SurveyRun::_recordStop(InFlight& running, WorkerEvent const& event) {
                                                 event.seconds, _limits.isInterrupted()};
     } else if (_limits.isInterrupted()) {
         running.listingStopped = true;
+    } else {
+        running.listingTimedOut = true;
     }
 }
 

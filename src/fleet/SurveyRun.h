@@ -59,6 +59,7 @@ private:
         std::size_t slot = 0;
         Clock::time_point started;
         bool listingStopped = false;
+        bool listingTimedOut = false;
     };
 
     void _startUnit(Scheduler::Unit const& unit);
@@ -66,6 +67,8 @@ private:
     void _handle(std::vector<WorkerEvent> const& events);
     void _finish(WorkerEvent const& ended);
     void _finishListing(InFlight const& running, std::string const& result);
+    std::optional<report::ListingFailure>
+    _listingFailure(InFlight const& running, std::optional<std::string> const& trace) const;
     void _finishSurvey(InFlight const& running, WorkerEvent const& ended);
     void _settleWorkerDeath(PartitionRecord& record, WorkerEvent const& ended);
     void _recordStop(InFlight& running, WorkerEvent const& event);

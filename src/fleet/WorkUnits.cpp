@@ -47,17 +47,21 @@ void closeTrace() {
 
 } // namespace
 
-std::string listMachines() {
-    Quorvex::PYLON::ListOf_Machines machines;
-    std::sort(machines.begin(), machines.end());
+std::string listMachines(std::string const& tracePath) {
     FieldRecord identities;
-    for (auto const& machine : machines) {
-        std::string const identity = machine.get_MTMS();
-        if (machine.get_ObjectType() == gc_ManagedMachineType &&
-            std::find(identities.begin(), identities.end(), identity) == identities.end()) {
-            identities.push_back(identity);
+    {
+        Utility::Trace trace(tracePath);
+        Quorvex::PYLON::ListOf_Machines machines;
+        std::sort(machines.begin(), machines.end());
+        for (auto const& machine : machines) {
+            std::string const identity = machine.get_MTMS();
+            if (machine.get_ObjectType() == gc_ManagedMachineType &&
+                std::find(identities.begin(), identities.end(), identity) == identities.end()) {
+                identities.push_back(identity);
+            }
         }
     }
+    closeTrace();
     return encodeFields(identities);
 }
 

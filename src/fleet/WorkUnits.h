@@ -15,8 +15,8 @@ namespace fleet {
 // use per process.
 
 // The identities of the managed machines of object type 0, in the listing's
-// sorted order, each once. Traces nothing.
-std::string listMachines();
+// sorted order, each once. Traces the listing command into tracePath alone.
+std::string listMachines(std::string const& tracePath);
 std::vector<std::string> decodeMachines(std::string const& text);
 
 // Opens the trace on tracePiece, writes the line the tool's trace starts

@@ -1,15 +1,15 @@
 #include "fleet/ChildProcess.h"
 #include "fleet/CommandLine.h"
+#include "fleet/MachineListing.h"
 #include "fleet/OutputFolders.h"
 #include "fleet/ProcessTree.h"
 #include "fleet/Recap.h"
+#include "fleet/RunFiles.h"
+#include "fleet/RunLock.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
 #include "fleet/TerminalWidth.h"
-#include "fleet/TimeLimits.h"
-#include "fleet/WorkUnits.h"
-#include "fleet/WorkerPool.h"
 #include "report/ReportCommand.h"
 #include "report/RunSummary.h"
 #include "utility/AtomicFile.h"
@@ -24,6 +24,7 @@
 #include <chrono>
 #include <csignal>
 #include <ctime>
+#include <filesystem>
 #include <iostream>
 
 namespace {
@@ -35,44 +36,76 @@ struct RunClock {
     std::string consoleHost;
 };
 
-// A signal outweighs a file that could not be written, which outweighs the
-// overall code: 128 + signal, then 73, then 0, 4 or 8.
-int finalExitStatus(fleet::SurveyRun const& run, std::vector<std::string> const& failures) {
+// A signal outweighs a file that could not be written, which outweighs a
+// console whose machines could not be listed (sysexits.h's EX_UNAVAILABLE),
+// which outweighs the overall code: 128 + signal, then 73, then 69, then 0,
+// 4 or 8.
+int finalExitStatus(fleet::SurveyRun const& run, std::vector<std::string> const& failures,
+                    fleet::MachineListing const& listing) {
     int const status = run.exitStatus();
-    return status < 128 && !failures.empty() ? fleet::gc_ExitCannotCreate : status;
+    if (status >= 128) {
+        return status;
+    }
+    if (!failures.empty()) {
+        return fleet::gc_ExitCannotCreate;
+    }
+    return listing.failure ? fleet::gc_ExitUnavailable : status;
 }
 
-// The console's managed machines, listed in a worker of its own so that this
-// process never writes through the survey code's trace. A listing action that
-// runs past the time limit, or an interruption, stops the listing with
-// everything it started, and it never goes on: the run then has no machines.
-std::vector<std::string> listManagedMachines(unsigned int timeoutSeconds) {
-    fleet::WorkerPool pool(fleet::signalPipeDescriptor());
-    fleet::TimeLimits limits(timeoutSeconds);
-    if (std::optional<std::string> const failure =
-            pool.start(0, fleet::UnitKind::MachineListing, &fleet::listMachines)) {
-        std::cerr << report::gc_ProgramName << ": cannot list the managed machines: " << *failure
-                  << std::endl;
-        return {};
+// Who holds the result folder, as a second run reads it in the lock file.
+std::string holderText() {
+    return "PID " + std::to_string(getpid()) + ", started " +
+           util::localTimeText(std::time(nullptr));
+}
+
+// The holder as a message gives it; a run that has just made the file may
+// not have written itself into it yet.
+std::string holderOf(fleet::RunLock const& lock) {
+    std::string const holder = lock.holder();
+    return holder.empty() ? "its PID not written yet" : holder;
+}
+
+// One run per result folder, taken before any console command runs: nullopt
+// when this run may go on, else its exit status.
+std::optional<int> lockResultFolder(fleet::RunLock& lock, bool waitForFolder) {
+    if (lock.tryTake(holderText())) {
+        return std::nullopt;
     }
-    while (true) {
-        std::vector<fleet::WorkerEvent> const ended = pool.waitForEvents();
-        if (!ended.empty()) {
-            return fleet::decodeMachines(ended.front().text);
-        }
-        limits.interrupt(fleet::takeSignal());
-        if (!pool.stopDueActions(limits).empty() || limits.isInterrupted()) {
-            // The pool ends the stopped worker with everything it started.
-            return {};
-        }
+    std::string const folder = std::filesystem::path(lock.path()).parent_path().string();
+    if (!waitForFolder) {
+        std::cerr << report::gc_ProgramName << ": another run uses the result folder " << folder
+                  << ": " << holderOf(lock) << " (lock file " << lock.path()
+                  << "); try again later, or use --wait" << std::endl;
+        return fleet::gc_ExitTemporaryFailure;
     }
+    std::cerr << report::gc_ProgramName << ": waiting for the run that uses " << folder << " ("
+              << holderOf(lock) << ") to end" << std::endl;
+    if (lock.waitToTake(holderText(), fleet::signalPipeDescriptor())) {
+        return std::nullopt;
+    }
+    return 128 + fleet::takeSignal();
+}
+
+// The machines to survey: those given, or with --all those the console
+// lists. A listing that fails is said at once, in one line.
+fleet::MachineListing machinesToSurvey(fleet::Options const& options) {
+    if (!options.all) {
+        return fleet::MachineListing{options.identities, std::nullopt};
+    }
+    fleet::MachineListing listing = fleet::listManagedMachines(options.timeoutSeconds);
+    if (listing.failure) {
+        std::cerr << report::gc_ProgramName << ": cannot list the managed machines: "
+                  << report::listingFailureText(*listing.failure) << std::endl;
+    }
+    return listing;
 }
 
 // The summary of the run as it stands, with the exit status it ends with so
 // far.
 report::RunSummary summaryOf(fleet::Options const& options, fleet::SurveyRun const& run,
-                             RunClock const& clock) {
+                             RunClock const& clock, fleet::MachineListing const& listing) {
     fleet::RunFacts facts;
+    facts.listingFailure = listing.failure;
     facts.options = options;
     facts.consoleHost = clock.consoleHost;
     facts.started = util::localTimeText(clock.started);
@@ -90,16 +123,17 @@ report::RunSummary summaryOf(fleet::Options const& options, fleet::SurveyRun con
 // counts a report that could not be written. Returns what could not be
 // written, "cannot write PATH: reason" each.
 std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::SurveyRun const& run,
-                                       RunClock const& clock) {
+                                       RunClock const& clock,
+                                       fleet::MachineListing const& listing) {
     std::vector<std::string> failures = run.writeFailures();
-    report::RunSummary summary = summaryOf(options, run, clock);
+    report::RunSummary summary = summaryOf(options, run, clock, listing);
     if (!options.reportFolder.empty()) {
         if (std::optional<std::string> const failure =
                 report::writeRunReport(report::summaryDocument(summary), options.reportFolder)) {
             failures.push_back(*failure);
         }
     }
-    summary.exitStatus = finalExitStatus(run, failures);
+    summary.exitStatus = finalExitStatus(run, failures, listing);
     try {
         if (!options.summaryFile.empty()) {
             util::writeFileAtomically(options.summaryFile,
@@ -135,15 +169,15 @@ std::string consoleHostFor(fleet::Options const& options) {
 // makes them be written again saying so; once they are in place the
 // signals are held, and the run is finished.
 std::vector<std::string> finishRun(fleet::Options const& options, fleet::SurveyRun& run,
-                                   RunClock clock) {
+                                   RunClock clock, fleet::MachineListing const& listing) {
     clock.consoleHost = consoleHostFor(options);
     run.noteSignal();
     int const signalSeen = run.interruptingSignal();
-    std::vector<std::string> failures = writeRunFiles(options, run, clock);
+    std::vector<std::string> failures = writeRunFiles(options, run, clock, listing);
     fleet::holdSignals();
     run.noteSignal();
     if (run.interruptingSignal() != signalSeen) {
-        failures = writeRunFiles(options, run, clock);
+        failures = writeRunFiles(options, run, clock, listing);
     }
     return failures;
 }
@@ -226,14 +260,17 @@ int main(int argc, char** argv) {
     if (std::optional<std::string> const failure = fleet::installSignalPipe()) {
         std::cerr << report::gc_ProgramName << ": " << *failure << std::endl;
     }
+    fleet::RunLock lock(fleet::runLockPath());
+    if (std::optional<int> const refused = lockResultFolder(lock, options.waitForFolder)) {
+        return *refused;
+    }
     RunClock const clock{std::time(nullptr), std::chrono::steady_clock::now(), {}};
-    std::vector<std::string> const identities =
-        options.all ? listManagedMachines(options.timeoutSeconds) : options.identities;
-    fleet::SurveyRun run(options, identities);
+    fleet::MachineListing const listing = machinesToSurvey(options);
+    fleet::SurveyRun run(options, listing.identities);
     run.run();
-    std::vector<std::string> const failures = finishRun(options, run, clock);
+    std::vector<std::string> const failures = finishRun(options, run, clock, listing);
     // Nothing the run started outlives it.
     fleet::endChildrenExcept({});
     printAfterBlocks(run, closingMessages(run, failures), recapText(options, run, clock));
-    return finalExitStatus(run, failures);
+    return finalExitStatus(run, failures, listing);
 }

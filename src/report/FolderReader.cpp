@@ -267,6 +267,14 @@ std::optional<std::string> traceFileOf(fs::path const& vpdFolder, std::string co
     return validUtf8(trace.string());
 }
 
+// A machine's trace starts with its partition listing, so a machine that
+// lists no partition and has a trace of quorvex-survey tells whether its
+// listing failed; the single-machine tool's one trace is named for no machine.
+std::optional<ListingFailure> listingFailureOf(std::optional<std::string> const& traceFile) {
+    std::string const trace = traceFile ? util::readWholeFileOrEmpty(*traceFile) : std::string();
+    return trace.empty() ? std::nullopt : listingFailureInTrace(trace);
+}
+
 MachineSummary machineSummary(fs::path const& vpdFolder, std::string const& identity,
                               fs::path const& statusFile, MachineDocuments documents,
                               RunTraces& traces) {
@@ -279,6 +287,9 @@ MachineSummary machineSummary(fs::path const& vpdFolder, std::string const& iden
     std::vector<DocumentFile const*> const found = documentsOfLines(lines, documents);
     for (std::size_t i = 0; i < lines.size(); ++i) {
         machine.partitions.push_back(partitionSummary(lines[i], found[i], traces));
+    }
+    if (lines.empty()) {
+        machine.listingFailure = listingFailureOf(machine.traceFile);
     }
     return machine;
 }

@@ -23,7 +23,11 @@ namespace report {
 // active statuses, seconds, the options of the run, and the ID and document
 // of a partition no document matches (an inactive one always). Machines come
 // in the order of their identities; the run's times are those of the oldest
-// and the newest file read. Texts are made valid UTF-8. Throws
+// and the newest file read. A machine without listed partitions whose trace
+// of quorvex-survey lies beside the VPD folder gets the failure of its
+// partition listing that the trace shows (an identity the console did not
+// know); a listing the time limit stopped reads there as one that ended, so
+// it is not told from files. Texts are made valid UTF-8. Throws
 // util::SystemError when vpdFolder cannot be listed (missing, not a folder,
 // unreadable).
 RunSummary readRunSummaryFromFolder(std::string const& vpdFolder);

@@ -389,4 +389,26 @@ TEST(FolderReader, TraceOfTheMachineBesideTheVpdFolderIsNamed) {
               summary["machines"][0]["trace_file"]);
 }
 
+TEST(FolderReader, AMachineWhoseTraceShowsAFailedListingIsListingFailed) {
+    QuorvexTest::TemporaryDirectory root;
+    fs::create_directories(root.file("VPD"));
+    fs::create_directories(root.file("Trace"));
+    for (char const* identity : {"1-A_S", "2-B_T"}) {
+        QuorvexTest::writeFile(root.file("VPD/" + std::string(gc_Prefix) + identity + ".status"),
+                               "No ACTIVE Partition Found.\n");
+    }
+    std::string const block = "PYLON_VPD_Survey_ClientPartition::main\n\n"
+                              "****** ShellCommand::execute ******\n"
+                              "/opt/vtc/bin/lspartition -ix -c 1-A_S > /tmp/a 2> /tmp/b\n";
+    QuorvexTest::writeFile(root.file("Trace/" + std::string(gc_Prefix) + "1-A_S.Trace"),
+                           block + "RC = 1\nSTDOUT\n\nSTDERR\nnot found\n\n\n\n");
+    QuorvexTest::writeFile(root.file("Trace/" + std::string(gc_Prefix) + "2-B_T.Trace"),
+                           block + "RC = 0\nSTDOUT\n\nSTDERR\n\n\n\n");
+    Json const summary = report::readSummaryFromFolder(root.file("VPD"));
+    EXPECT_EQ(R"({"command":"/opt/vtc/bin/lspartition -ix -c 1-A_S","exit_status":1,)"
+              R"("message":"not found"})",
+              summary["machines"][0]["listing_failure"].dump());
+    EXPECT_FALSE(summary["machines"][1].contains("listing_failure"));
+}
+
 } // namespace

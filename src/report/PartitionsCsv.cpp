@@ -1,6 +1,7 @@
 #include "report/PartitionsCsv.h"
 
 #include "report/JsonMember.h"
+#include "report/ListingFailure.h"
 #include "utility/TextSafety.h"
 
 #include <algorithm>
@@ -58,6 +59,24 @@ void appendRow(std::string& csv, std::vector<std::string> const& fields) {
     csv += gc_RowEnd;
 }
 
+// The row of a machine whose partition listing failed, or of a run whose
+// machine listing failed (no machine, no code): no partition, the outcome
+// listing_failed, the failure as the reason.
+void appendListingFailure(std::string& csv, Json const& failure, std::string const& machine,
+                          std::string const& machineCode) {
+    if (failure.is_null()) {
+        return;
+    }
+    std::vector<std::string> row = {machine, machineCode, ""};
+    std::transform(partitionColumns().begin(), partitionColumns().end(), std::back_inserter(row),
+                   [&failure](std::string const& column) {
+                       return column == "outcome"  ? std::string(gc_ListingFailedName)
+                              : column == "reason" ? validUtf8(listingFailureText(failure))
+                                                   : std::string();
+                   });
+    appendRow(csv, row);
+}
+
 } // namespace
 
 std::string partitionsCsv(Json const& summary) {
@@ -66,6 +85,9 @@ std::string partitionsCsv(Json const& summary) {
     header.insert(header.end(), partitionColumns().begin(), partitionColumns().end());
     appendRow(csv, header);
     for (Json const& machine : member(summary, "machines")) {
+        appendListingFailure(csv, member(machine, "listing_failure"),
+                             fieldText(member(machine, "identity")),
+                             fieldText(member(machine, "return_code")));
         for (Json const& partition : member(machine, "partitions")) {
             std::vector<std::string> row = {fieldText(member(machine, "identity")),
                                             fieldText(member(machine, "return_code")),
@@ -76,6 +98,9 @@ std::string partitionsCsv(Json const& summary) {
                            });
             appendRow(csv, row);
         }
+    }
+    if (member(summary, "machines").empty()) {
+        appendListingFailure(csv, member(summary, "listing_failure"), "", "");
     }
     return csv;
 }

@@ -12,7 +12,11 @@ namespace report {
 // doubled, and every row ends with CRLF; the text is UTF-8. Columns:
 // machine, machine_return_code, partition_id, host, ip, active_status,
 // outcome, status_text, return_code, rc, rc_cmd, seconds, document, reason;
-// a value the summary has as null is an empty field.
+// a value the summary has as null is an empty field. A machine whose
+// partition listing failed has a row of its own before its partitions, and a
+// run whose machine listing failed one row without machine: the outcome
+// listing_failed and the failure (command, exit status, the console's
+// message) as the reason, every partition field empty.
 std::string partitionsCsv(nlohmann::ordered_json const& summary);
 
 } // namespace report

@@ -60,4 +60,29 @@ TEST(PartitionsCsv, BytesThatAreNotUtf8AreReplaced) {
               report::partitionsCsv(summaryWith(partition)).find(",h\xEF\xBF\xBD,"));
 }
 
+Json const gc_Failure = {{"command", "/opt/vtc/bin/lspartition -ix -c 1-A_B"},
+                         {"exit_status", 1},
+                         {"message", "managed system not found, really"}};
+
+TEST(PartitionsCsv, AMachineWhoseListingFailedHasARowSayingListingFailed) {
+    Json summary = summaryWith(Json::object());
+    summary["machines"][0]["partitions"] = Json::array();
+    summary["machines"][0]["listing_failure"] = gc_Failure;
+    EXPECT_EQ(std::string(header) +
+                  "1234-ABC_10ABCDE,8,,,,,listing_failed,,,,,,,\"/opt/vtc/bin/lspartition -ix -c "
+                  "1-A_B exited with status 1: managed system not found, really\"\r\n",
+              report::partitionsCsv(summary));
+}
+
+TEST(PartitionsCsv, ARunWhoseMachineListingFailedHasOneRowWithoutMachine) {
+    Json const summary = {{"machines", Json::array()},
+                          {"listing_failure",
+                           {{"command", "/opt/lsvtc/bin/lsvtc -t0"},
+                            {"exit_status", nullptr},
+                            {"message", "stopped after the time limit of 1 s"}}}};
+    EXPECT_EQ(std::string(header) + ",,,,,,listing_failed,,,,,,,/opt/lsvtc/bin/lsvtc -t0: "
+                                    "stopped after the time limit of 1 s\r\n",
+              report::partitionsCsv(summary));
+}
+
 } // namespace

@@ -2,6 +2,7 @@
 
 #include "report/DocumentCopies.h"
 #include "report/JsonMember.h"
+#include "report/ListingFailure.h"
 #include "report/Outcome.h"
 #include "report/PageAssets.h"
 #include "report/PageSkeleton.h"
@@ -137,6 +138,17 @@ std::string interruptionText(Json const& summary) {
     return " &middot; <b>interrupted by " + htmlText(interrupted) + "</b>";
 }
 
+// Beside the times: an interruption, and a machine listing (--all) that
+// failed, with the command, its exit status and the console's message.
+std::string runNotesText(Json const& summary) {
+    Json const& failure = member(summary, "listing_failure");
+    if (failure.is_null()) {
+        return interruptionText(summary);
+    }
+    return interruptionText(summary) +
+           " &middot; <b>listing failed</b>: " + escapeHtml(listingFailureText(failure));
+}
+
 // One item per outcome; the page's script finds them by data-outcome, and
 // their class gives them the outcome's colour.
 void appendOutcomeTotals(std::string& page, Json const& totals) {
@@ -171,20 +183,15 @@ std::string barOf(Json const& counts) {
            (described.empty() ? "none listed" : described.substr(0, described.size() - 1)) + "</p>";
 }
 
-// A machine whose partitions the console could not list: the console's
-// message where the summary keeps it, in place of the counts.
+// A machine whose partitions the console could not list: the command, its
+// exit status and the console's message, in place of the counts.
 std::string listingFailure(Json const& failure) {
-    std::string text =
-        R"(<div class="bar listing-failed"></div><p class="counts"><b>listing failed</b>)";
-    if (failure.is_string()) {
-        text += ": " + htmlText(failure);
-    }
-    return text + "</p>";
+    return R"(<div class="bar listing-failed"></div><p class="counts"><b>listing failed</b>: )" +
+           escapeHtml(listingFailureText(failure)) + "</p>";
 }
 
 bool listingFailed(Json const& machine) {
-    Json const& failure = member(machine, "listing_failed");
-    return !failure.is_null() && failure != false;
+    return !member(machine, "listing_failure").is_null();
 }
 
 void appendMachineRow(std::string& page, Json const& machine, std::size_t index) {
@@ -201,7 +208,7 @@ void appendMachineRow(std::string& page, Json const& machine, std::size_t index)
     page += R"(<td class="code code)" + code + R"(">)" + code + R"(<td class="number">)" +
             std::to_string(countOf(member(machine, "counts"), "partitions")) +
             R"(<td class="bar-cell">)" +
-            (listingFailed(machine) ? listingFailure(member(machine, "listing_failed"))
+            (listingFailed(machine) ? listingFailure(member(machine, "listing_failure"))
                                     : barOf(member(machine, "counts"))) +
             "\n";
 }
@@ -321,7 +328,7 @@ std::vector<Placeholder> runPlaceholders(Json const& summary) {
         textPlaceholder("started-text", timeText(member(summary, "started"))),
         textPlaceholder("elapsed-seconds", secondsText(member(summary, "elapsed_seconds"))),
         textPlaceholder("return-code", htmlText(member(summary, "return_code"))),
-        textPlaceholder("interruption", interruptionText(summary)),
+        textPlaceholder("interruption", runNotesText(summary)),
         textPlaceholder("options", optionsText(summary)),
         textPlaceholder("machine-count", std::to_string(countOf(totals, "machines"))),
         textPlaceholder("partition-count", std::to_string(countOf(totals, "partitions"))),

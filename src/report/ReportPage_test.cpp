@@ -191,17 +191,20 @@ TEST(ReportPage, MachineBarHasOneSegmentPerOutcomePresent) {
 
 TEST(ReportPage, MachineWhoseListingFailedShowsTheConsolesMessageInPlaceOfCounts) {
     Json failed = summary(Json::array());
-    failed["machines"][0]["listing_failed"] = "managed system <not> found";
+    failed["machines"][0]["listing_failure"] = {{"command", "/opt/vtc/bin/lspartition -ix -c X"},
+                                                {"exit_status", 1},
+                                                {"message", "managed system <not> found"}};
     std::string const html = report::reportPage(failed, {});
     EXPECT_NE(std::string::npos, html.find("<tr class=\"listing-failed\"><th scope=\"row\">1-A_S"));
     EXPECT_NE(std::string::npos,
               html.find("<div class=\"bar listing-failed\"></div><p class=\"counts\"><b>listing "
-                        "failed</b>: managed system &lt;not&gt; found</p>"));
+                        "failed</b>: /opt/vtc/bin/lspartition -ix -c X exited with status 1: "
+                        "managed system &lt;not&gt; found</p>"));
 }
 
 TEST(ReportPage, MachineWithoutListingFailureHasCountsAndNoMark) {
     Json listed = summary(Json::array());
-    listed["machines"][0]["listing_failed"] = nullptr;
+    listed["machines"][0]["listing_failure"] = nullptr;
     std::string const html = report::reportPage(listed, {});
     EXPECT_EQ(std::string::npos, html.find("<tr class=\"listing-failed\">"));
     EXPECT_EQ(std::string::npos, html.find("<div class=\"bar listing-failed\">"));
@@ -271,6 +274,16 @@ TEST(ReportPage, RowMarkupStaysSmallForLargeConsoles) {
     }
     // 50 machines of 1,000 partitions must stay under 20 MB.
     EXPECT_LT(page(partitions).size(), 20U * 1000 * 1000 / 50);
+}
+
+TEST(ReportPage, ARunWhoseMachineListingFailedSaysSoBesideItsTimes) {
+    Json run = summary(Json::array());
+    run["machines"] = Json::array();
+    run["listing_failure"] = {
+        {"command", "/opt/lsvtc/bin/lsvtc -t0"}, {"exit_status", 127}, {"message", "not found"}};
+    std::string const html = report::reportPage(run, {});
+    EXPECT_NE(std::string::npos, html.find("<b>listing failed</b>: /opt/lsvtc/bin/lsvtc -t0 exited "
+                                           "with status 127: not found"));
 }
 
 } // namespace

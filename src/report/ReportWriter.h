@@ -12,6 +12,14 @@ namespace report {
 // from vpdFolder in folder/documents, where the page links to them: the
 // folder holds all the page needs wherever it is copied. Throws util::SystemError
 // when the folder cannot be made or a file cannot be written.
+//
+// A folder that already holds a report keeps it: its index.html,
+// partitions.csv and summary.json are renamed first to index-<time>.html,
+// partitions-<time>.csv and summary-<time>.json, where <time> is the start of
+// the run they describe (their summary's "started" without colons, such as
+// 2026-11-24T133210+0100; the page's modification time when that summary
+// cannot be read), with "-2", "-3"... added when a report of that time is
+// already kept. Nothing is ever replaced; earlier reports stay until removed.
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
                  std::string const& folder);
 

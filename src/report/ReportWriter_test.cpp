@@ -9,8 +9,12 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <filesystem>
+#include <iterator>
+#include <regex>
+#include <vector>
 
 namespace {
 
@@ -72,6 +76,61 @@ TEST(ReportWriter, FolderUnderARegularFileThrowsCreateWithThePathAndEnotdir) {
     ASSERT_TRUE(error);
     EXPECT_EQ(ENOTDIR, error->errorNumber());
     EXPECT_EQ("cannot create " + folder + ": Not a directory", std::string(error->what()));
+}
+
+Json startedAt(std::string const& started) {
+    Json summary;
+    summary["started"] = started;
+    summary["machines"] = Json::array();
+    return summary;
+}
+
+TEST(ReportWriter, APreviousReportIsKeptUnderTheTimeItsRunStarted) {
+    QuorvexTest::TemporaryDirectory root;
+    report::writeReport(startedAt("2026-11-24T10:00:00+01:00"), root.file("VPD"),
+                        root.file("report"));
+    std::string const firstPage = QuorvexTest::readFile(root.file("report/index.html"));
+    report::writeReport(startedAt("2026-11-24T11:00:00+01:00"), root.file("VPD"),
+                        root.file("report"));
+    EXPECT_EQ(firstPage,
+              QuorvexTest::readFile(root.file("report/index-2026-11-24T100000+0100.html")));
+    EXPECT_TRUE(QuorvexTest::fileExists(root.file("report/partitions-2026-11-24T100000+0100.csv")));
+    EXPECT_NE(std::string::npos,
+              QuorvexTest::readFile(root.file("report/summary-2026-11-24T100000+0100.json"))
+                  .find("10:00:00"));
+    EXPECT_NE(std::string::npos,
+              QuorvexTest::readFile(root.file("report/summary.json")).find("11:00:00"));
+    // Three files of each report, and the documents' folder.
+    EXPECT_EQ(7,
+              std::distance(fs::directory_iterator(root.file("report")), fs::directory_iterator()));
+}
+
+TEST(ReportWriter, TwoKeptReportsOfOneRunTimeAreNumberedNeverReplaced) {
+    QuorvexTest::TemporaryDirectory root;
+    for (int run = 0; run < 3; ++run) {
+        report::writeReport(startedAt("2026-11-24T10:00:00Z"), root.file("VPD"),
+                            root.file("report"));
+    }
+    EXPECT_TRUE(QuorvexTest::fileExists(root.file("report/index-2026-11-24T100000Z.html")));
+    EXPECT_TRUE(QuorvexTest::fileExists(root.file("report/index-2026-11-24T100000Z-2.html")));
+    EXPECT_EQ(10,
+              std::distance(fs::directory_iterator(root.file("report")), fs::directory_iterator()));
+}
+
+TEST(ReportWriter, APreviousPageWithoutSummaryIsKeptUnderItsModificationTime) {
+    QuorvexTest::TemporaryDirectory root;
+    fs::create_directories(root.file("report"));
+    QuorvexTest::writeFile(root.file("report/index.html"), "old page");
+    report::writeReport(startedAt("2026-11-24T11:00:00Z"), root.file("VPD"), root.file("report"));
+    std::vector<std::string> const names = QuorvexTest::listFolder(root.file("report"));
+    std::vector<std::string> kept;
+    std::copy_if(names.begin(), names.end(), std::back_inserter(kept),
+                 [](std::string const& name) { return name.rfind("index-", 0) == 0; });
+    ASSERT_EQ(kept.size(), 1U);
+    EXPECT_EQ(QuorvexTest::readFile(root.file("report/" + kept.front())), "old page");
+    EXPECT_TRUE(
+        std::regex_match(kept.front(), std::regex(R"(index-\d{4}-\d\d-\d\dT\d{6}[-+]\d{4}\.html)")))
+        << kept.front();
 }
 
 } // namespace

@@ -64,13 +64,29 @@ Json partitionDocument(PartitionSummary const& partition) {
     return entry;
 }
 
+Json failureDocument(ListingFailure const& failure) {
+    return {{"command", failure.command},
+            {"exit_status", orNull(failure.exitStatus)},
+            {"message", failure.message}};
+}
+
+// Present only when the listing failed, after the keys every document has,
+// as "time_limit" is for a partition.
+void addListingFailure(Json& document, std::optional<ListingFailure> const& failure) {
+    if (failure) {
+        document["listing_failure"] = failureDocument(*failure);
+    }
+}
+
 Json machineDocument(MachineSummary const& machine) {
-    return {{"identity", machine.identity},
-            {"return_code", overallCode(machine.partitions)},
-            {"status_file", machine.statusFile},
-            {"trace_file", orNull(machine.traceFile)},
-            {"counts", countsOf(machine.partitions)},
-            {"partitions", arrayOf(machine.partitions, &partitionDocument)}};
+    Json document = {{"identity", machine.identity},
+                     {"return_code", overallCode(machine.partitions)},
+                     {"status_file", machine.statusFile},
+                     {"trace_file", orNull(machine.traceFile)},
+                     {"counts", countsOf(machine.partitions)},
+                     {"partitions", arrayOf(machine.partitions, &partitionDocument)}};
+    addListingFailure(document, machine.listingFailure);
+    return document;
 }
 
 Json optionsDocument(SummaryOptions const& options) {
@@ -83,20 +99,22 @@ Json optionsDocument(SummaryOptions const& options) {
 } // namespace
 
 Json summaryDocument(RunSummary const& summary) {
-    return {{"schema_version", gc_SchemaVersion},
-            {"tool", summary.tool},
-            {"version", QUORVEX_VERSION},
-            {"console_host", summary.consoleHost},
-            {"started", summary.started},
-            {"ended", summary.ended},
-            {"elapsed_seconds",
-             std::visit([](auto seconds) { return Json(seconds); }, summary.elapsedSeconds)},
-            {"options", optionsDocument(summary.options)},
-            {"interrupted", orNull(summary.interruptedBy)},
-            {"return_code", overallCode(summary.machines)},
-            {"exit_status", orNull(summary.exitStatus)},
-            {"totals", totalsOf(summary.machines)},
-            {"machines", arrayOf(summary.machines, &machineDocument)}};
+    Json document = {{"schema_version", gc_SchemaVersion},
+                     {"tool", summary.tool},
+                     {"version", QUORVEX_VERSION},
+                     {"console_host", summary.consoleHost},
+                     {"started", summary.started},
+                     {"ended", summary.ended},
+                     {"elapsed_seconds", std::visit([](auto seconds) { return Json(seconds); },
+                                                    summary.elapsedSeconds)},
+                     {"options", optionsDocument(summary.options)},
+                     {"interrupted", orNull(summary.interruptedBy)},
+                     {"return_code", overallCode(summary.machines)},
+                     {"exit_status", orNull(summary.exitStatus)},
+                     {"totals", totalsOf(summary.machines)},
+                     {"machines", arrayOf(summary.machines, &machineDocument)}};
+    addListingFailure(document, summary.listingFailure);
+    return document;
 }
 
 std::string summaryText(Json const& document) {

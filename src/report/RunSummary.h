@@ -1,5 +1,6 @@
 #pragma once
 
+#include "report/ListingFailure.h"
 #include "report/Outcome.h"
 #include "report/RemoteAction.h"
 
@@ -50,6 +51,9 @@ struct MachineSummary {
     std::string statusFile;
     std::optional<std::string> traceFile;
     std::vector<PartitionSummary> partitions;
+    // Set when the console's partition listing of the machine failed: the
+    // machine then has no partitions, whatever its status file says.
+    std::optional<ListingFailure> listingFailure;
 };
 
 // The options of the run.
@@ -77,6 +81,9 @@ struct RunSummary {
     std::optional<std::string> interruptedBy;
     std::optional<int> exitStatus;
     std::vector<MachineSummary> machines;
+    // Set when the console's machine listing (--all) failed: the run then
+    // has no machines.
+    std::optional<ListingFailure> listingFailure;
 };
 
 // The summary's document, its keys in the schema's order: counts per machine

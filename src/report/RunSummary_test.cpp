@@ -24,7 +24,8 @@ PartitionSummary partition(Outcome outcome, std::string const& returnCode) {
 report::RunSummary oneMachine(std::vector<PartitionSummary> partitions) {
     report::RunSummary run;
     run.tool = "quorvex-survey report";
-    run.machines.push_back({"1-A_S", "/v/x.status", std::nullopt, std::move(partitions)});
+    run.machines.push_back(
+        {"1-A_S", "/v/x.status", std::nullopt, std::move(partitions), std::nullopt});
     return run;
 }
 
@@ -109,6 +110,20 @@ TEST(RunSummary, OptionsAndRunFactsUnknownToTheWriterAreNull) {
 TEST(RunSummary, TextReplacesBytesThatAreNotUtf8) {
     Json const summary = {{"console_host", "c\xFF"}};
     EXPECT_EQ("{\n  \"console_host\": \"c\xEF\xBF\xBD\"\n}\n", report::summaryText(summary));
+}
+
+TEST(RunSummary, ListingFailuresComeLastInTheirObjectOnlyWhenThereIsOne) {
+    report::RunSummary run = oneMachine({});
+    run.machines.front().listingFailure =
+        report::ListingFailure{"/opt/vtc/bin/lspartition -ix -c X", 1, "not found"};
+    run.listingFailure = report::ListingFailure{"/opt/lsvtc/bin/lsvtc -t0", std::nullopt, "hung"};
+    Json const document = report::summaryDocument(run);
+    EXPECT_EQ(keysOf(document["machines"][0]).back(), "listing_failure");
+    EXPECT_EQ(R"({"command":"/opt/vtc/bin/lspartition -ix -c X","exit_status":1,)"
+              R"("message":"not found"})",
+              document["machines"][0]["listing_failure"].dump());
+    EXPECT_EQ(keysOf(document).back(), "listing_failure");
+    EXPECT_EQ(document["listing_failure"]["exit_status"].dump(), "null");
 }
 
 } // namespace

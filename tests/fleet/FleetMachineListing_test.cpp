@@ -1,6 +1,7 @@
 // The console's list of managed machines (--all) when its listing hangs: an
 // interruption and the time limit each stop the listing with everything it
-// started, and the run ends at once with no machines, writing nothing.
+// started, and the run ends at once with no machines, writing nothing but
+// its summary; past the time limit the listing has failed (exit 69).
 
 #include "FleetTools.h"
 #include "LeftProcesses.h"
@@ -39,10 +40,12 @@ protected:
         return SurveyProcess(argv, _work.file("stdout"), _work.file("stderr"));
     }
 
-    // The run wrote nothing but its summary and left no process running.
-    void _expectNothingWrittenOrLeft(SimulatedConsole const& console) const {
+    // The run wrote nothing but its summary (and errors, one line each) and
+    // left no process running.
+    void _expectNothingWrittenOrLeft(SimulatedConsole const& console,
+                                     std::string const& errors = "") const {
         EXPECT_EQ(QuorvexTest::readFile(_work.file("stdout")), "");
-        EXPECT_EQ(QuorvexTest::readFile(_work.file("stderr")), "");
+        EXPECT_EQ(QuorvexTest::readFile(_work.file("stderr")), errors);
         EXPECT_TRUE(QuorvexTest::listFolder(QuorvexTest::gc_VPD_Folder).empty());
         EXPECT_TRUE(QuorvexTest::listFolder(QuorvexTest::gc_TraceFolder).empty());
         EXPECT_EQ(FleetTest::processesOfConsole(console.logPath()), std::vector<std::string>{})
@@ -81,17 +84,22 @@ TEST_F(FleetMachineListing, SigtermDuringAHungListingEndsTheRunPromptly) {
     EXPECT_EQ(summary.field("/exit_status"), std::to_string(128 + SIGTERM));
 }
 
-TEST_F(FleetMachineListing, ListingHungPastTheTimeLimitIsStoppedAndTheRunHasNoMachines) {
+TEST_F(FleetMachineListing, ListingHungPastTheTimeLimitIsStoppedAndTheRunFailsWith69) {
     SimulatedConsole const console(gc_HungListing);
     SurveyProcess survey = _startSurvey({"-t", "1"});
     int const status = survey.waitForExit(30.0);
-    EXPECT_EQ(status, 8) << "-1: the run hung and was killed";
+    EXPECT_EQ(status, 69) << "-1: the run hung and was killed";
     EXPECT_LE(survey.secondsTaken(), 1.0 + 1.0 + gc_Margin) << "the run waited for the listing";
-    _expectNothingWrittenOrLeft(console);
+    _expectNothingWrittenOrLeft(console, "quorvex-survey: cannot list the managed machines: "
+                                         "/opt/lsvtc/bin/lsvtc -t0: stopped after the time "
+                                         "limit of 1 s\n");
 
     FleetTest::SummaryFile const summary(_work.file("summary.json"));
     EXPECT_EQ(summary.validationProblems(), "");
     EXPECT_EQ(summary.field("/interrupted"), "null");
+    EXPECT_EQ(summary.field("/listing_failure"),
+              R"({"command":"/opt/lsvtc/bin/lsvtc -t0","exit_status":null,)"
+              R"("message":"stopped after the time limit of 1 s"})");
 }
 
 } // namespace

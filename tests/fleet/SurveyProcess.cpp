@@ -65,6 +65,10 @@ SurveyProcess::SurveyProcess(std::vector<std::string> const& argv, std::string c
     }
 }
 
+pid_t SurveyProcess::pid() const {
+    return _pid;
+}
+
 SurveyProcess::~SurveyProcess() {
     if (_pid > 0) {
         ::kill(_pid, SIGKILL);

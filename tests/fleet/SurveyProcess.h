@@ -26,6 +26,7 @@ public:
     SurveyProcess& operator=(SurveyProcess const&) = delete;
 
     void signal(int signalNumber) const;
+    pid_t pid() const;
     // The exit status (128 + signal when a signal ended it), or -1 when the
     // process did not end within the bound and was killed.
     int waitForExit(double boundSeconds);
