@@ -3,6 +3,7 @@
 #include "fleet/PartitionName.h"
 #include "fleet/Progress.h"
 #include "report/FailureReason.h"
+#include "report/ListingFailure.h"
 #include "report/ReportCommand.h"
 
 #include <algorithm>
@@ -65,6 +66,15 @@ std::string reasonOf(PartitionRecord const& record) {
     return result.statusText;
 }
 
+// The console's answer first, so that a narrow terminal still shows it; the
+// command stays in the summary.
+std::string listingReason(report::ListingFailure const& failure) {
+    if (!failure.exitStatus) {
+        return failure.message;
+    }
+    return failure.message + " (exit status " + std::to_string(*failure.exitStatus) + ")";
+}
+
 std::string wholeSeconds(double seconds) {
     return std::to_string(static_cast<long>(std::floor(std::max(0.0, seconds)))) + " s";
 }
@@ -95,6 +105,10 @@ std::string listFitting(std::string const& prefix, std::vector<std::string> cons
 Recap::Recap(std::vector<MachineRecord> const& machines)
     : _machineCount(machines.size()), _outcomeCounts(report::gc_OutcomeCount, 0) {
     for (MachineRecord const& machine : machines) {
+        if (machine.listingFailure) {
+            _addFailure(report::gc_ListingFailedLabel, listingReason(*machine.listingFailure),
+                        machine.identity);
+        }
         for (PartitionRecord const& record : machine.partitions) {
             _count(record);
         }

@@ -100,6 +100,20 @@ TEST(Recap, RunWithoutPartitionsSaysSoInOneLine) {
               "quorvex-survey: 0 partitions of 1 machine in 00:00:00\n");
 }
 
+// The console's answer about the identity comes first: a narrow terminal
+// still shows it.
+TEST(Recap, MachineWhosePartitionListingFailedIsAFailureWithTheConsolesAnswer) {
+    MachineRecord unknown = machine("9119-MHE_21ABCDX", {});
+    unknown.listingFailure =
+        report::ListingFailure{"/opt/vtc/bin/lspartition -ix -c 9119-MHE_21ABCDX", 1,
+                               "lspartition: managed system not found"};
+    EXPECT_EQ(Recap({unknown}).text(endingAfter(0.4), 80),
+              "quorvex-survey: 0 partitions of 1 machine in 00:00:00\n"
+              "  failed, by reason:\n"
+              "    1 listing failed: lspartition: managed system not found (exit status 1)\n"
+              "      9119-MHE_21ABCDX\n");
+}
+
 TEST(Recap, InterruptedRunSaysBySignalAndAfterHowLong) {
     PartitionRecord stopped = failed("host2", Outcome::Interrupted, gc_ClientRunFailure);
     stopped.stop = fleet::ActionStop{report::RemoteAction::GetFile, 4, true};

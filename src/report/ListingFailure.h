@@ -9,6 +9,7 @@ namespace report {
 
 // How the report marks a machine, or a run, whose listing failed.
 inline constexpr char gc_ListingFailedName[] = "listing_failed";
+inline constexpr char gc_ListingFailedLabel[] = "listing failed";
 
 // A console listing command that failed: the machine listing of --all, or a
 // machine's partition listing. The listing code of the single-machine tool

@@ -145,8 +145,8 @@ std::string runNotesText(Json const& summary) {
     if (failure.is_null()) {
         return interruptionText(summary);
     }
-    return interruptionText(summary) +
-           " &middot; <b>listing failed</b>: " + escapeHtml(listingFailureText(failure));
+    return interruptionText(summary) + " &middot; <b>" + std::string(gc_ListingFailedLabel) +
+           "</b>: " + escapeHtml(listingFailureText(failure));
 }
 
 // One item per outcome; the page's script finds them by data-outcome, and

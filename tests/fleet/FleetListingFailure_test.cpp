@@ -121,4 +121,20 @@ TEST_F(FleetListingFailure, AnIdentityTheConsoleDoesNotKnowIsListingFailedWithTh
               std::string::npos);
 }
 
+// What the console answered about each identity is what the operator reads
+// at the end of the run.
+TEST_F(FleetListingFailure, RecapOfUnknownIdentitiesSaysListingFailedWithTheConsolesText) {
+    SimulatedConsole const console(
+        QuorvexTest::ScenarioFile{QuorvexTest::shippedScenario("demo.scn")});
+    CommandResult const result =
+        QuorvexTest::runCommand(_survey({"--recap", "9119-MHE_21ABCDX", "foo"}));
+    EXPECT_EQ(result.exitStatus, 8);
+    EXPECT_NE(result.stderrText.find("\n  failed, by reason:\n"
+                                     "    2 listing failed: lspartition: managed system not "
+                                     "found (exit status 1)\n"
+                                     "      9119-MHE_21ABCDX, foo\n"),
+              std::string::npos)
+        << result.stderrText;
+}
+
 } // namespace
