@@ -233,18 +233,44 @@ std::string missingValue(CLI::App const& command, std::string const& lastArgumen
            (words.empty() ? "" : " (" + words + ")");
 }
 
-// The reason on one line, then where the whole usage is: the help no longer
+// The reason and where the whole usage is, on one line: the help no longer
 // follows, so that the reason stays on the screen.
 ParsedCommandLine refused(CLI::App const& app, std::string const& reason) {
     CLI::App const& command = refusingCommand(app);
     std::string const inCommand = &command == &app ? "" : command.get_name() + ": ";
     std::string const helpCommand =
         std::string(gc_ProgramName) + (&command == &app ? "" : " " + command.get_name());
-    std::cerr << gc_ProgramName << ": " << inCommand << reason << "\n"
-              << gc_ProgramName << ": try '" << helpCommand << " --help'\n";
+    std::cerr << gc_ProgramName << ": " << inCommand << reason << " (try '" << helpCommand
+              << " --help')\n";
     ParsedCommandLine parsed;
     parsed.exitStatus = gc_ExitUsage;
     return parsed;
+}
+
+// The output options that name a file or folder: what the name is, and where
+// it goes.
+struct OutputName {
+    char const* option;
+    char const* what;
+    std::string Options::*value;
+};
+constexpr std::array<OutputName, 2> gc_OutputNames{
+    {{"--summary", "a file name", &Options::summaryFile},
+     {"--report", "a folder name", &Options::reportFolder}}};
+
+// An empty name would turn the output off without a word (an unset
+// variable in a timer's script, say). The parser takes the next word as the
+// value of "--summary=", so that form is looked for in the words themselves.
+void refuseEmptyOutputNames(CLI::App const& app, Options const& options, int argc,
+                            char const* const* argv) {
+    std::vector<std::string> const words(argv + 1, argv + argc);
+    for (OutputName const& name : gc_OutputNames) {
+        std::string const option = name.option;
+        bool const emptyGiven = app.count(option) > 0 && (options.*name.value).empty();
+        if (emptyGiven || std::find(words.begin(), words.end(), option + "=") != words.end()) {
+            throw CLI::ValidationError(option + " needs " + name.what + ", not an empty value");
+        }
+    }
 }
 
 // The program ends here: --help or --version.
@@ -267,6 +293,7 @@ void readCommandLine(CLI::App& app, CLI::App const& reportCommand, ParsedCommand
         return;
     }
     parsed.reportRequest.reset();
+    refuseEmptyOutputNames(app, parsed.options, argc, argv);
     checkMachines(app, parsed.options);
     keepFirstOfEach(parsed);
 }

@@ -45,8 +45,16 @@ void expectRefused(std::vector<std::string> const& arguments, std::string const&
     ASSERT_TRUE(run.parsed.exitStatus.has_value());
     EXPECT_EQ(*run.parsed.exitStatus, 64);
     EXPECT_EQ(run.out, "");
-    EXPECT_EQ(run.err,
-              "quorvex-survey: " + reason + "\nquorvex-survey: try '" + helpCommand + " --help'\n");
+    EXPECT_EQ(run.err, "quorvex-survey: " + reason + " (try '" + helpCommand + " --help')\n");
+}
+
+// An unset variable in a script must not turn an output off silently.
+TEST(CommandLine, EmptySummaryOrReportNameIsRefused) {
+    expectRefused({"--summary", "", "9119-MHE_21ABCDE"},
+                  "--summary needs a file name, not an empty value");
+    expectRefused({"--summary=", "--all"}, "--summary needs a file name, not an empty value");
+    expectRefused({"--report=", "9119-MHE_21ABCDE"},
+                  "--report needs a folder name, not an empty value");
 }
 
 TEST(CommandLine, DefaultsAreEightJobsAndHalfAnHour) {

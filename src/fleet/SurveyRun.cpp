@@ -61,6 +61,11 @@ std::string SurveyRun::overallCode() const {
     for (auto const& machine : _machines) {
         auto const machineCodes = machineReturnCodes(machine);
         codes.insert(codes.end(), machineCodes.begin(), machineCodes.end());
+        // As in the summary: a machine the console could not list counts as
+        // not surveyed.
+        if (machine.listingFailure) {
+            codes.emplace_back(report::gc_NotSurveyedCode);
+        }
     }
     return get_OverallCode(codes);
 }

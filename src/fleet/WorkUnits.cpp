@@ -51,6 +51,9 @@ std::string listMachines(std::string const& tracePath) {
     FieldRecord identities;
     {
         Utility::Trace trace(tracePath);
+        // The trace was opened after the worker's descriptors were closed
+        // to actions; the listing action must not hold it either.
+        keepDescriptorsFromActions();
         Quorvex::PYLON::ListOf_Machines machines;
         std::sort(machines.begin(), machines.end());
         for (auto const& machine : machines) {

@@ -127,6 +127,9 @@ std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::Sur
                                        fleet::MachineListing const& listing) {
     std::vector<std::string> failures = run.writeFailures();
     report::RunSummary summary = summaryOf(options, run, clock, listing);
+    // The report's copy of the summary tells the same exit status as the
+    // run, but for a report that cannot be written, which it cannot know.
+    summary.exitStatus = finalExitStatus(run, failures, listing);
     if (!options.reportFolder.empty()) {
         if (std::optional<std::string> const failure =
                 report::writeRunReport(report::summaryDocument(summary), options.reportFolder)) {

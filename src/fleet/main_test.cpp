@@ -65,8 +65,8 @@ TEST_F(SurveyProgram, BadCommandLineExits64WithItsReasonAndRunsNothing) {
         CommandResult const result = runSurvey(refusal.arguments);
         EXPECT_EQ(result.exitStatus, 64);
         EXPECT_EQ(result.stdoutText, "");
-        EXPECT_EQ(result.stderrText, "quorvex-survey: " + refusal.reason +
-                                         "\nquorvex-survey: try 'quorvex-survey --help'\n");
+        EXPECT_EQ(result.stderrText,
+                  "quorvex-survey: " + refusal.reason + " (try 'quorvex-survey --help')\n");
         EXPECT_TRUE(console.invocations().empty());
         EXPECT_TRUE(QuorvexTest::listFolder(gc_VPD_Folder).empty());
         EXPECT_TRUE(QuorvexTest::listFolder(gc_Trace_Folder).empty());

@@ -1,5 +1,6 @@
 #include "report/SummaryTotals.h"
 
+#include "report/StatusText.h"
 #include "survey/calculate_ReturnCode.h"
 
 #include <algorithm>
@@ -59,6 +60,11 @@ std::string overallCode(std::vector<MachineSummary> const& machines) {
     std::vector<std::string> codes;
     for (MachineSummary const& machine : machines) {
         appendReturnCodes(machine.partitions, codes);
+        // A machine the console could not list was not surveyed at all: a
+        // run that cannot see it never reads as a success.
+        if (machine.listingFailure) {
+            codes.emplace_back(gc_NotSurveyedCode);
+        }
     }
     return get_OverallCode(codes);
 }

@@ -65,4 +65,15 @@ TEST(SummaryTotals, RunCodeTakesEveryMachinesPartitionsTogether) {
     EXPECT_EQ("8", report::overallCode(std::vector<MachineSummary>{}));
 }
 
+// A machine whose listing failed printed 8 and was not surveyed: beside a
+// surveyed machine the run reads 4, never 0.
+TEST(SummaryTotals, RunCodeCountsAMachineWhoseListingFailedAsNotSurveyed) {
+    MachineSummary unknown = machine({});
+    unknown.listingFailure = report::ListingFailure{"/opt/vtc/bin/lspartition -ix -c X", 1,
+                                                    "lspartition: managed system not found"};
+    EXPECT_EQ("4", report::overallCode(
+                       std::vector<MachineSummary>{machine({Outcome::Surveyed}), unknown}));
+    EXPECT_EQ("8", report::overallCode(std::vector<MachineSummary>{unknown}));
+}
+
 } // namespace

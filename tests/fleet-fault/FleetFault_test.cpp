@@ -23,6 +23,7 @@
 #include <csignal>
 #include <cstring>
 #include <filesystem>
+#include <optional>
 #include <set>
 #include <sys/mount.h>
 #include <thread>
@@ -374,6 +375,33 @@ TEST(FleetFault, RemoteActionsInheritOnlyTheStandardDescriptors) {
             EXPECT_EQ(inherited, std::set<std::string>{}) << "descriptors of remote action " << pid;
         }
         EXPECT_EQ(run.waitForExit(), 0) << run.standardError();
+        run.expectEndedCleanly();
+    });
+}
+
+// The machine listing's worker opens its trace late: its action must not
+// hold it either.
+TEST(FleetFault, MachineListingActionInheritsOnlyTheStandardDescriptors) {
+    repeat([](FaultTimings& timings) {
+        FaultRun run("[lsvtc]\ndelay " + std::to_string(1.5 + timings.between(0.0, 0.5)) + "\n",
+                     {"-t", "0", "--all"});
+        std::optional<pid_t> listing;
+        for (int look = 0; look < 100 && !listing; ++look) {
+            pause(0.02);
+            for (pid_t const pid : run.survey().descendants()) {
+                if (QuorvexTest::readFile("/proc/" + std::to_string(pid) + "/cmdline")
+                        .rfind("/opt/lsvtc/bin/lsvtc", 0) == 0) {
+                    listing = pid;
+                }
+            }
+        }
+        ASSERT_TRUE(listing.has_value()) << "the machine listing never ran";
+        std::set<std::string> inherited = descriptorsOf(*listing);
+        for (auto it = inherited.begin(); it != inherited.end();) {
+            it = isStandardDescriptor(*it) ? inherited.erase(it) : std::next(it);
+        }
+        EXPECT_EQ(inherited, std::set<std::string>{}) << "descriptors of the machine listing";
+        EXPECT_EQ(run.waitForExit(), 8) << run.standardError();
         run.expectEndedCleanly();
     });
 }

@@ -50,9 +50,8 @@ TEST_P(FleetBadCommandLine, IsRefusedWithItsReasonAndWhereTheHelpIsAndRunsNothin
     CommandResult const result = runSurvey(GetParam().arguments);
     EXPECT_EQ(result.exitStatus, 64);
     EXPECT_EQ(result.stdoutText, "");
-    EXPECT_EQ(result.stderrText, "quorvex-survey: " + GetParam().reason +
-                                     "\nquorvex-survey: try '" + GetParam().helpCommand +
-                                     " --help'\n");
+    EXPECT_EQ(result.stderrText, "quorvex-survey: " + GetParam().reason + " (try '" +
+                                     GetParam().helpCommand + " --help')\n");
     EXPECT_EQ(console.invocations(), std::vector<QuorvexTest::Invocation>{}) << "console called";
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_VPD_Folder), std::vector<std::string>{});
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_TraceFolder), std::vector<std::string>{});

@@ -46,6 +46,9 @@ protected:
         EXPECT_EQ(summary.validationProblems(), "");
         EXPECT_EQ(summary.field("/exit_status"), "69");
         EXPECT_EQ(summary.field("/machines"), "[]");
+        // The report's copy of the summary tells the same exit status.
+        EXPECT_EQ(FleetTest::SummaryFile(_work.file("report/summary.json")).field("/exit_status"),
+                  "69");
         EXPECT_NE(QuorvexTest::readFile(_work.file("report/partitions.csv"))
                       .find(",listing_failed,,,,,,,/opt/lsvtc/bin/lsvtc -t0"),
                   std::string::npos);
@@ -135,6 +138,24 @@ TEST_F(FleetListingFailure, RecapOfUnknownIdentitiesSaysListingFailedWithTheCons
                                      "      9119-MHE_21ABCDX, foo\n"),
               std::string::npos)
         << result.stderrText;
+}
+
+// A machine the console could not list is not surveyed: beside one whose
+// every partition was surveyed the run exits 4, as its summary says.
+TEST_F(FleetListingFailure, RunWithAnUnknownIdentityBesideASurveyedMachineExits4) {
+    SimulatedConsole const console(
+        "[lspartition 1234-ABC_10ABCDE]\nstdout 1,10.1.1.11,3,host1,Zeph,7.2;\n"
+        "[lspartition *]\nstderr lspartition: managed system not found\nexit 1\n"
+        "[runCmdOnPartition *]\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
+        "[getFileFromPartition *]\nstdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n"
+        "document-nolf <fetched/>\n");
+    CommandResult const result =
+        QuorvexTest::runCommand(_survey({"1234-ABC_10ABCDE", "9119-MHE_21ABCDX"}));
+    EXPECT_EQ(result.exitStatus, 4) << result.stderrText;
+    FleetTest::SummaryFile const summary(_work.file("summary.json"));
+    EXPECT_EQ(summary.field("/machines/0/return_code"), "\"0\"");
+    EXPECT_EQ(summary.field("/machines/1/return_code"), "\"8\"");
+    EXPECT_EQ(summary.field("/return_code"), "\"4\"");
 }
 
 } // namespace
