@@ -19,14 +19,25 @@ namespace fleet {
 
 namespace {
 
-// Sent by the kernel when the parent ends; nothing else sends it to a worker.
+// Sent by the kernel when the parent ends.
 constexpr int gc_ParentGoneSignal = SIGUSR1;
+// Also tells of the parent's end: when the parent dies while a process of
+// the worker's group is stopped (an action that stopped itself, or one the
+// run holds stopped), the kernel hangs the orphaned group up, and the worker
+// must clean up rather than die of it.
+constexpr int gc_HangUpSignal = SIGHUP;
 
 // The pipe the signal handler writes to, read by the watching thread.
 int gs_ParentGoneWriteEnd = -1;
+pid_t gs_Parent = 0;
 std::atomic<bool> gs_ParentGone{false};
 
+// Either signal counts only when the parent is really gone: one sent by an
+// action to its group leaves a worker whose parent lives alone.
 void onParentGone(int) {
+    if (getppid() == gs_Parent) {
+        return;
+    }
     int const savedErrno = errno;
     char const byte = 1;
     // A full pipe already holds the news.
@@ -62,11 +73,13 @@ void tieToParent(pid_t parent) {
         throw util::SystemError("cannot create", "the parent watch pipe", errno);
     }
     gs_ParentGoneWriteEnd = ends[1];
+    gs_Parent = parent;
     struct sigaction action {};
     action.sa_handler = &onParentGone;
     action.sa_flags = SA_RESTART;
     sigemptyset(&action.sa_mask);
     sigaction(gc_ParentGoneSignal, &action, nullptr);
+    sigaction(gc_HangUpSignal, &action, nullptr);
     std::thread(&watchParentGone, ends[0]).detach();
     if (prctl(PR_SET_PDEATHSIG, gc_ParentGoneSignal) != 0) {
         throw util::SystemError("cannot tie the worker to", "its parent", errno);

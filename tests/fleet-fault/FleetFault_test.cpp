@@ -245,6 +245,31 @@ TEST(FleetFault, ParentKilledAtARandomMomentLeavesNothingOneSecondLater) {
     });
 }
 
+// An action that stopped itself makes the worker's group an orphaned one
+// with a stopped member when the parent dies: the kernel hangs the group up,
+// and the worker must still end what it started and remove its files.
+TEST(FleetFault, ParentKilledWhileAnActionStoppedItselfLeavesNothing) {
+    repeat([](FaultTimings& timings) {
+        FaultRun run(listing(1) +
+                         "[runCmdOnPartition 1]\ndaemon-delay 3600\nmisbehave stop-self\n" +
+                         gc_Hang + fetchAnswer(),
+                     {"-t", "0", gc_Identity});
+        ASSERT_TRUE(waitForCalls(run.console(), "runCmdOnPartition", 1));
+        pause(timings.between(0.3, 1.0));
+        EXPECT_TRUE(run.survey().signal(SIGKILL));
+        EXPECT_EQ(run.waitForExit(), 128 + SIGKILL);
+        EXPECT_EQ(run.survey().processesLeft(gc_NothingLeftWithin), std::vector<std::string>{})
+            << "processes of the run still running one second after its parent was killed";
+        std::vector<std::string> shellFiles;
+        for (std::string const& name : QuorvexTest::listFolder("/tmp")) {
+            if (name.rfind("ShellCommand.", 0) == 0) {
+                shellFiles.push_back(name);
+            }
+        }
+        EXPECT_EQ(shellFiles, std::vector<std::string>{}) << "the action's output files";
+    });
+}
+
 TEST(FleetFault, WorkerKilledMidActionIsRecordedAsWorkerDied) {
     repeat([](FaultTimings& timings) {
         std::string scenario = listing(3);
