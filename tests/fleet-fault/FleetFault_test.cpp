@@ -90,6 +90,22 @@ bool waitForCalls(SimulatedConsole const& console, std::string const& action, st
     return false;
 }
 
+// Waits (up to the bound of a hung run) until the console's tool has been
+// called: the run is then past its start, its signal handling in place.
+bool waitForTool(SimulatedConsole const& console, std::string const& tool) {
+    double const until = FleetTest::monotonicSeconds() + gc_HungRun;
+    while (FleetTest::monotonicSeconds() < until) {
+        std::vector<QuorvexTest::Invocation> const calls = console.invocations();
+        if (std::any_of(calls.begin(), calls.end(), [&tool](QuorvexTest::Invocation const& call) {
+                return !call.empty() && call.front() == tool;
+            })) {
+            return true;
+        }
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+    return false;
+}
+
 // Waits (up to the bound of a hung run) until the run has no worker left:
 // every unit has ended, and what remains is writing the results.
 void waitForNoWorker(MarkedSurvey const& survey) {
@@ -314,12 +330,15 @@ TEST(FleetFault, SignalWhileTheResultsAreWrittenEndsTheRunAsDocumented) {
 TEST(FleetFault, SignalDuringASlowMachineListingEndsTheRun) {
     repeat([](FaultTimings& timings) {
         int const signalNumber = timings.wholeBetween(0, 1) == 0 ? SIGINT : SIGTERM;
-        double const listingTakes = timings.between(0.5, 1.5);
+        double const listingTakes = timings.between(1.0, 2.0);
         FaultRun run("[lsvtc]\ndelay " + std::to_string(listingTakes) +
                          "\nstdout 0:" + gc_Identity + ";\n" + listing(2) +
                          "[runCmdOnPartition *]\n" + gc_Answer + fetchAnswer(),
                      {"-t", "5", "--all"});
-        pause(timings.between(0.05, listingTakes - 0.2));
+        // Before the listing runs the run may not yet handle signals at all,
+        // as documented; from the listing on it must.
+        ASSERT_TRUE(waitForTool(run.console(), "lsvtc"));
+        pause(timings.between(0.0, listingTakes - 0.6));
         EXPECT_TRUE(run.survey().signal(signalNumber));
         EXPECT_EQ(run.waitForExit(), 128 + signalNumber) << run.standardError();
         run.expectEndedCleanly();
