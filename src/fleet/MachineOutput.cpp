@@ -9,7 +9,10 @@
 #include "survey/calculate_ReturnCode.h"
 
 #include <algorithm>
+#include <cerrno>
+#include <csignal>
 #include <cstdio>
+#include <iostream>
 
 namespace fleet {
 
@@ -70,6 +73,7 @@ void MachineOutput::_write(std::size_t index) {
     }
     _line.erase();
     printMachineBlock(machine);
+    _noteUnwritableOutput();
     // The block ends with the code digit and no line end.
     _line.leaveOpenRow(std::string(get_OverallCode(machineReturnCodes(machine))).size());
     _writeFile(statusFilePath(machine.identity), machineStatusText(machine));
@@ -77,6 +81,23 @@ void MachineOutput::_write(std::size_t index) {
         _writeFile(traceFilePath(machine.identity), *trace);
     }
     _noteDocumentFailures(machine);
+}
+
+// A standard output that cannot be written (a full disk, say) stops the run
+// as a reader gone does, by SIGPIPE, once its cause is said. A reader gone
+// has sent SIGPIPE itself, which says it all.
+void MachineOutput::_noteUnwritableOutput() {
+    if (std::cout.good()) {
+        return;
+    }
+    int const cause = errno;
+    std::cout.clear();
+    if (_outputFailed || cause == EPIPE) {
+        return;
+    }
+    _outputFailed = true;
+    _writeFailures.emplace_back(util::SystemError("write", "standard output", cause).what());
+    std::raise(SIGPIPE);
 }
 
 // The documents are written by the survey code in the workers, which says

@@ -42,6 +42,7 @@ public:
 private:
     void _write(std::size_t index);
     void _noteDocumentFailures(MachineRecord const& machine);
+    void _noteUnwritableOutput();
     void _removeTracePieces(std::string const& identity) const;
     void _writeFile(std::string const& path, std::string const& text);
 
@@ -50,6 +51,8 @@ private:
     std::vector<bool> _slotInUse;
     std::size_t _written = 0;
     std::vector<std::string> _writeFailures;
+    // Standard output failed once: said once.
+    bool _outputFailed = false;
 };
 
 } // namespace fleet

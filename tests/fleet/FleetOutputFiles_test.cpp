@@ -256,6 +256,23 @@ bool waitForClientRun(SimulatedConsole const& console, std::string const& id) {
 // the second machine's hung action included, and says why. The pipe is full
 // until the hung action has started, so the block cannot get through before
 // the reader goes, whatever the timing.
+// A standard output on a full disk stops the run as a reader gone does,
+// after the cause is said.
+TEST_F(FleetOutputFiles, StandardOutputThatCannotBeWrittenStopsTheRunLikeSigpipe) {
+    SimulatedConsole const console(listing(gc_Identity, 2, true) + surveyedActions());
+    std::string const summary = _work.file("summary.json");
+    SurveyProcess survey({FleetTest::consoleWideTool(), "--summary", summary, gc_Identity},
+                         "/dev/full", _work.file("stderr"));
+    EXPECT_EQ(survey.waitForExit(gc_Bound), 128 + SIGPIPE) << _stderr();
+    EXPECT_EQ(_stderr(), std::string("0\n0\n") + gc_BlockEnd +
+                             "0\nquorvex-survey: cannot write standard output: No space left "
+                             "on device\nquorvex-survey: stopped by SIGPIPE\n");
+    FleetTest::SummaryFile const written(summary);
+    EXPECT_EQ(written.field("/interrupted"), "\"SIGPIPE\"");
+    EXPECT_EQ(written.field("/exit_status"), "141");
+    EXPECT_TRUE(QuorvexTest::fileExists(gc_StatusFile));
+}
+
 TEST_F(FleetOutputFiles, ReaderGoneFromStandardOutputStopsTheRunWithSigpipe) {
     SimulatedConsole const console(listing(gc_Identity, 1, true) + listing(gc_Second, 1, true, 2) +
                                    "[runCmdOnPartition 1]\n" + gc_Answer +
