@@ -3,6 +3,7 @@
 #include "Lines.h"
 #include "QuorvexTest.h"
 #include "TextDifference.h"
+#include "report/ListingFailure.h"
 #include "utility/TextChecks.h"
 
 #include <gtest/gtest.h>
@@ -119,9 +120,21 @@ std::string DifferentialCase::_expectedStderr() const {
     return warnings + QuorvexTest::readFile(_file(gc_Reference, "stderr"));
 }
 
+// Whether the tool's trace of the machine whose status file this is holds a
+// partition listing that failed.
+bool DifferentialCase::_listingFailed(std::string const& statusFileName) const {
+    std::string const traceName =
+        statusFileName.substr(0, statusFileName.size() - std::string(gc_StatusSuffix).size()) +
+        ".Trace";
+    std::string const trace = _folder + "/" + gc_Reference + "/Trace/" + traceName;
+    return QuorvexTest::fileExists(trace) &&
+           report::listingFailureInTrace(QuorvexTest::readFile(trace)).has_value();
+}
+
 // The one-machine tool's rule over every listed partition of every machine:
 // 0 all surveyed, 4 some, 8 none or none listed. For one machine that is the
-// code the tool printed last; for several it is counted in the status files.
+// code the tool printed last; for several it is counted in the status files,
+// where a machine the console could not list counts as not surveyed.
 int DifferentialCase::_expectedExitStatus() const {
     std::vector<std::string> identities = _identities();
     std::sort(identities.begin(), identities.end());
@@ -141,6 +154,8 @@ int DifferentialCase::_expectedExitStatus() const {
             listed += line == gc_NoPartitionLine ? 0 : 1;
             surveyed += util::endsWith(line, gc_SurveyedEnding) ? 1 : 0;
         }
+        // A machine the console could not list counts as one not surveyed.
+        listed += _listingFailed(fileName) ? 1 : 0;
     }
     if (surveyed == 0) {
         return 8;

@@ -36,6 +36,7 @@ private:
     bool _surveysAll() const;
     std::string _expectedStderr() const;
     int _expectedExitStatus() const;
+    bool _listingFailed(std::string const& statusFileName) const;
     std::string _expectedCalls() const;
     void _expectSameFolder(std::string const& run, std::string const& folder) const;
     std::string _normalised(std::string const& folder, std::string const& text) const;
