@@ -127,11 +127,20 @@ std::string formatProgress(ProgressFigures const& figures, std::size_t columns) 
     return fitToWidth(joined(fields), columns);
 }
 
+// A character is a column: the cut never splits a UTF-8 sequence, so a
+// console's text in any language stays valid.
 std::string fitToWidth(std::string const& line, std::size_t columns) {
-    if (columns == 0 || line.size() < columns) {
+    if (columns == 0) {
         return line;
     }
-    return line.substr(0, columns - 1);
+    std::size_t characters = 0;
+    for (std::size_t at = 0; at < line.size(); ++at) {
+        bool const startsCharacter = (static_cast<unsigned char>(line[at]) & 0xC0U) != 0x80U;
+        if (startsCharacter && ++characters == columns) {
+            return line.substr(0, at);
+        }
+    }
+    return line;
 }
 
 } // namespace fleet

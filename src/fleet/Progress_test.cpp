@@ -115,6 +115,14 @@ TEST(Progress, LineIsCutToLeaveTheTerminalsLastColumnFree) {
     EXPECT_EQ(fleet::fitToWidth("abcd", 1), "");
 }
 
+// A console's text in another language: characters count, not bytes, and
+// no character is cut in half.
+TEST(Progress, FitToWidthCountsCharactersAndNeverSplitsOne) {
+    EXPECT_EQ(fleet::fitToWidth("caf\u00e9 cr\u00e8me", 80), "caf\u00e9 cr\u00e8me");
+    EXPECT_EQ(fleet::fitToWidth("caf\u00e9 cr\u00e8me", 5), "caf\u00e9");
+    EXPECT_EQ(fleet::fitToWidth("\u00e9\u00e9\u00e9", 3), "\u00e9\u00e9");
+}
+
 TEST(Progress, LineIsKeptWholeWhenTheWidthIsUnknown) {
     EXPECT_EQ(fleet::formatProgress(exampleFiguresWithHost(), 0), gc_WholeLine);
 }
