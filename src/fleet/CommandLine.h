@@ -43,9 +43,7 @@ struct ParsedCommandLine {
 };
 
 constexpr int gc_ExitUsage = 64;
-// An output of the run (a result folder, the summary, the report, a
-// machine's file) cannot be written: sysexits.h's EX_CANTCREAT.
-constexpr int gc_ExitCannotCreate = 73;
+using report::gc_ExitCannotCreate;
 
 ParsedCommandLine parseCommandLine(int argc, char const* const* argv);
 

@@ -79,7 +79,7 @@ int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::os
     if (std::optional<std::string> const failure =
             reportFailure(*summary, request.vpdFolder, request.folder)) {
         errors << gc_ProgramName << ": " << *failure << "\n";
-        return 1;
+        return gc_ExitCannotCreate;
     }
     out << request.folder << "/index.html\n";
     return 0;

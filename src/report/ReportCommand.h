@@ -20,6 +20,11 @@ inline constexpr char gc_ProgramName[] = "quorvex-survey";
 // is the status of a bad command line.
 inline constexpr int gc_ExitNothingToRead = 64;
 
+// An output (a result folder, the summary, the report, a machine's file)
+// cannot be written: sysexits.h's EX_CANTCREAT, for the run and for
+// "report" alike.
+inline constexpr int gc_ExitCannotCreate = 73;
+
 // What "report [--from VPD_FOLDER] DIR" was given.
 struct ReportRequest {
     std::string vpdFolder = gc_DefaultVpdFolder;
@@ -41,10 +46,9 @@ void checkReportRequest(ReportRequest const& request);
 CLI::Option* addReportOption(CLI::App& app, std::string& folder);
 
 // Writes the report of the survey files in request.vpdFolder into
-// request.folder and prints the page's path on out. Returns 0; 1 with the
-// reason on errors when a file cannot be written; gc_ExitNothingToRead with
-// the reason on errors, writing nothing, when the VPD folder gives nothing
-// to read.
+// request.folder and prints the page's path on out. Returns 0;
+// gc_ExitCannotCreate with the reason on errors when a file cannot be written; gc_ExitNothingToRead
+// with the reason on errors, writing nothing, when the VPD folder gives nothing to read.
 int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors);
 
 // Writes the report of a run's summary into folder, its documents lying in

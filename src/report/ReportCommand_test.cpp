@@ -151,7 +151,7 @@ TEST(ReportCommand, RunThatCannotWriteSaysWhyAndFails) {
     QuorvexTest::writeFile(root.file("file"), "x");
     std::ostringstream out;
     std::ostringstream errors;
-    EXPECT_EQ(1, report::runReportSubcommand({root.path(), root.file("file/r")}, out, errors));
+    EXPECT_EQ(73, report::runReportSubcommand({root.path(), root.file("file/r")}, out, errors));
     EXPECT_EQ("", out.str());
     EXPECT_EQ(0U,
               errors.str().find("quorvex-survey: report: cannot create " + root.file("file/r")));
