@@ -466,7 +466,8 @@ TEST(InventoryDocumentReader, EveryClientDocumentOfTheSimulatedConsoleReadsWhole
 
 TEST(InventoryDocumentReader, MissingFileIsASystemError) {
     QuorvexTest::TemporaryDirectory const folder;
-    EXPECT_THROW(inventory::readDocumentFile(folder.file("absent.VPD.xml")), util::SystemError);
+    EXPECT_THROW(static_cast<void>(inventory::readDocumentFile(folder.file("absent.VPD.xml"))),
+                 util::SystemError);
 }
 
 } // namespace

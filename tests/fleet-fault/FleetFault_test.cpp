@@ -23,6 +23,7 @@
 #include <csignal>
 #include <cstring>
 #include <filesystem>
+#include <iterator>
 #include <optional>
 #include <set>
 #include <sys/mount.h>
@@ -276,12 +277,10 @@ TEST(FleetFault, ParentKilledWhileAnActionStoppedItselfLeavesNothing) {
         EXPECT_EQ(run.waitForExit(), 128 + SIGKILL);
         EXPECT_EQ(run.survey().processesLeft(gc_NothingLeftWithin), std::vector<std::string>{})
             << "processes of the run still running one second after its parent was killed";
+        std::vector<std::string> const inTmp = QuorvexTest::listFolder("/tmp");
         std::vector<std::string> shellFiles;
-        for (std::string const& name : QuorvexTest::listFolder("/tmp")) {
-            if (name.rfind("ShellCommand.", 0) == 0) {
-                shellFiles.push_back(name);
-            }
-        }
+        std::copy_if(inTmp.begin(), inTmp.end(), std::back_inserter(shellFiles),
+                     [](std::string const& name) { return name.rfind("ShellCommand.", 0) == 0; });
         EXPECT_EQ(shellFiles, std::vector<std::string>{}) << "the action's output files";
     });
 }
