@@ -15,13 +15,12 @@ std::string traceFilePath(std::string const& identity);
 std::string runLockPath();
 
 // The temporary piece of a machine's trace that the unit of work running
-// in one slot writes. The slot's next unit of the machine writes over it,
-// so a run creates at most one piece file per slot and machine rather than
-// one per partition.
+// in one slot writes; the slot's next unit of the machine writes the same
+// name once the run has taken the piece.
 std::string tracePiecePath(std::string const& identity, std::size_t slot);
 
-// What a piece holds, nothing when it does not exist; the piece is left
-// empty for the slot's next unit.
+// What a piece holds, nothing when it does not exist; the piece is removed,
+// and the slot's next unit makes it anew.
 std::optional<std::string> takeTracePiece(std::string const& piece);
 
 } // namespace fleet

@@ -12,14 +12,14 @@ using fleet::traceFilePath;
 using fleet::tracePiecePath;
 using QuorvexTest::TemporaryDirectory;
 
-TEST(RunFiles, TakingAPieceGivesItsBytesAndLeavesItEmptyForTheSlotsNextUnit) {
+TEST(RunFiles, TakingAPieceGivesItsBytesAndRemovesIt) {
     TemporaryDirectory const folder;
     std::string const piece = folder.file("piece");
     std::string const bytes("line one\n\0two", 13);
     QuorvexTest::writeFile(piece, bytes);
     EXPECT_EQ(takeTracePiece(piece), std::optional<std::string>(bytes));
-    EXPECT_EQ(QuorvexTest::readFile(piece), "");
-    EXPECT_EQ(takeTracePiece(piece), std::optional<std::string>(""));
+    EXPECT_FALSE(QuorvexTest::fileExists(piece));
+    EXPECT_EQ(takeTracePiece(piece), std::nullopt);
 }
 
 TEST(RunFiles, TakingAPieceThatDoesNotExistGivesNothing) {

@@ -49,6 +49,7 @@ void closeTrace() {
 
 std::string listMachines(std::string const& tracePath) {
     FieldRecord identities;
+    removeWhenParentGone(tracePath);
     {
         Utility::Trace trace(tracePath);
         // The trace was opened after the worker's descriptors were closed
@@ -78,6 +79,7 @@ std::vector<std::string> decodeMachines(std::string const& text) {
 
 std::string listPartitions(std::string const& identity, std::string const& tracePiece) {
     std::string encoded;
+    removeWhenParentGone(tracePiece);
     {
         Utility::Trace trace(tracePiece);
         keepDescriptorsFromActions();
@@ -124,6 +126,7 @@ std::optional<std::vector<Quorvex::System::Partition>> decodePartitions(std::str
 std::string surveyPartition(Quorvex::System::Partition const& partition,
                             std::string const& tracePiece) {
     PartitionOutcome outcome;
+    removeWhenParentGone(tracePiece);
     {
         Utility::Trace trace(tracePiece);
         keepDescriptorsFromActions();

@@ -31,6 +31,8 @@ constexpr int gc_HangUpSignal = SIGHUP;
 int gs_ParentGoneWriteEnd = -1;
 pid_t gs_Parent = 0;
 std::atomic<bool> gs_ParentGone{false};
+// The worker's trace file, which only the parent would have taken.
+std::string gs_TraceToRemove;
 
 // Either signal counts only when the parent is really gone: one sent by an
 // action to its group leaves a worker whose parent lives alone.
@@ -93,6 +95,10 @@ bool isParentGone() {
     return gs_ParentGone.load();
 }
 
+void removeWhenParentGone(std::string const& path) {
+    gs_TraceToRemove = path;
+}
+
 void keepBrokenPipeFromEndingWorker() {
     sigset_t brokenPipe;
     sigemptyset(&brokenPipe);
@@ -103,6 +109,11 @@ void keepBrokenPipeFromEndingWorker() {
 void endWorker(int status) {
     killDescendants(getpid());
     while (waitpid(-1, nullptr, WNOHANG) > 0) {
+    }
+    // Whichever thread ends the worker: with the parent gone nobody takes
+    // the trace any more.
+    if (gs_Parent != 0 && getppid() != gs_Parent && !gs_TraceToRemove.empty()) {
+        unlink(gs_TraceToRemove.c_str());
     }
     _exit(status);
 }

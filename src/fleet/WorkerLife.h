@@ -2,6 +2,8 @@
 
 #include <sys/types.h>
 
+#include <string>
+
 namespace fleet {
 
 // What a forked worker does to live no longer than the run and to hand its
@@ -18,6 +20,10 @@ void tieToParent(pid_t parent);
 // True once the worker has learned that its parent is gone: it must start
 // nothing more.
 bool isParentGone();
+// The file the worker writes its trace into: removed when the parent is
+// gone, as nobody will take it any more. One per worker; set before the
+// worker writes it.
+void removeWhenParentGone(std::string const& path);
 // Blocks SIGPIPE in the calling thread once the worker runs no more
 // commands: a write to a parent that is gone then fails with EPIPE instead
 // of ending the worker before it has ended what it started.

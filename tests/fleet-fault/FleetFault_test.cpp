@@ -136,6 +136,7 @@ public:
     SimulatedConsole const& console() const { return _console; }
     MarkedSurvey& survey() { return _survey; }
     std::string summaryPath() const { return _work.file("summary.json"); }
+    std::string workFolder() const { return _work.path(); }
     std::string standardError() const { return QuorvexTest::readFile(_work.file("stderr")); }
 
     int waitForExit() {
@@ -245,6 +246,17 @@ template <typename Case> void repeat(Case const& runOnce) {
     }
 }
 
+// The temporary files a run killed with SIGKILL leaves. Its lock file stays
+// (the lock itself ends with the process), as documented: the next run takes
+// it over.
+std::vector<std::string> leftByAKilledRun(FaultRun const& run) {
+    std::vector<std::string> left = FleetFaultTest::temporaryFilesLeft(run.workFolder());
+    left.erase(std::remove(left.begin(), left.end(),
+                           std::string(QuorvexTest::gc_VPD_Folder) + "/.quorvex-survey.lock"),
+               left.end());
+    return left;
+}
+
 TEST(FleetFault, ParentKilledAtARandomMomentLeavesNothingOneSecondLater) {
     repeat([](FaultTimings& timings) {
         int const partitions = timings.wholeBetween(2, 6);
@@ -259,6 +271,8 @@ TEST(FleetFault, ParentKilledAtARandomMomentLeavesNothingOneSecondLater) {
         EXPECT_EQ(run.waitForExit(), 128 + SIGKILL);
         EXPECT_EQ(run.survey().processesLeft(gc_NothingLeftWithin), std::vector<std::string>{})
             << "processes of the run still running one second after its parent was killed";
+        EXPECT_EQ(leftByAKilledRun(run), std::vector<std::string>{})
+            << "trace pieces and other temporary files";
     });
 }
 
@@ -282,6 +296,8 @@ TEST(FleetFault, ParentKilledWhileAnActionStoppedItselfLeavesNothing) {
         std::copy_if(inTmp.begin(), inTmp.end(), std::back_inserter(shellFiles),
                      [](std::string const& name) { return name.rfind("ShellCommand.", 0) == 0; });
         EXPECT_EQ(shellFiles, std::vector<std::string>{}) << "the action's output files";
+        EXPECT_EQ(leftByAKilledRun(run), std::vector<std::string>{})
+            << "trace pieces and other temporary files";
     });
 }
 

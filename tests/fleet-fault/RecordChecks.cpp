@@ -98,7 +98,7 @@ std::vector<std::string> machineProblems(Json const& machine) {
 std::vector<std::string> temporaryFilesLeft(std::string const& workFolder) {
     std::vector<std::string> left;
     for (std::string const& name : QuorvexTest::listFolder("/tmp")) {
-        if (name.rfind("ShellCommand.", 0) == 0) {
+        if (name.rfind("ShellCommand.", 0) == 0 || name.rfind("quorvex-survey-listing-", 0) == 0) {
             left.push_back("/tmp/" + name);
         }
     }
