@@ -60,9 +60,8 @@ std::vector<std::string> EnvironmentFile::expand(std::string const& commandLine)
     std::vector<std::string> expanded;
     for (std::string word : u_words(commandLine)) {
         if (word.size() > 1 && word[0] == '$' && word[1] != '{') {
-            for (std::string const& part : u_words(_value(word.substr(1)))) {
-                expanded.push_back(part);
-            }
+            std::vector<std::string> const parts = u_words(_value(word.substr(1)));
+            expanded.insert(expanded.end(), parts.begin(), parts.end());
             continue;
         }
         for (std::size_t start = word.find("${"); start != std::string::npos;

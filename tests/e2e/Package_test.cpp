@@ -239,7 +239,7 @@ bool u_exists(std::string const& path) {
 
 // A root with an empty dpkg database.
 std::string u_dpkgRoot(std::string const& scratch) {
-    std::string const root = scratch + "/dpkg-root";
+    std::string root = scratch + "/dpkg-root";
     fs::create_directories(root + "/var/lib/dpkg/info");
     fs::create_directories(root + "/var/lib/dpkg/updates");
     QuorvexTest::writeFile(root + "/var/lib/dpkg/status", "");

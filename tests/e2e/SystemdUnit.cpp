@@ -60,8 +60,8 @@ std::vector<std::string> SystemdUnit::words(std::string const& section,
                                             std::string const& key) const {
     std::vector<std::string> result;
     for (std::string const& line : values(section, key)) {
-        std::istringstream words(line);
-        for (std::string word; words >> word;) {
+        std::istringstream stream(line);
+        for (std::string word; stream >> word;) {
             result.push_back(word);
         }
     }
