@@ -35,15 +35,16 @@ std::string u_testName() {
     return ::testing::UnitTest::GetInstance()->current_test_info()->name();
 }
 
-// The build tree installed with the prefix /usr into a scratch root of this
-// test's own (tests of this program may run at the same time).
-std::string u_installedRoot() {
+// The build tree installed with the prefix (/usr, as the package has it)
+// into a scratch root of this test's own (tests of this program may run at
+// the same time).
+std::string u_installedRoot(std::string const& prefix = "/usr") {
     std::string root = std::string(QUORVEX_UNITS_SCRATCH) + "/" + u_testName();
     std::error_code ignored;
     fs::remove_all(root, ignored);
     QuorvexTest::CommandResult const install =
         QuorvexTest::runCommand({"/usr/bin/env", "DESTDIR=" + root, QUORVEX_CMAKE_COMMAND,
-                                 "--install", QUORVEX_BINARY_DIR, "--prefix", "/usr"});
+                                 "--install", QUORVEX_BINARY_DIR, "--prefix", prefix});
     EXPECT_EQ(install.exitStatus, 0) << install.stdoutText << install.stderrText;
     return root;
 }
@@ -89,6 +90,15 @@ TEST(ScheduledSurvey, ServiceSurveysEveryMachineWithTheShippedOptions) {
     EXPECT_EQ(u_command(root, u_shippedOptions(root)), expected);
     EXPECT_EQ(u_unit(root, "quorvex-survey.service").value(gc_Service, "EnvironmentFile"),
               std::string("-") + gc_DefaultFile);
+}
+
+// The unit is written when it is installed, so it follows the prefix of
+// that installation, not the one the build was configured with.
+TEST(ScheduledSurvey, ServiceNamesTheProgramWhereAnInstallationWithAnotherPrefixPutsIt) {
+    std::string const root = u_installedRoot("/opt/quorvex");
+    EXPECT_TRUE(QuorvexTest::fileExists(root + "/opt/quorvex/bin/quorvex-survey"));
+    EXPECT_EQ(u_command(root, EnvironmentFile("")),
+              (std::vector<std::string>{"/opt/quorvex/bin/quorvex-survey", "--all"}));
 }
 
 // The file is optional ("-"): without it, or with every variable emptied,
