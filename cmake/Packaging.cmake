@@ -2,8 +2,11 @@
 # It carries what the install rules give a console: the executable and
 # quorvex-survey beside it, their manual pages, and the folders
 # /var/adm/quorvex/VPD and /var/adm/quorvex/Trace that the tools write into
-# but never create. quorvex-survey's libraries (CLI11, nlohmann-json) are
-# header-only, so the package gains no run-time dependency.
+# but never create; the scheduled survey's units, shipped disabled, their
+# options in /etc/default/quorvex-survey (a conffile) and the maintainer
+# scripts that go with units (packaging/, docs/schedule.md).
+# quorvex-survey's libraries (CLI11, nlohmann-json) are header-only, so the
+# package gains no run-time dependency.
 
 set(CPACK_PACKAGE_NAME "quorvex-pylon-vpd-survey")
 set(CPACK_PACKAGE_VERSION "${PROJECT_VERSION}")
@@ -21,7 +24,9 @@ reason for every partition that could not be surveyed, and leaves a status
 file and a trace log.
 quorvex-survey surveys several managed machines (or every one the console
 lists) in one run with the same results, several partitions at a time, with
-a time limit per remote action, a trace per machine and a JSON summary.")
+a time limit per remote action, a trace per machine and a JSON summary.
+quorvex-survey.timer, shipped disabled, runs it once a day with the options
+of /etc/default/quorvex-survey.")
 
 set(CPACK_PACKAGING_INSTALL_PREFIX "/usr")
 set(CPACK_STRIP_FILES ON)
@@ -38,6 +43,19 @@ if(QUORVEX_DPKG_SHLIBDEPS)
 else()
   set(CPACK_DEBIAN_PACKAGE_DEPENDS "libc6, libstdc++6, libgcc-s1")
 endif()
+
+# The maintainer scripts of the units (as Debian's dh_installsystemd writes
+# them for units not enabled by default: packaging/debian) and the conffile
+# list. Strict permissions: the scripts 0755, conffiles 0644. The scripts
+# call deb-systemd-helper, of the essential package init-system-helpers.
+set(CPACK_DEBIAN_PACKAGE_CONTROL_EXTRA
+  "${PROJECT_SOURCE_DIR}/packaging/debian/conffiles"
+  "${PROJECT_SOURCE_DIR}/packaging/debian/postinst"
+  "${PROJECT_SOURCE_DIR}/packaging/debian/prerm"
+  "${PROJECT_SOURCE_DIR}/packaging/debian/postrm")
+set(CPACK_DEBIAN_PACKAGE_CONTROL_STRICT_PERMISSION ON)
+# The node exporter reads the survey's metrics (docs/schedule.md).
+set(CPACK_DEBIAN_PACKAGE_SUGGESTS "prometheus-node-exporter")
 
 set(CPACK_GENERATOR "DEB")
 include(CPack)

@@ -27,6 +27,7 @@ std::vector<Script> const& _scripts() {
     static std::vector<Script> const scripts{
         {"tools/check-css", "Usage: tools/check-css FILE...\n"},
         {"tools/check-static", "Usage: tools/check-static [--page]\n"},
+        {"tools/check-units", "Usage: tools/check-units BUILD_DIR\n"},
         {"tools/coverage", "Usage: tools/coverage\n"},
         {"tools/demo", "Usage: tools/demo [SCENARIO [IDENTITY]]\n"},
         {"tools/ensure-deps", "Usage: tools/ensure-deps [PACKAGE ...]\n"},
@@ -133,7 +134,8 @@ constexpr char gc_FrontendLockHeldOnInstall[] =
     "esac\n";
 
 constexpr char gc_Packages[] = "cmake g++ make libgtest-dev util-linux time proot python3 "
-                               "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev";
+                               "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev "
+                               "systemd man-db";
 
 std::string _waitingLine(std::string const& lock, std::string const& seconds) {
     return "ensure-deps: another package manager holds apt's lock " + lock +
@@ -177,6 +179,30 @@ TEST(Scripts, UnknownOptionIsRefusedWithAMessageAndNothingElse) {
         EXPECT_NE(std::string::npos, run.stderrText.find("'--bogus'")) << run.stderrText;
         EXPECT_NE(std::string::npos, run.stderrText.find("--help")) << run.stderrText;
     }
+}
+
+TEST(Scripts, CheckUnitsRefusesAFolderThatIsNoConfiguredBuildBeforeInstallingAnything) {
+    QuorvexTest::TemporaryDirectory const empty;
+    CommandResult const run =
+        runCommand({QuorvexTest::sourceRoot() + "/tools/check-units", empty.path()});
+    EXPECT_EQ(2, run.exitStatus);
+    EXPECT_EQ("", run.stdoutText);
+    EXPECT_EQ("check-units: '" + empty.path() +
+                  "' is no configured build folder\n"
+                  "check-units: try 'tools/check-units --help'\n",
+              run.stderrText);
+}
+
+TEST(Scripts, CheckUnitsRefusesAMissingOrASecondBuildFolder) {
+    CommandResult const none = runCommand({QuorvexTest::sourceRoot() + "/tools/check-units"});
+    EXPECT_EQ(2, none.exitStatus);
+    EXPECT_EQ("check-units: no build folder given\ncheck-units: try 'tools/check-units --help'\n",
+              none.stderrText);
+    CommandResult const two =
+        runCommand({QuorvexTest::sourceRoot() + "/tools/check-units", "a", "b"});
+    EXPECT_EQ(2, two.exitStatus);
+    EXPECT_EQ("check-units: too many arguments\ncheck-units: try 'tools/check-units --help'\n",
+              two.stderrText);
 }
 
 TEST(Scripts, DemoHelpIsNotTakenForAScenarioFile) {
