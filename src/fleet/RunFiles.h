@@ -23,4 +23,13 @@ std::string tracePiecePath(std::string const& identity, std::size_t slot);
 // and the slot's next unit makes it anew.
 std::optional<std::string> takeTracePiece(std::string const& piece);
 
+// The folder of the machines' traces and their pieces.
+std::string traceFolder();
+// Removes the trace pieces in folder whose run has ended (no process has
+// the PID in the piece's name any more): a run killed by SIGKILL may leave
+// the piece of a unit that ended just before the kill. A run calls it once
+// it holds the result folder, before any console command runs; the pieces
+// of a live run are kept.
+void removeTracePiecesOfEndedRuns(std::string const& folder);
+
 } // namespace fleet
