@@ -82,6 +82,14 @@ void removeTracePiecesOfEndedRuns(std::string const& folder) {
 
 std::optional<std::string> takeTracePiece(std::string const& piece) {
     std::string text;
+    // A piece is a file a worker made: anything else under its name (a link
+    // to a device, say) is not read, as it could be any file or never end.
+    std::error_code missing;
+    if (std::filesystem::symlink_status(piece, missing).type() !=
+        std::filesystem::file_type::regular) {
+        std::remove(piece.c_str());
+        return std::nullopt;
+    }
     try {
         text = util::readWholeFile(piece);
     } catch (util::SystemError const&) {

@@ -19,8 +19,9 @@ std::string runLockPath();
 // name once the run has taken the piece.
 std::string tracePiecePath(std::string const& identity, std::size_t slot);
 
-// What a piece holds, nothing when it does not exist; the piece is removed,
-// and the slot's next unit makes it anew.
+// What a piece holds, nothing when it does not exist or is no regular file
+// (a link is not followed); the piece is removed, and the slot's next unit
+// makes it anew.
 std::optional<std::string> takeTracePiece(std::string const& piece);
 
 // The folder of the machines' traces and their pieces.

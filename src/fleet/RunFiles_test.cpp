@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -29,6 +30,16 @@ TEST(RunFiles, TakingAPieceThatDoesNotExistGivesNothing) {
     TemporaryDirectory const folder;
     EXPECT_EQ(takeTracePiece(folder.file("never written")), std::nullopt);
     EXPECT_FALSE(QuorvexTest::fileExists(folder.file("never written")));
+}
+
+TEST(RunFiles, APieceThatIsALinkIsRemovedUnread) {
+    TemporaryDirectory const folder;
+    std::string const piece = folder.file("piece");
+    QuorvexTest::writeFile(folder.file("elsewhere"), "not the unit's");
+    std::filesystem::create_symlink(folder.file("elsewhere"), piece);
+    EXPECT_EQ(takeTracePiece(piece), std::nullopt);
+    EXPECT_FALSE(std::filesystem::is_symlink(piece));
+    EXPECT_EQ(QuorvexTest::readFile(folder.file("elsewhere")), "not the unit's");
 }
 
 TEST(RunFiles, PiecesOfOneMachineDifferBySlotAndLieBesideItsTrace) {

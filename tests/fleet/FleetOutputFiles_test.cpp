@@ -19,6 +19,7 @@
 #include <unistd.h>
 
 #include <csignal>
+#include <filesystem>
 #include <thread>
 
 namespace {
@@ -124,7 +125,9 @@ TEST_F(FleetOutputFiles, MissingFoldersOfSummaryAndReportAreCreated) {
 }
 
 // Forty inactive partitions under a file size limit of 1,000 bytes: a status
-// file of over 2,000 bytes, a trace of a few lines, no document.
+// file of over 2,000 bytes, a listing whose trace lines go past the limit
+// too (the machine's trace is written with the first 1,000 bytes and named),
+// no document.
 TEST_F(FleetOutputFiles, StatusFileAndSummaryThatCannotBeWrittenAreNamedAndEndWith73) {
     SimulatedConsole const console(listing(gc_Identity, 40, false));
     std::string const summary = _work.file("summary.json");
@@ -133,10 +136,11 @@ TEST_F(FleetOutputFiles, StatusFileAndSummaryThatCannotBeWrittenAreNamedAndEndWi
     // No partition was contacted: the block is the overall code alone.
     EXPECT_EQ(_stderr(), std::string(gc_BlockEnd) + "8\nquorvex-survey: cannot write " +
                              gc_StatusFile + ": File too large\nquorvex-survey: cannot write " +
+                             gc_TraceFile + ": File too large\nquorvex-survey: cannot write " +
                              summary + ": File too large\n");
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_VPD_Folder), std::vector<std::string>{})
         << "a cut status file or its temporary file was left";
-    EXPECT_TRUE(QuorvexTest::fileExists(gc_TraceFile));
+    EXPECT_EQ(QuorvexTest::readFile(gc_TraceFile).size(), 1000U);
     EXPECT_EQ(QuorvexTest::listFolder(_work.path()),
               (std::vector<std::string>{"stderr", "stdout"}));
 }
@@ -157,6 +161,55 @@ TEST_F(FleetOutputFiles, DefaultDocumentThatCannotBeWrittenIsNamedAndEndsWith73)
                              summary + ": File too large\n");
     EXPECT_EQ(QuorvexTest::readFile(document).size(), 1200u)
         << "the survey code leaves its document cut short under its name, as the tool does";
+}
+
+// quorvex-survey started through a shell that first links the trace piece
+// of the given slot to /dev/full, where every write fails with ENOSPC as on
+// a full Trace folder: the piece's name carries the run's PID, which the
+// shell keeps when it becomes the run.
+SurveyProcess startWithFullTracePiece(std::vector<std::string> const& arguments, int slot,
+                                      std::string const& stdoutPath,
+                                      std::string const& stderrPath) {
+    std::vector<std::string> argv{
+        "/bin/sh", "-c",
+        "ln -s /dev/full \"$0.piece-$$-" + std::to_string(slot) + "\" && exec \"$@\"",
+        gc_TraceFile, FleetTest::consoleWideTool()};
+    argv.insert(argv.end(), arguments.begin(), arguments.end());
+    return SurveyProcess(argv, stdoutPath, stderrPath);
+}
+
+// The listing unit runs in slot 0: its lines are lost, the machine's trace
+// is written without them and named, and the blocks stay the tool's.
+TEST_F(FleetOutputFiles, ListingTracePieceThatCannotBeWrittenIsNamedAndEndsWith73) {
+    SimulatedConsole const console(listing(gc_Identity, 1, true) + surveyedActions());
+    std::string const summary = _work.file("summary.json");
+    SurveyProcess survey = startWithFullTracePiece({"--summary", summary, gc_Identity}, 0,
+                                                   _work.file("stdout"), _work.file("stderr"));
+    EXPECT_EQ(survey.waitForExit(gc_Bound), 73) << _stderr();
+    EXPECT_EQ(_stderr(), std::string("0\n") + gc_BlockEnd + "0\nquorvex-survey: cannot write " +
+                             gc_TraceFile + ": No space left on device\n");
+    EXPECT_EQ(FleetTest::SummaryFile(summary).field("/exit_status"), "73");
+    std::string const trace = QuorvexTest::readFile(gc_TraceFile);
+    EXPECT_EQ(trace.find("lspartition"), std::string::npos) << trace;
+    EXPECT_NE(trace.find("runCmdOnPartition"), std::string::npos) << trace;
+    EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_TraceFolder),
+              std::vector<std::string>{std::filesystem::path(gc_TraceFile).filename().string()})
+        << "the linked piece is removed";
+}
+
+// At -j 2 the two surveys run in slots 0 and 1: the second one's lines are
+// lost.
+TEST_F(FleetOutputFiles, SurveyTracePieceThatCannotBeWrittenIsNamedAndEndsWith73) {
+    SimulatedConsole const console(listing(gc_Identity, 2, true) + surveyedActions());
+    SurveyProcess survey = startWithFullTracePiece({"-j", "2", gc_Identity}, 1,
+                                                   _work.file("stdout"), _work.file("stderr"));
+    EXPECT_EQ(survey.waitForExit(gc_Bound), 73) << _stderr();
+    EXPECT_EQ(_stderr(), std::string("0\n0\n") + gc_BlockEnd + "0\nquorvex-survey: cannot write " +
+                             gc_TraceFile + ": No space left on device\n");
+    std::string const trace = QuorvexTest::readFile(gc_TraceFile);
+    EXPECT_NE(trace.find("lspartition"), std::string::npos) << trace;
+    EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_TraceFolder).size(), 1U)
+        << "the linked piece is removed";
 }
 
 // Reads the pipe until its writers are gone.
