@@ -16,6 +16,7 @@
 
 #include <fcntl.h>
 #include <sys/ioctl.h>
+#include <sys/syscall.h>
 #include <unistd.h>
 
 #include <csignal>
@@ -210,6 +211,34 @@ TEST_F(FleetOutputFiles, SurveyTracePieceThatCannotBeWrittenIsNamedAndEndsWith73
     EXPECT_NE(trace.find("lspartition"), std::string::npos) << trace;
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_TraceFolder).size(), 1U)
         << "the linked piece is removed";
+}
+
+// A disk whose flush fails (fsync and fdatasync fail with EIO in the run and
+// its workers, for root too): every file quorvex-survey writes under a
+// temporary name is named, its old version stays, and nothing else is left.
+TEST_F(FleetOutputFiles, FilesThatCannotBeFlushedToTheDiskAreNamedAndTheOldOnesStay) {
+    SimulatedConsole const console(listing(gc_Identity, 1, true) + surveyedActions());
+    std::string const summary = _work.file("summary.json");
+    QuorvexTest::writeFile(gc_StatusFile, "old status\n");
+    QuorvexTest::writeFile(gc_TraceFile, "old trace\n");
+    QuorvexTest::writeFile(summary, "{}\n");
+    SurveyProcess survey({FleetTest::consoleWideTool(), "--summary", summary, "--report",
+                          _work.file("report"), gc_Identity},
+                         _work.file("stdout"), _work.file("stderr"), {},
+                         {SYS_fsync, SYS_fdatasync});
+    EXPECT_EQ(survey.waitForExit(gc_Bound), 73) << _stderr();
+    EXPECT_EQ(_stderr(), std::string("0\n") + gc_BlockEnd + "0\nquorvex-survey: cannot write " +
+                             gc_StatusFile + ": Input/output error\nquorvex-survey: cannot write " +
+                             gc_TraceFile +
+                             ": Input/output error\nquorvex-survey: report: cannot write " +
+                             _work.file("report/summary.json") +
+                             ": Input/output error\nquorvex-survey: cannot write " + summary +
+                             ": Input/output error\n");
+    EXPECT_EQ(QuorvexTest::readFile(gc_StatusFile), "old status\n");
+    EXPECT_EQ(QuorvexTest::readFile(gc_TraceFile), "old trace\n");
+    EXPECT_EQ(QuorvexTest::readFile(summary), "{}\n");
+    EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_TraceFolder).size(), 1U);
+    EXPECT_FALSE(QuorvexTest::fileExists(_work.file("report/index.html")));
 }
 
 // Reads the pipe until its writers are gone.
