@@ -33,7 +33,8 @@ std::optional<pid_t> runOfPiece(std::string const& name) {
     std::size_t const separator = owner.find(gc_PieceSeparator);
     // PIDs have at most 7 digits (pid_max is at most 2^22).
     if (separator == std::string::npos || separator > gc_PidDigits ||
-        !util::isDigits(owner.substr(0, separator)) || !util::isDigits(owner.substr(separator + 1))) {
+        !util::isDigits(owner.substr(0, separator)) ||
+        !util::isDigits(owner.substr(separator + 1))) {
         return std::nullopt;
     }
     return static_cast<pid_t>(std::stol(owner.substr(0, separator)));

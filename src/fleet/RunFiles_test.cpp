@@ -66,8 +66,8 @@ TEST(RunFiles, PiecesOfEndedRunsAreRemovedAndThoseOfLiveRunsKept) {
     std::string const trace = "quorvexPYLON_VPD_Survey_ClientPartition_9119-MHE_21ABCDE.Trace";
     std::string const ended = trace + ".piece-" + std::to_string(pidOfEndedProcess()) + "-0";
     std::string const live = trace + ".piece-" + std::to_string(::getpid()) + "-3";
-    for (std::string const& name : {ended, live, trace, trace + ".piece-x-0",
-                                    trace + ".piece-1-", trace + ".piece-123456789012-0"}) {
+    for (std::string const& name : {ended, live, trace, trace + ".piece-x-0", trace + ".piece-1-",
+                                    trace + ".piece-123456789012-0"}) {
         QuorvexTest::writeFile(folder.file(name), "lines");
     }
     fleet::removeTracePiecesOfEndedRuns(folder.path());

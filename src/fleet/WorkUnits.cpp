@@ -181,10 +181,11 @@ std::string surveyPartition(Quorvex::System::Partition const& partition,
         traceError = closedPieceError(notOpened);
     }
     closeTrace();
-    return withTraceError(traceError, encodeFields({outcome.fileName, outcome.returnCode, outcome.statusText,
-                         std::to_string(static_cast<int>(outcome.kind)), optionalText(outcome.rc),
-                         optionalText(outcome.rcCmd), outcome.reason,
-                         std::to_string(outcome.documentError)}));
+    return withTraceError(traceError,
+                          encodeFields({outcome.fileName, outcome.returnCode, outcome.statusText,
+                                        std::to_string(static_cast<int>(outcome.kind)),
+                                        optionalText(outcome.rc), optionalText(outcome.rcCmd),
+                                        outcome.reason, std::to_string(outcome.documentError)}));
 }
 
 int decodeTraceError(std::string const& text) {

@@ -71,8 +71,8 @@ TEST(WorkUnits, OutcomeOfAChildThatDiedIsRejected) {
     EXPECT_FALSE(fleet::decodeOutcome(result(encodeFields({"a", "b"}))).has_value());
     EXPECT_FALSE(fleet::decodeOutcome(result(encodeFields({"", "8", "x", "9", "", "", "", "0"})))
                      .has_value());
-    EXPECT_FALSE(fleet::decodeOutcome(encodeFields({"", "8", "x", "1", "", "", "", "0"}))
-                     .has_value())
+    EXPECT_FALSE(
+        fleet::decodeOutcome(encodeFields({"", "8", "x", "1", "", "", "", "0"})).has_value())
         << "no trace record";
 }
 

@@ -33,10 +33,11 @@ namespace {
 
 using FleetFaultTest::FaultTimings;
 using FleetFaultTest::MarkedSurvey;
+using FleetTest::gc_Answer;
+using FleetTest::gc_Identity;
+using FleetTest::listing;
 using QuorvexTest::SimulatedConsole;
 
-constexpr char gc_Identity[] = "1234-ABC_10ABCDE";
-constexpr char gc_Answer[] = "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n";
 constexpr char gc_Hang[] = "child-delay 3600\ndelay 3600\n";
 // A machine the console lists no partition of.
 constexpr char gc_Unlisted[] = "9999-XYZ_99ZZZZZ";
@@ -46,15 +47,6 @@ constexpr double gc_HungRun = 20.0;
 constexpr double gc_NothingLeftWithin = 1.0;
 // Slack on a time limit for a loaded machine.
 constexpr double gc_Margin = 3.0;
-
-std::string listing(int partitions) {
-    std::string line = std::string("[lspartition ") + gc_Identity + "]\nstdout ";
-    for (int id = 1; id <= partitions; ++id) {
-        line += std::to_string(id) + ",10.1.1.1" + std::to_string(id) + ",3,host" +
-                std::to_string(id) + ",Zeph,7.2;";
-    }
-    return line + "\n";
-}
 
 std::string fetchAnswer(double delaySeconds = 0.0) {
     return "[getFileFromPartition *]\ndelay " + std::to_string(delaySeconds) + "\n" + gc_Answer +

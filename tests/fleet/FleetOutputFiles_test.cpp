@@ -25,16 +25,16 @@
 
 namespace {
 
+using FleetTest::gc_Answer;
+using FleetTest::gc_Identity;
 using FleetTest::SurveyProcess;
 using QuorvexTest::SimulatedConsole;
 
-constexpr char gc_Identity[] = "1234-ABC_10ABCDE";
 constexpr char gc_Second[] = "5678-DEF_20FGHIJ";
 constexpr char gc_StatusFile[] =
     "/var/adm/quorvex/VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE.status";
 constexpr char gc_TraceFile[] =
     "/var/adm/quorvex/Trace/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE.Trace";
-constexpr char gc_Answer[] = "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n";
 // Far above any bound a test waits for.
 constexpr char gc_Hang[] = "child-delay 3600\ndelay 3600\n";
 // A run that never ends within it was waiting for a hung console command.
@@ -171,10 +171,10 @@ TEST_F(FleetOutputFiles, DefaultDocumentThatCannotBeWrittenIsNamedAndEndsWith73)
 SurveyProcess startWithFullTracePiece(std::vector<std::string> const& arguments, int slot,
                                       std::string const& stdoutPath,
                                       std::string const& stderrPath) {
-    std::vector<std::string> argv{
-        "/bin/sh", "-c",
-        "ln -s /dev/full \"$0.piece-$$-" + std::to_string(slot) + "\" && exec \"$@\"",
-        gc_TraceFile, FleetTest::consoleWideTool()};
+    std::vector<std::string> argv{"/bin/sh", "-c",
+                                  "ln -s /dev/full \"$0.piece-$$-" + std::to_string(slot) +
+                                      "\" && exec \"$@\"",
+                                  gc_TraceFile, FleetTest::consoleWideTool()};
     argv.insert(argv.end(), arguments.begin(), arguments.end());
     return SurveyProcess(argv, stdoutPath, stderrPath);
 }
