@@ -52,10 +52,6 @@ void MachineOutput::writeRest() {
     }
 }
 
-std::size_t MachineOutput::writtenCount() const {
-    return _written;
-}
-
 bool MachineOutput::isAllWritten() const {
     return _written == _machines.size();
 }

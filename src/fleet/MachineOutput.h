@@ -32,7 +32,6 @@ public:
     void writeReady(Scheduler const& scheduler);
     // Writes out every machine left, done or not: the run is over.
     void writeRest();
-    std::size_t writtenCount() const;
     bool isAllWritten() const;
     // Every file of the machines written so far that could not be written
     // (status file, trace or a piece of it, default document), as "cannot
