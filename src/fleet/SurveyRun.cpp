@@ -283,6 +283,9 @@ ProgressFigures SurveyRun::_progressFigures() const {
     RunningSurveys surveys;
     surveys.timeoutSeconds = _options.timeoutSeconds;
     for (auto const& running : _inFlight) {
+        if (running && !running->unit.partition) {
+            ++figures.listingsRunning;
+        }
         if (!running || !running->unit.partition) {
             continue;
         }
