@@ -19,6 +19,18 @@ using report::gc_ProgramName;
 
 namespace {
 
+// The exit statuses, as quorvex-survey(8) gives them in full.
+constexpr char gc_ExitStatusHelp[] =
+    "Exit status:\n"
+    "  0, 4, 8                 every listed partition surveyed, some, none\n"
+    "  64                      bad command line (nothing run)\n"
+    "  69                      the console's machine listing (--all) failed\n"
+    "  73                      an output cannot be written\n"
+    "  74                      the run's history could not be recorded\n"
+    "  75                      another run uses the result folder\n"
+    "  128+N                   ended by signal N: 129 SIGHUP, 130 SIGINT, 141 SIGPIPE,\n"
+    "                          143 SIGTERM";
+
 // An option that takes a whole number within limits.
 struct WholeNumber {
     char const* names;
@@ -315,6 +327,8 @@ ParsedCommandLine parseCommandLine(int argc, char const* const* argv) {
     addSurveyOptions(app, parsed.options);
     parsed.reportRequest.emplace();
     CLI::App const* const reportCommand = report::addReportSubcommand(app, *parsed.reportRequest);
+    // Set after the subcommand is added, which would inherit it.
+    app.footer(gc_ExitStatusHelp);
     try {
         readCommandLine(app, *reportCommand, parsed, argc, argv);
     } catch (CLI::CallForHelp const&) {

@@ -254,7 +254,18 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
               "\n"
               "Subcommands:\n"
               "  report                  write into DIR the report of the files earlier runs "
-              "left\n");
+              "left\n"
+              "\n"
+              "Exit status:\n"
+              "  0, 4, 8                 every listed partition surveyed, some, none\n"
+              "  64                      bad command line (nothing run)\n"
+              "  69                      the console's machine listing (--all) failed\n"
+              "  73                      an output cannot be written\n"
+              "  74                      the run's history could not be recorded\n"
+              "  75                      another run uses the result folder\n"
+              "  128+N                   ended by signal N: 129 SIGHUP, 130 SIGINT, 141 "
+              "SIGPIPE,\n"
+              "                          143 SIGTERM\n");
     EXPECT_EQ(run.err, "");
 }
 
