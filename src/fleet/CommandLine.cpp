@@ -182,13 +182,35 @@ void refuseLeftOver(CLI::App const& app) {
     }
 }
 
+// Whether word comes after "--" on the command line, which makes it an
+// identity whatever it looks like.
+bool isAfterDoubleDash(std::string const& word, int argc, char const* const* argv) {
+    char const* const* const end = argv + argc;
+    char const* const* const dashes = std::find(argv + 1, end, std::string("--"));
+    return std::find(dashes, end, word) != end;
+}
+
+// A word taken as an identity that looks like an option: one after "--" is
+// no option to guess a spelling for (not even "--all"); any other (a
+// negative number, which the parser places as an argument) is refused as the
+// option it looks like.
+std::string optionLikeIdentity(CLI::App const& app, std::string const& word, int argc,
+                               char const* const* argv) {
+    if (isAfterDoubleDash(word, argc, argv)) {
+        return "an identity must not start with '-': '" + word +
+               "' (after '--' every argument is an identity)";
+    }
+    return unknownOption(app, word);
+}
+
 // What the parser does not check: a survey needs machines, either --all or
-// identities, and an identity is neither empty nor an option.
-void checkMachines(CLI::App const& app, Options const& options) {
+// identities, and an identity is neither empty nor like an option.
+void checkMachines(CLI::App const& app, Options const& options, int argc,
+                   char const* const* argv) {
     std::vector<std::string> const& identities = options.identities;
     auto const option = std::find_if(identities.begin(), identities.end(), isOptionLike);
     if (option != identities.end()) {
-        throw CLI::ValidationError(unknownOption(app, *option));
+        throw CLI::ValidationError(optionLikeIdentity(app, *option, argc, argv));
     }
     if (std::find(identities.begin(), identities.end(), "") != identities.end()) {
         throw CLI::ValidationError("an identity must not be empty");
@@ -306,7 +328,7 @@ void readCommandLine(CLI::App& app, CLI::App const& reportCommand, ParsedCommand
     }
     parsed.reportRequest.reset();
     refuseEmptyOutputNames(app, parsed.options, argc, argv);
-    checkMachines(app, parsed.options);
+    checkMachines(app, parsed.options, argc, argv);
     keepFirstOfEach(parsed);
 }
 

@@ -134,7 +134,16 @@ TEST(CommandLine, OptionFarFromEveryKnownOneIsNamedAlone) {
 
 TEST(CommandLine, WordStartingWithDashIsNeverAnIdentity) {
     expectRefused({"-5"}, "unknown option -5");
-    expectRefused({"A_1", "--", "-B_2"}, "unknown option -B_2");
+    expectRefused({"A_1", "--", "-B_2"},
+                  "an identity must not start with '-': '-B_2' (after '--' every argument is an "
+                  "identity)");
+}
+
+// After "--" even a known option's name is an identity: no spelling of it
+// is suggested.
+TEST(CommandLine, KnownOptionAfterDoubleDashIsRefusedAsAnIdentityWithoutASuggestion) {
+    expectRefused({"--", "--all"}, "an identity must not start with '-': '--all' (after '--' "
+                                   "every argument is an identity)");
 }
 
 TEST(CommandLine, JobsOutsideOneTo1024SayWhatJobsTakes) {
