@@ -205,8 +205,7 @@ std::string optionLikeIdentity(CLI::App const& app, std::string const& word, int
 
 // What the parser does not check: a survey needs machines, either --all or
 // identities, and an identity is neither empty nor like an option.
-void checkMachines(CLI::App const& app, Options const& options, int argc,
-                   char const* const* argv) {
+void checkMachines(CLI::App const& app, Options const& options, int argc, char const* const* argv) {
     std::vector<std::string> const& identities = options.identities;
     auto const option = std::find_if(identities.begin(), identities.end(), isOptionLike);
     if (option != identities.end()) {
