@@ -24,7 +24,7 @@ constexpr std::array<Field, 4> gc_DroppedFirst{Elapsed, Machines, Partitions, Le
 // What runs now: the partitions surveyed, and the machines listed, which
 // take the place of "0 running" while only listings run.
 std::string activity(ProgressFigures const& figures) {
-    std::string const surveys = std::to_string(figures.running) + " running";
+    std::string surveys = std::to_string(figures.running) + " running";
     if (figures.listingsRunning == 0) {
         return surveys;
     }

@@ -137,7 +137,6 @@ std::string listPartitions(std::string const& identity, std::string const& trace
         }
         traceError = closedPieceError(notOpened);
     }
-    closeTrace();
     return withTraceError(traceError, encoded);
 }
 
@@ -180,7 +179,6 @@ std::string surveyPartition(Quorvex::System::Partition const& partition,
             partition, &ChildProcess::stopNote);
         traceError = closedPieceError(notOpened);
     }
-    closeTrace();
     return withTraceError(traceError,
                           encodeFields({outcome.fileName, outcome.returnCode, outcome.statusText,
                                         std::to_string(static_cast<int>(outcome.kind)),

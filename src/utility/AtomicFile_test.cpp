@@ -211,7 +211,7 @@ TEST(AtomicFileFolderFlush, MissingFolderThrowsWriteWithTheFolderAndEnoent) {
 
 TEST(AtomicFileFolderFlush, FailedFlushToTheDiskThrowsWithTheFolderAndItsErrno) {
     QuorvexTest::TemporaryDirectory folder;
-    std::string const path = folder.path();
+    std::string const& path = folder.path();
     auto const result = QuorvexTest::runInChild([&path] {
         if (!QuorvexTest::failSystemCalls({SYS_fsync}, EIO).empty()) {
             return 1;

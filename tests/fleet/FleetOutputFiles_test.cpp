@@ -172,8 +172,8 @@ SurveyProcess startWithFullTracePiece(std::vector<std::string> const& arguments,
                                       std::string const& stdoutPath,
                                       std::string const& stderrPath) {
     std::vector<std::string> argv{"/bin/sh", "-c",
-                                  "ln -s /dev/full \"$0.piece-$$-" + std::to_string(slot) +
-                                      "\" && exec \"$@\"",
+                                  R"(ln -s /dev/full "$0.piece-$$-)" + std::to_string(slot) +
+                                      R"(" && exec "$@")",
                                   gc_TraceFile, FleetTest::consoleWideTool()};
     argv.insert(argv.end(), arguments.begin(), arguments.end());
     return SurveyProcess(argv, stdoutPath, stderrPath);
