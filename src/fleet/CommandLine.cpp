@@ -19,6 +19,18 @@ using report::gc_ProgramName;
 
 namespace {
 
+// The exit statuses, as quorvex-survey(8) gives them in full.
+constexpr char gc_ExitStatusHelp[] =
+    "Exit status:\n"
+    "  0, 4, 8                 every listed partition surveyed, some, none\n"
+    "  64                      bad command line (nothing run)\n"
+    "  69                      the console's machine listing (--all) failed\n"
+    "  73                      an output cannot be written\n"
+    "  74                      the run's history could not be recorded\n"
+    "  75                      another run uses the result folder\n"
+    "  128+N                   ended by signal N: 129 SIGHUP, 130 SIGINT, 141 SIGPIPE,\n"
+    "                          143 SIGTERM";
+
 // An option that takes a whole number within limits.
 struct WholeNumber {
     char const* names;
@@ -170,13 +182,34 @@ void refuseLeftOver(CLI::App const& app) {
     }
 }
 
+// Whether word comes after "--" on the command line, which makes it an
+// identity whatever it looks like.
+bool isAfterDoubleDash(std::string const& word, int argc, char const* const* argv) {
+    char const* const* const end = argv + argc;
+    char const* const* const dashes = std::find(argv + 1, end, std::string("--"));
+    return std::find(dashes, end, word) != end;
+}
+
+// A word taken as an identity that looks like an option: one after "--" is
+// no option to guess a spelling for (not even "--all"); any other (a
+// negative number, which the parser places as an argument) is refused as the
+// option it looks like.
+std::string optionLikeIdentity(CLI::App const& app, std::string const& word, int argc,
+                               char const* const* argv) {
+    if (isAfterDoubleDash(word, argc, argv)) {
+        return "an identity must not start with '-': '" + word +
+               "' (after '--' every argument is an identity)";
+    }
+    return unknownOption(app, word);
+}
+
 // What the parser does not check: a survey needs machines, either --all or
-// identities, and an identity is neither empty nor an option.
-void checkMachines(CLI::App const& app, Options const& options) {
+// identities, and an identity is neither empty nor like an option.
+void checkMachines(CLI::App const& app, Options const& options, int argc, char const* const* argv) {
     std::vector<std::string> const& identities = options.identities;
     auto const option = std::find_if(identities.begin(), identities.end(), isOptionLike);
     if (option != identities.end()) {
-        throw CLI::ValidationError(unknownOption(app, *option));
+        throw CLI::ValidationError(optionLikeIdentity(app, *option, argc, argv));
     }
     if (std::find(identities.begin(), identities.end(), "") != identities.end()) {
         throw CLI::ValidationError("an identity must not be empty");
@@ -294,7 +327,7 @@ void readCommandLine(CLI::App& app, CLI::App const& reportCommand, ParsedCommand
     }
     parsed.reportRequest.reset();
     refuseEmptyOutputNames(app, parsed.options, argc, argv);
-    checkMachines(app, parsed.options);
+    checkMachines(app, parsed.options, argc, argv);
     keepFirstOfEach(parsed);
 }
 
@@ -315,6 +348,8 @@ ParsedCommandLine parseCommandLine(int argc, char const* const* argv) {
     addSurveyOptions(app, parsed.options);
     parsed.reportRequest.emplace();
     CLI::App const* const reportCommand = report::addReportSubcommand(app, *parsed.reportRequest);
+    // Set after the subcommand is added, which would inherit it.
+    app.footer(gc_ExitStatusHelp);
     try {
         readCommandLine(app, *reportCommand, parsed, argc, argv);
     } catch (CLI::CallForHelp const&) {

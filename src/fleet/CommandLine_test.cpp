@@ -134,7 +134,16 @@ TEST(CommandLine, OptionFarFromEveryKnownOneIsNamedAlone) {
 
 TEST(CommandLine, WordStartingWithDashIsNeverAnIdentity) {
     expectRefused({"-5"}, "unknown option -5");
-    expectRefused({"A_1", "--", "-B_2"}, "unknown option -B_2");
+    expectRefused({"A_1", "--", "-B_2"},
+                  "an identity must not start with '-': '-B_2' (after '--' every argument is an "
+                  "identity)");
+}
+
+// After "--" even a known option's name is an identity: no spelling of it
+// is suggested.
+TEST(CommandLine, KnownOptionAfterDoubleDashIsRefusedAsAnIdentityWithoutASuggestion) {
+    expectRefused({"--", "--all"}, "an identity must not start with '-': '--all' (after '--' "
+                                   "every argument is an identity)");
 }
 
 TEST(CommandLine, JobsOutsideOneTo1024SayWhatJobsTakes) {
@@ -254,7 +263,18 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
               "\n"
               "Subcommands:\n"
               "  report                  write into DIR the report of the files earlier runs "
-              "left\n");
+              "left\n"
+              "\n"
+              "Exit status:\n"
+              "  0, 4, 8                 every listed partition surveyed, some, none\n"
+              "  64                      bad command line (nothing run)\n"
+              "  69                      the console's machine listing (--all) failed\n"
+              "  73                      an output cannot be written\n"
+              "  74                      the run's history could not be recorded\n"
+              "  75                      another run uses the result folder\n"
+              "  128+N                   ended by signal N: 129 SIGHUP, 130 SIGINT, 141 "
+              "SIGPIPE,\n"
+              "                          143 SIGTERM\n");
     EXPECT_EQ(run.err, "");
 }
 

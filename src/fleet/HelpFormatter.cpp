@@ -34,11 +34,14 @@ HelpFormatter::HelpFormatter(std::vector<std::string> usageForms)
     column_width(26);
 }
 
-// The usage first, where a person looks, then what the command does.
+// The usage first, where a person looks, then what the command does; its
+// footer (the exit statuses) last.
 std::string HelpFormatter::make_help(CLI::App const* app, std::string name,
                                      CLI::AppFormatMode mode) const {
+    std::string const footer = make_footer(app);
     return make_usage(app, name) + "\n" + app->get_description() + "\n" + make_positionals(app) +
-           make_groups(app, mode) + make_subcommands(app, mode);
+           make_groups(app, mode) + make_subcommands(app, mode) +
+           (footer.empty() ? "" : "\n" + footer);
 }
 
 std::string HelpFormatter::make_usage(CLI::App const* app, std::string name) const {

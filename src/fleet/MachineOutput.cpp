@@ -52,10 +52,6 @@ void MachineOutput::writeRest() {
     }
 }
 
-std::size_t MachineOutput::writtenCount() const {
-    return _written;
-}
-
 bool MachineOutput::isAllWritten() const {
     return _written == _machines.size();
 }
@@ -77,10 +73,26 @@ void MachineOutput::_write(std::size_t index) {
     // The block ends with the code digit and no line end.
     _line.leaveOpenRow(std::string(get_OverallCode(machineReturnCodes(machine))).size());
     _writeFile(statusFilePath(machine.identity), machineStatusText(machine));
-    if (auto const trace = machineTraceText(machine)) {
-        _writeFile(traceFilePath(machine.identity), *trace);
+    std::optional<std::string> const trace = machineTraceText(machine);
+    if (!trace || _writeFile(traceFilePath(machine.identity), *trace)) {
+        _noteTracePieceFailure(machine);
     }
     _noteDocumentFailures(machine);
+}
+
+// A unit whose lines did not all reach its trace piece (a full Trace folder)
+// leaves the machine's trace short of them: the trace is named, once, with
+// the first such unit's reason, unless its own write failed and was named.
+void MachineOutput::_noteTracePieceFailure(MachineRecord const& machine) {
+    int error = machine.listingTraceError;
+    for (auto record = machine.partitions.begin(); error == 0 && record != machine.partitions.end();
+         ++record) {
+        error = record->traceError;
+    }
+    if (error != 0) {
+        _writeFailures.emplace_back(
+            util::SystemError("write", traceFilePath(machine.identity), error).what());
+    }
 }
 
 // A standard output that cannot be written (a full disk, say) stops the run
@@ -116,11 +128,13 @@ void MachineOutput::_noteDocumentFailures(MachineRecord const& machine) {
 
 // A failure is kept for the end of the run, after every machine's block, so
 // that the blocks stay byte for byte what the single-machine tool prints.
-void MachineOutput::_writeFile(std::string const& path, std::string const& text) {
+bool MachineOutput::_writeFile(std::string const& path, std::string const& text) {
     try {
         util::writeFileAtomically(path, text);
+        return true;
     } catch (util::SystemError const& failure) {
         _writeFailures.emplace_back(failure.what());
+        return false;
     }
 }
 

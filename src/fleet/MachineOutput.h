@@ -32,19 +32,21 @@ public:
     void writeReady(Scheduler const& scheduler);
     // Writes out every machine left, done or not: the run is over.
     void writeRest();
-    std::size_t writtenCount() const;
     bool isAllWritten() const;
     // Every file of the machines written so far that could not be written
-    // (status file, trace, default document), as "cannot write PATH: reason",
+    // (status file, trace or a piece of it, default document), as "cannot
+    // write PATH: reason",
     // in the order met.
     std::vector<std::string> const& writeFailures() const;
 
 private:
     void _write(std::size_t index);
     void _noteDocumentFailures(MachineRecord const& machine);
+    void _noteTracePieceFailure(MachineRecord const& machine);
     void _noteUnwritableOutput();
     void _removeTracePieces(std::string const& identity) const;
-    void _writeFile(std::string const& path, std::string const& text);
+    // False when it could not, the failure noted.
+    bool _writeFile(std::string const& path, std::string const& text);
 
     std::vector<MachineRecord> const& _machines;
     ProgressLine& _line;

@@ -21,13 +21,24 @@ enum Field : std::size_t { Partitions, Machines, Elapsed, Left, Longest, FieldCo
 // The order fields are given up in when the line does not fit.
 constexpr std::array<Field, 4> gc_DroppedFirst{Elapsed, Machines, Partitions, Left};
 
+// What runs now: the partitions surveyed, and the machines listed, which
+// take the place of "0 running" while only listings run.
+std::string activity(ProgressFigures const& figures) {
+    std::string surveys = std::to_string(figures.running) + " running";
+    if (figures.listingsRunning == 0) {
+        return surveys;
+    }
+    std::string const listings = "listing " + std::to_string(figures.listingsRunning) +
+                                 (figures.listingsRunning == 1 ? " machine" : " machines");
+    return figures.running == 0 ? listings : surveys + ", " + listings;
+}
+
 std::string partitionsField(ProgressFigures const& figures) {
     // While a machine is still being listed, more partitions may come.
     std::string const total =
         std::to_string(figures.partitions) + (figures.listingsPending > 0 ? "+" : "");
     return std::to_string(figures.endedWithoutFailure + figures.failed) + "/" + total +
-           " partitions done, " + std::to_string(figures.failed) + " failed, " +
-           std::to_string(figures.running) + " running";
+           " partitions done, " + std::to_string(figures.failed) + " failed, " + activity(figures);
 }
 
 // "40 s", "7 min" or "2 h 5 min": a time left is read at a glance, and

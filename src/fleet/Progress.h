@@ -27,6 +27,8 @@ struct ProgressFigures {
     std::size_t endedWithoutFailure = 0;
     std::size_t failed = 0;
     std::size_t running = 0;
+    // Machines whose partitions are being listed now.
+    std::size_t listingsRunning = 0;
     // Partitions listed so far.
     std::size_t partitions = 0;
     double elapsedSeconds = 0;
@@ -48,7 +50,8 @@ struct RunningSurveys {
 
 // The line's fields, each a whole, joined by two blanks in this order: "8/9
 // partitions done, 1 failed, 1 running" ("8/9+" while machines are still
-// being listed), "1/2 machines done", "00:00:36 elapsed", "~00:04:20 left"
+// to be listed; "..., listing 2 machines" after the partitions running, or
+// in their place when none runs, while listings run), "1/2 machines done", "00:00:36 elapsed", "~00:04:20 left"
 // (or "time left unknown"), "longest host7 36 s". Where they do
 // not all fit in columns (0: any width), fields go in a fixed order, the
 // least telling first: elapsed time, machines, partitions, time left; the

@@ -77,6 +77,30 @@ TEST(Progress, WithoutEstimateOrRunningPartitionTheirPlacesSaySo) {
               "time left unknown");
 }
 
+TEST(Progress, ListingsRunningAloneTakeThePlaceOfTheRunningPartitions) {
+    ProgressFigures figures;
+    figures.machines = 3;
+    figures.listingsPending = 3;
+    figures.listingsRunning = 2;
+    EXPECT_EQ(fleet::formatProgress(figures),
+              "0/0+ partitions done, 0 failed, listing 2 machines  0/3 machines done  "
+              "00:00:00 elapsed  time left unknown");
+    figures.listingsRunning = 1;
+    EXPECT_EQ(fleet::formatProgress(figures),
+              "0/0+ partitions done, 0 failed, listing 1 machine  0/3 machines done  "
+              "00:00:00 elapsed  time left unknown");
+}
+
+TEST(Progress, ListingsRunningBesideSurveysFollowThem) {
+    ProgressFigures figures = exampleFiguresWithHost();
+    figures.listingsPending = 1;
+    figures.listingsRunning = 1;
+    figures.left.reset();
+    EXPECT_EQ(fleet::formatProgress(figures),
+              "14/40+ partitions done, 2 failed, 4 running, listing 1 machine  1/3 machines done  "
+              "00:01:12 elapsed  time left unknown  longest host7 45 s");
+}
+
 TEST(Progress, TimeLimitEstimateSaysUpTo) {
     ProgressFigures figures = exampleFiguresWithHost();
     figures.left = fleet::TimeLeft{3580, true};

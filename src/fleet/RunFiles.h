@@ -19,8 +19,18 @@ std::string runLockPath();
 // name once the run has taken the piece.
 std::string tracePiecePath(std::string const& identity, std::size_t slot);
 
-// What a piece holds, nothing when it does not exist; the piece is removed,
-// and the slot's next unit makes it anew.
+// What a piece holds, nothing when it does not exist or is no regular file
+// (a link is not followed); the piece is removed, and the slot's next unit
+// makes it anew.
 std::optional<std::string> takeTracePiece(std::string const& piece);
+
+// The folder of the machines' traces and their pieces.
+std::string traceFolder();
+// Removes the trace pieces in folder whose run has ended (no process has
+// the PID in the piece's name any more): a run killed by SIGKILL may leave
+// the piece of a unit that ended just before the kill. A run calls it once
+// it holds the result folder, before any console command runs; the pieces
+// of a live run are kept.
+void removeTracePiecesOfEndedRuns(std::string const& folder);
 
 } // namespace fleet

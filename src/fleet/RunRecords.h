@@ -32,6 +32,9 @@ struct PartitionRecord {
     // The partition's block of the machine's trace, taken as soon as its
     // unit ends; none when the unit wrote nothing.
     std::optional<std::string> trace;
+    // errno of the failure that kept some of those lines from the unit's
+    // trace piece (a full Trace folder), 0 when none did.
+    int traceError = 0;
 };
 
 // How a partition's worker ended when it died before telling how the survey
@@ -62,6 +65,9 @@ struct MachineRecord {
     bool listed = false;
     // The lines the listing unit wrote to the trace.
     std::optional<std::string> listingTrace;
+    // errno of the failure that kept some of them from the listing's trace
+    // piece, 0 when none did.
+    int listingTraceError = 0;
     // Set when the console's partition listing failed (an identity it does
     // not know, say), read from listingTrace, or when the time limit stopped
     // it. The machine then has no partitions, its status file reads as the

@@ -194,6 +194,7 @@ void SurveyRun::_finishListing(InFlight const& running, std::string const& resul
     }
     MachineRecord& machine = _machines[running.unit.machine];
     machine.listingTrace = std::move(trace);
+    machine.listingTraceError = decodeTraceError(result);
     machine.listingFailure = _listingFailure(running, machine.listingTrace);
     auto const partitions = decodePartitions(machine.identity, result);
     std::vector<std::string> ids;
@@ -221,6 +222,7 @@ void SurveyRun::_finishSurvey(InFlight const& running, WorkerEvent const& ended)
     PartitionRecord& record = _record(running.unit);
     record.seconds = secondsSince(running.started);
     record.trace = takeTracePiece(_output.tracePiece(running.unit.machine, running.slot));
+    record.traceError = decodeTraceError(ended.text);
     if (std::optional<Quorvex::PYLON::VPD::PartitionOutcome> result = decodeOutcome(ended.text)) {
         settlePartition(record, std::move(*result));
     } else {
@@ -281,6 +283,9 @@ ProgressFigures SurveyRun::_progressFigures() const {
     RunningSurveys surveys;
     surveys.timeoutSeconds = _options.timeoutSeconds;
     for (auto const& running : _inFlight) {
+        if (running && !running->unit.partition) {
+            ++figures.listingsRunning;
+        }
         if (!running || !running->unit.partition) {
             continue;
         }

@@ -11,6 +11,7 @@
 #include "utility/Trace.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <ostream>
 
 namespace fleet {
@@ -43,6 +44,44 @@ std::optional<int> optionalNumber(std::string const& text) {
 
 void closeTrace() {
     Utility::Trace::ms_FileHandle.close();
+}
+
+// Why the trace piece did not open, right after the trace object tried: 0
+// when it did.
+int openError() {
+    return Utility::Trace::ms_FileHandle.is_open() ? 0 : (errno != 0 ? errno : EIO);
+}
+
+// Why some of the unit's lines did not reach its piece, 0 when every one
+// did: closing the piece writes out the lines still held, and fails when a
+// write fails (a full Trace folder), as it does once any write has failed
+// for good. Closed here, before the trace object goes, which would close
+// it without a word.
+int closedPieceError(int openError) {
+    if (openError != 0) {
+        return openError;
+    }
+    errno = 0;
+    if (Utility::Trace::ms_FileHandle.close() != nullptr) {
+        return 0;
+    }
+    return errno != 0 ? errno : EIO;
+}
+
+// A unit's result: a record of its trace piece's error first, then its own.
+std::string withTraceError(int traceError, std::string const& records) {
+    return encodeFields({std::to_string(traceError)}) + records;
+}
+
+// The unit's own records, after the trace piece's error; nullopt when the
+// text is cut short.
+std::optional<std::vector<FieldRecord>> unitRecords(std::string const& text) {
+    auto records = decodeFields(text);
+    if (!records || records->empty() || records->front().size() != 1) {
+        return std::nullopt;
+    }
+    records->erase(records->begin());
+    return records;
 }
 
 } // namespace
@@ -79,9 +118,12 @@ std::vector<std::string> decodeMachines(std::string const& text) {
 
 std::string listPartitions(std::string const& identity, std::string const& tracePiece) {
     std::string encoded;
+    int traceError = 0;
     removeWhenParentGone(tracePiece);
     {
+        errno = 0;
         Utility::Trace trace(tracePiece);
+        int const notOpened = openError();
         keepDescriptorsFromActions();
         trace << gc_MainLine << std::endl;
         Quorvex::System::MTMS const mtms(identity);
@@ -93,14 +135,14 @@ std::string listPartitions(std::string const& identity, std::string const& trace
                                      partition.get_OperatingSystem_Name(),
                                      partition.get_OperatingSystem_Version()});
         }
+        traceError = closedPieceError(notOpened);
     }
-    closeTrace();
-    return encoded;
+    return withTraceError(traceError, encoded);
 }
 
 std::optional<std::vector<Quorvex::System::Partition>> decodePartitions(std::string const& identity,
                                                                         std::string const& text) {
-    auto const records = decodeFields(text);
+    auto const records = unitRecords(text);
     if (!records) {
         return std::nullopt;
     }
@@ -126,22 +168,34 @@ std::optional<std::vector<Quorvex::System::Partition>> decodePartitions(std::str
 std::string surveyPartition(Quorvex::System::Partition const& partition,
                             std::string const& tracePiece) {
     PartitionOutcome outcome;
+    int traceError = 0;
     removeWhenParentGone(tracePiece);
     {
+        errno = 0;
         Utility::Trace trace(tracePiece);
+        int const notOpened = openError();
         keepDescriptorsFromActions();
         outcome = Quorvex::PYLON::VPD::Survey_ClientPartition::survey_Partition(
             partition, &ChildProcess::stopNote);
+        traceError = closedPieceError(notOpened);
     }
-    closeTrace();
-    return encodeFields({outcome.fileName, outcome.returnCode, outcome.statusText,
-                         std::to_string(static_cast<int>(outcome.kind)), optionalText(outcome.rc),
-                         optionalText(outcome.rcCmd), outcome.reason,
-                         std::to_string(outcome.documentError)});
+    return withTraceError(traceError,
+                          encodeFields({outcome.fileName, outcome.returnCode, outcome.statusText,
+                                        std::to_string(static_cast<int>(outcome.kind)),
+                                        optionalText(outcome.rc), optionalText(outcome.rcCmd),
+                                        outcome.reason, std::to_string(outcome.documentError)}));
+}
+
+int decodeTraceError(std::string const& text) {
+    auto const records = decodeFields(text);
+    if (!records || records->empty() || records->front().size() != 1) {
+        return 0;
+    }
+    return optionalNumber(records->front().front()).value_or(0);
 }
 
 std::optional<PartitionOutcome> decodeOutcome(std::string const& text) {
-    auto const records = decodeFields(text);
+    auto const records = unitRecords(text);
     if (!records || records->size() != 1 || records->front().size() != gc_OutcomeFields) {
         return std::nullopt;
     }

@@ -20,7 +20,8 @@ std::string listMachines(std::string const& tracePath);
 std::vector<std::string> decodeMachines(std::string const& text);
 
 // Opens the trace on tracePiece, writes the line the tool's trace starts
-// with and lists the machine's partitions.
+// with and lists the machine's partitions. Its result, like a survey's,
+// also carries why the piece could not be written, if it could not.
 std::string listPartitions(std::string const& identity, std::string const& tracePiece);
 // nullopt when the result is cut short (the child did not finish).
 std::optional<std::vector<Quorvex::System::Partition>> decodePartitions(std::string const& identity,
@@ -31,5 +32,10 @@ std::optional<std::vector<Quorvex::System::Partition>> decodePartitions(std::str
 std::string surveyPartition(Quorvex::System::Partition const& partition,
                             std::string const& tracePiece);
 std::optional<Quorvex::PYLON::VPD::PartitionOutcome> decodeOutcome(std::string const& text);
+
+// The errno of the failure that kept lines of a listing's or survey's trace
+// from its piece (a full Trace folder), as its result carries it: 0 when
+// every line reached the piece or the result is cut short.
+int decodeTraceError(std::string const& text);
 
 } // namespace fleet

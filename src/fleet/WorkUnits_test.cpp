@@ -7,11 +7,16 @@
 namespace {
 
 using fleet::encodeFields;
+
+// A unit's result: the record of its trace piece's error, then its own.
+std::string result(std::string const& records, std::string const& traceError = "0") {
+    return encodeFields({traceError}) + records;
+}
 using Kind = Quorvex::PYLON::VPD::PartitionOutcomeKind;
 
 TEST(WorkUnits, PartitionsAreRebuiltWithTheMachineAndEveryField) {
-    std::string const text = encodeFields({"7", "", "3", "aurora", "Zeph", "7.2"}) +
-                             encodeFields({"7", "10.0.0.1", " 3x", "", "", ""});
+    std::string const text = result(encodeFields({"7", "", "3", "aurora", "Zeph", "7.2"}) +
+                                    encodeFields({"7", "10.0.0.1", " 3x", "", "", ""}));
     auto const partitions = fleet::decodePartitions("9119-MHE_21ABCDE", text);
     ASSERT_TRUE(partitions.has_value());
     ASSERT_EQ(partitions->size(), 2U);
@@ -26,19 +31,20 @@ TEST(WorkUnits, PartitionsAreRebuiltWithTheMachineAndEveryField) {
 }
 
 TEST(WorkUnits, ListingCutShortIsRejected) {
-    EXPECT_FALSE(fleet::decodePartitions("A-1_B", "6:1:7").has_value());
-    EXPECT_FALSE(fleet::decodePartitions("A-1_B", encodeFields({"7"})).has_value());
+    EXPECT_FALSE(fleet::decodePartitions("A-1_B", result("6:1:7")).has_value());
+    EXPECT_FALSE(fleet::decodePartitions("A-1_B", result(encodeFields({"7"}))).has_value());
+    EXPECT_FALSE(fleet::decodePartitions("A-1_B", "").has_value()) << "no trace record";
 }
 
 TEST(WorkUnits, EmptyListingGivesNoPartitions) {
-    auto const partitions = fleet::decodePartitions("A-1_B", "");
+    auto const partitions = fleet::decodePartitions("A-1_B", result(""));
     ASSERT_TRUE(partitions.has_value());
     EXPECT_TRUE(partitions->empty());
 }
 
 TEST(WorkUnits, OutcomeFieldsAreReadBack) {
-    std::string const text = encodeFields(
-        {"VPD/f.VPD.xml", "8", "get result Failed, rc = 3", "4", "3", "0", "reason\n", "28"});
+    std::string const text = result(encodeFields(
+        {"VPD/f.VPD.xml", "8", "get result Failed, rc = 3", "4", "3", "0", "reason\n", "28"}));
     auto const outcome = fleet::decodeOutcome(text);
     ASSERT_TRUE(outcome.has_value());
     EXPECT_EQ(outcome->fileName, "VPD/f.VPD.xml");
@@ -52,7 +58,8 @@ TEST(WorkUnits, OutcomeFieldsAreReadBack) {
 }
 
 TEST(WorkUnits, MissingCodesStayUnknown) {
-    auto const outcome = fleet::decodeOutcome(encodeFields({"", "8", "x", "1", "", "", "", "0"}));
+    auto const outcome =
+        fleet::decodeOutcome(result(encodeFields({"", "8", "x", "1", "", "", "", "0"})));
     ASSERT_TRUE(outcome.has_value());
     EXPECT_EQ(outcome->kind, Kind::Inactive);
     EXPECT_FALSE(outcome->rc.has_value());
@@ -61,9 +68,20 @@ TEST(WorkUnits, MissingCodesStayUnknown) {
 
 TEST(WorkUnits, OutcomeOfAChildThatDiedIsRejected) {
     EXPECT_FALSE(fleet::decodeOutcome("").has_value());
-    EXPECT_FALSE(fleet::decodeOutcome(encodeFields({"a", "b"})).has_value());
+    EXPECT_FALSE(fleet::decodeOutcome(result(encodeFields({"a", "b"}))).has_value());
+    EXPECT_FALSE(fleet::decodeOutcome(result(encodeFields({"", "8", "x", "9", "", "", "", "0"})))
+                     .has_value());
     EXPECT_FALSE(
-        fleet::decodeOutcome(encodeFields({"", "8", "x", "9", "", "", "", "0"})).has_value());
+        fleet::decodeOutcome(encodeFields({"", "8", "x", "1", "", "", "", "0"})).has_value())
+        << "no trace record";
+}
+
+TEST(WorkUnits, TraceErrorIsReadFromTheResult) {
+    std::string const outcome = encodeFields({"", "8", "x", "1", "", "", "", "0"});
+    EXPECT_EQ(fleet::decodeTraceError(result(outcome, "28")), 28);
+    EXPECT_EQ(fleet::decodeTraceError(result(outcome)), 0);
+    EXPECT_EQ(fleet::decodeTraceError(result("", "5")), 5) << "a listing's result";
+    EXPECT_EQ(fleet::decodeTraceError("2:1:"), 0) << "cut short";
 }
 
 TEST(WorkUnits, MachineListIsOneRecordOfIdentities) {

@@ -267,6 +267,8 @@ int main(int argc, char** argv) {
     if (std::optional<int> const refused = lockResultFolder(lock, options.waitForFolder)) {
         return *refused;
     }
+    // What a run killed by SIGKILL left, now that no other run writes there.
+    fleet::removeTracePiecesOfEndedRuns(fleet::traceFolder());
     RunClock const clock{std::time(nullptr), std::chrono::steady_clock::now(), {}};
     fleet::MachineListing const listing = machinesToSurvey(options);
     fleet::SurveyRun run(options, listing.identities);

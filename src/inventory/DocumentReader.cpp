@@ -1,6 +1,7 @@
 #include "inventory/DocumentReader.h"
 
 #include "inventory/ComponentKeys.h"
+#include "inventory/DocumentNames.h"
 #include "inventory/StrayMarkup.h"
 #include "utility/FileText.h"
 
@@ -16,12 +17,6 @@ namespace inventory {
 
 namespace {
 
-constexpr std::string_view gc_RootElement = "com.zor.inventory";
-constexpr std::string_view gc_Resource = "Resource";
-constexpr std::string_view gc_ResourceList = "ResourceList";
-constexpr std::string_view gc_PropertyGroup = "PropertyGroup";
-constexpr std::string_view gc_Property = "Property";
-constexpr std::string_view gc_Value = "Value";
 // The property a default document carries its reason in; the keyword table
 // of client documents has no such keyword (docs/compatibility.md#default-document).
 constexpr std::string_view gc_ReasonKeyword = "VD";
@@ -40,19 +35,19 @@ std::string attribute(XML_Char const** attributes, std::string_view name) {
 enum class Element { Other, Resource, ResourceList, PropertyGroup, Property, Value };
 
 Element elementOf(std::string_view name) {
-    if (name == gc_Resource) {
+    if (name == gc_ResourceElement) {
         return Element::Resource;
     }
-    if (name == gc_ResourceList) {
+    if (name == gc_ResourceListElement) {
         return Element::ResourceList;
     }
-    if (name == gc_PropertyGroup) {
+    if (name == gc_PropertyGroupElement) {
         return Element::PropertyGroup;
     }
-    if (name == gc_Property) {
+    if (name == gc_PropertyElement) {
         return Element::Property;
     }
-    return name == gc_Value ? Element::Value : Element::Other;
+    return name == gc_ValueElement ? Element::Value : Element::Other;
 }
 
 // Follows expat's events and builds the reading from them.
@@ -135,9 +130,9 @@ void ExpatReading::start(std::string_view name, XML_Char const** attributes) {
     if (element == Element::Resource) {
         _startResource(attributes);
     } else if (element == Element::ResourceList) {
-        _lists.push_back(attribute(attributes, "displayName"));
+        _lists.push_back(attribute(attributes, gc_DisplayNameAttribute));
     } else if (element == Element::PropertyGroup) {
-        _groups.push_back(attribute(attributes, "displayName"));
+        _groups.push_back(attribute(attributes, gc_DisplayNameAttribute));
     } else if (element == Element::Property) {
         _startProperty(attributes);
     }
@@ -174,7 +169,7 @@ void ExpatReading::_refuseRoot(std::string_view name) {
 
 void ExpatReading::_startResource(XML_Char const** attributes) {
     Component component;
-    component.displayName = attribute(attributes, "displayName");
+    component.displayName = attribute(attributes, gc_DisplayNameAttribute);
     component.uniqueId = attribute(attributes, "uniqueId");
     if (!_resources.empty()) {
         component.parent = _resources.back();
@@ -191,7 +186,7 @@ void ExpatReading::_startProperty(XML_Char const** attributes) {
         return;
     }
     _keyword = Keyword{attribute(attributes, "name"),
-                       attribute(attributes, "displayName"),
+                       attribute(attributes, gc_DisplayNameAttribute),
                        {},
                        _groups.empty() ? std::string() : _groups.back()};
     if (_keyword->name == gc_ReasonKeyword) {

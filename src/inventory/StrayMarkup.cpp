@@ -1,5 +1,8 @@
 #include "inventory/StrayMarkup.h"
 
+#include "inventory/DocumentNames.h"
+#include "utility/TextSafety.h"
+
 #include <algorithm>
 #include <array>
 #include <cstddef>
@@ -8,15 +11,12 @@ namespace inventory {
 
 namespace {
 
-// The elements the document writer writes (src/transform).
-constexpr std::array<std::string_view, 7> gc_ElementNames = {
-    "com.zor.inventory", "ResourceSet", "Resource", "ResourceList",
-    "PropertyGroup",     "Property",    "Value"};
-constexpr std::string_view gc_ValueElement = "Value";
-constexpr std::string_view gc_ResourceElement = "Resource";
-constexpr std::string_view gc_DisplayNameAttribute = "displayName";
-constexpr std::string_view gc_ValueEndTag = "</Value>";
-constexpr std::string_view gc_PropertyEndTag = "</Property>";
+std::string endTag(std::string_view element) {
+    return "</" + std::string(element) + ">";
+}
+
+std::string const gc_ValueEndTag = endTag(gc_ValueElement);
+std::string const gc_PropertyEndTag = endTag(gc_PropertyElement);
 constexpr std::string_view gc_Declaration = "<?xml";
 constexpr std::string_view gc_DeclarationEnd = "?>";
 constexpr std::size_t gc_None = std::string_view::npos;
@@ -32,19 +32,6 @@ bool isBlank(char c) {
 
 bool isEscaped(char c) {
     return c == '&' || c == '<' || c == '>' || c == '"';
-}
-
-std::string_view escapeOf(char special) {
-    switch (special) {
-    case '&':
-        return "&amp;";
-    case '<':
-        return "&lt;";
-    case '>':
-        return "&gt;";
-    default:
-        return "&quot;";
-    }
 }
 
 bool isElementName(std::string_view name) {
@@ -270,7 +257,7 @@ void Scan::_escape(std::size_t end) {
         _out.append(_in.substr(_at, special - _at));
         _at = special;
         if (_at < end) {
-            _out.append(escapeOf(_in[_at]));
+            _out.append(util::htmlEntityOf(_in[_at]));
             ++_at;
         }
     }

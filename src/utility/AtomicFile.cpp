@@ -70,7 +70,13 @@ void writeFileAtomically(std::string const& path, std::string const& text) {
         ::unlink(temporary.data());
         throw SystemError(gc_Operation, path, reported);
     }
-    flushFolderToDisk(folderOf(path));
+    // The new file is in place, but may not outlast a crash: still a file
+    // not written for good.
+    try {
+        flushFolderToDisk(folderOf(path));
+    } catch (SystemError const& failure) {
+        throw SystemError(gc_Operation, path, failure.errorNumber());
+    }
 }
 
 } // namespace util

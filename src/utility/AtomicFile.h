@@ -11,7 +11,9 @@ namespace util {
 // leaves the old file or the new one, never an empty one. The file has the
 // mode a new file gets under the process's umask. Throws SystemError
 // ("write", path, errno of the failing call) when the file cannot be
-// written; the temporary file is removed then.
+// written; the temporary file is removed then, and the old file stays. When
+// only the folder's flush fails, the new file is in place and the same
+// error is thrown: the rename may not outlast a crash.
 void writeFileAtomically(std::string const& path, std::string const& text);
 
 // Flushes folder's entries to the disk, so that a rename in it lasts.

@@ -13,6 +13,8 @@
 #include <optional>
 #include <sys/resource.h>
 #include <sys/stat.h>
+#include <sys/syscall.h>
+#include <unistd.h>
 
 namespace {
 
@@ -130,6 +132,55 @@ TEST(AtomicFile, FailedWriteThrowsItsErrnoAndRemovesTheTemporaryFile) {
     EXPECT_EQ(0U, entriesIn(folder.path()));
 }
 
+// The disk's flush failing (fsync and fdatasync fail with EIO, for root
+// too): the file is named, the old file stays and no temporary file is left.
+// The filter stays in the child, which ends with the errno it saw when the
+// message is as expected.
+TEST(AtomicFile, FailedFlushToTheDiskThrowsItsErrnoAndKeepsTheOldFile) {
+    QuorvexTest::TemporaryDirectory folder;
+    std::string const path = folder.file("out");
+    QuorvexTest::writeFile(path, "old");
+    auto const result = QuorvexTest::runInChild([&path] {
+        std::string const problem = QuorvexTest::failSystemCalls({SYS_fsync, SYS_fdatasync}, EIO);
+        if (!problem.empty()) {
+            std::fprintf(stderr, "%s\n", problem.c_str());
+            return 1;
+        }
+        auto const error = failureWriting(path);
+        bool const exact =
+            error && std::string(error->what()) == "cannot write " + path + ": Input/output error";
+        return exact ? error->errorNumber() : 2;
+    });
+    EXPECT_EQ(EIO, result.exitStatus) << result.stderrText;
+    EXPECT_EQ("old", QuorvexTest::readFile(path));
+    EXPECT_EQ(1U, entriesIn(folder.path()));
+}
+
+// A folder that cannot be opened for its flush (no read permission, as
+// uid 65534 for root would read it anyway): the rename is done, the file is
+// named with the folder's errno.
+TEST(AtomicFile, FolderThatCannotBeFlushedNamesTheFileLeftInPlace) {
+    QuorvexTest::TemporaryDirectory folder;
+    std::string const unreadable = folder.file("unreadable");
+    fs::create_directory(unreadable);
+    fs::permissions(folder.path(), fs::perms::owner_all | fs::perms::others_exec);
+    fs::permissions(unreadable, fs::perms::all & ~(fs::perms::owner_read | fs::perms::group_read |
+                                                   fs::perms::others_read));
+    std::string const path = unreadable + "/out";
+    auto const result = QuorvexTest::runInChild([&path] {
+        if (::getuid() == 0 && (::setgid(65534) != 0 || ::setuid(65534) != 0)) {
+            return 1;
+        }
+        auto const error = failureWriting(path);
+        bool const exact =
+            error && std::string(error->what()) == "cannot write " + path + ": Permission denied";
+        return exact ? error->errorNumber() : 2;
+    });
+    EXPECT_EQ(EACCES, result.exitStatus);
+    fs::permissions(unreadable, fs::perms::owner_all);
+    EXPECT_EQ("x", QuorvexTest::readFile(path));
+}
+
 } // namespace
 
 namespace {
@@ -156,6 +207,21 @@ TEST(AtomicFileFolderFlush, MissingFolderThrowsWriteWithTheFolderAndEnoent) {
     EXPECT_EQ(ENOENT, error->errorNumber());
     EXPECT_EQ("cannot write " + folder.file("gone") + ": No such file or directory",
               std::string(error->what()));
+}
+
+TEST(AtomicFileFolderFlush, FailedFlushToTheDiskThrowsWithTheFolderAndItsErrno) {
+    QuorvexTest::TemporaryDirectory folder;
+    std::string const& path = folder.path();
+    auto const result = QuorvexTest::runInChild([&path] {
+        if (!QuorvexTest::failSystemCalls({SYS_fsync}, EIO).empty()) {
+            return 1;
+        }
+        auto const error = failureFlushing(path);
+        bool const exact =
+            error && std::string(error->what()) == "cannot write " + path + ": Input/output error";
+        return exact ? error->errorNumber() : 2;
+    });
+    EXPECT_EQ(EIO, result.exitStatus);
 }
 
 TEST(AtomicFileFolderFlush, RegularFileThrowsEnotdir) {

@@ -44,7 +44,9 @@ std::size_t sequenceLength(std::string const& text, std::size_t at) {
     return 0;
 }
 
-char const* entityOf(char c) {
+} // namespace
+
+std::string_view htmlEntityOf(char c) {
     switch (c) {
     case '&':
         return "&amp;";
@@ -57,11 +59,9 @@ char const* entityOf(char c) {
     case '\'':
         return "&#39;";
     default:
-        return nullptr;
+        return {};
     }
 }
-
-} // namespace
 
 std::string validUtf8(std::string const& bytes) {
     std::string text;
@@ -85,11 +85,11 @@ std::string escapeHtml(std::string const& text) {
     std::string escaped;
     escaped.reserve(valid.size());
     for (char const c : valid) {
-        char const* const entity = entityOf(c);
-        if (entity != nullptr) {
-            escaped += entity;
-        } else {
+        std::string_view const entity = htmlEntityOf(c);
+        if (entity.empty()) {
             escaped += c;
+        } else {
+            escaped += entity;
         }
     }
     return escaped;

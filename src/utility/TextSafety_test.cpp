@@ -45,4 +45,15 @@ TEST(TextSafety, KeepsNulAndControlBytes) {
     EXPECT_EQ(text, util::validUtf8(text));
 }
 
+TEST(TextSafety, EntityTableHasTheFiveSpecialCharactersAndNothingElse) {
+    EXPECT_EQ(util::htmlEntityOf('&'), "&amp;");
+    EXPECT_EQ(util::htmlEntityOf('<'), "&lt;");
+    EXPECT_EQ(util::htmlEntityOf('>'), "&gt;");
+    EXPECT_EQ(util::htmlEntityOf('"'), "&quot;");
+    EXPECT_EQ(util::htmlEntityOf('\''), "&#39;");
+    for (char const plain : {'a', ' ', ';', '#', '\0', '\xC3'}) {
+        EXPECT_TRUE(util::htmlEntityOf(plain).empty()) << static_cast<int>(plain);
+    }
+}
+
 } // namespace

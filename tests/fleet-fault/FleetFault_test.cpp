@@ -33,26 +33,20 @@ namespace {
 
 using FleetFaultTest::FaultTimings;
 using FleetFaultTest::MarkedSurvey;
+using FleetTest::gc_Answer;
+using FleetTest::gc_Identity;
+using FleetTest::listing;
 using QuorvexTest::SimulatedConsole;
 
-constexpr char gc_Identity[] = "1234-ABC_10ABCDE";
-constexpr char gc_Answer[] = "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n";
 constexpr char gc_Hang[] = "child-delay 3600\ndelay 3600\n";
+// A machine the console lists no partition of.
+constexpr char gc_Unlisted[] = "9999-XYZ_99ZZZZZ";
 // How long a run may take before the test calls it hung and kills it.
 constexpr double gc_HungRun = 20.0;
 // The bound within which nothing of an ended run may still run.
 constexpr double gc_NothingLeftWithin = 1.0;
 // Slack on a time limit for a loaded machine.
 constexpr double gc_Margin = 3.0;
-
-std::string listing(int partitions) {
-    std::string line = std::string("[lspartition ") + gc_Identity + "]\nstdout ";
-    for (int id = 1; id <= partitions; ++id) {
-        line += std::to_string(id) + ",10.1.1.1" + std::to_string(id) + ",3,host" +
-                std::to_string(id) + ",Zeph,7.2;";
-    }
-    return line + "\n";
-}
 
 std::string fetchAnswer(double delaySeconds = 0.0) {
     return "[getFileFromPartition *]\ndelay " + std::to_string(delaySeconds) + "\n" + gc_Answer +
@@ -272,15 +266,13 @@ TEST(FleetFault, ParentKilledAtARandomMomentLeavesNothingOneSecondLater) {
         EXPECT_EQ(run.survey().processesLeft(gc_NothingLeftWithin), std::vector<std::string>{})
             << "processes of the run still running one second after its parent was killed";
         // A unit that ended just before the kill had handed its trace piece
-        // to the run, which never took it: that piece may stay, as
-        // documented.
-        std::vector<std::string> left = leftByAKilledRun(run);
-        left.erase(std::remove_if(left.begin(), left.end(),
-                                  [](std::string const& path) {
-                                      return path.find(".Trace.piece-") != std::string::npos;
-                                  }),
-                   left.end());
-        EXPECT_EQ(left, std::vector<std::string>{}) << "temporary files";
+        // to the run, which never took it: the next run removes it, and the
+        // lock file, before it runs anything.
+        MarkedSurvey next({FleetTest::consoleWideTool(), "-t", "1", gc_Unlisted},
+                          run.workFolder() + "/next-stdout", run.workFolder() + "/next-stderr");
+        EXPECT_EQ(next.waitForExit(gc_HungRun), 8);
+        EXPECT_EQ(FleetFaultTest::temporaryFilesLeft(run.workFolder()), std::vector<std::string>{})
+            << "temporary files after the next run";
     });
 }
 

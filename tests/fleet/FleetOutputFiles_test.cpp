@@ -16,23 +16,25 @@
 
 #include <fcntl.h>
 #include <sys/ioctl.h>
+#include <sys/syscall.h>
 #include <unistd.h>
 
 #include <csignal>
+#include <filesystem>
 #include <thread>
 
 namespace {
 
+using FleetTest::gc_Answer;
+using FleetTest::gc_Identity;
 using FleetTest::SurveyProcess;
 using QuorvexTest::SimulatedConsole;
 
-constexpr char gc_Identity[] = "1234-ABC_10ABCDE";
 constexpr char gc_Second[] = "5678-DEF_20FGHIJ";
 constexpr char gc_StatusFile[] =
     "/var/adm/quorvex/VPD/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE.status";
 constexpr char gc_TraceFile[] =
     "/var/adm/quorvex/Trace/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE.Trace";
-constexpr char gc_Answer[] = "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n";
 // Far above any bound a test waits for.
 constexpr char gc_Hang[] = "child-delay 3600\ndelay 3600\n";
 // A run that never ends within it was waiting for a hung console command.
@@ -124,7 +126,9 @@ TEST_F(FleetOutputFiles, MissingFoldersOfSummaryAndReportAreCreated) {
 }
 
 // Forty inactive partitions under a file size limit of 1,000 bytes: a status
-// file of over 2,000 bytes, a trace of a few lines, no document.
+// file of over 2,000 bytes, a listing whose trace lines go past the limit
+// too (the machine's trace is written with the first 1,000 bytes and named),
+// no document.
 TEST_F(FleetOutputFiles, StatusFileAndSummaryThatCannotBeWrittenAreNamedAndEndWith73) {
     SimulatedConsole const console(listing(gc_Identity, 40, false));
     std::string const summary = _work.file("summary.json");
@@ -133,10 +137,11 @@ TEST_F(FleetOutputFiles, StatusFileAndSummaryThatCannotBeWrittenAreNamedAndEndWi
     // No partition was contacted: the block is the overall code alone.
     EXPECT_EQ(_stderr(), std::string(gc_BlockEnd) + "8\nquorvex-survey: cannot write " +
                              gc_StatusFile + ": File too large\nquorvex-survey: cannot write " +
+                             gc_TraceFile + ": File too large\nquorvex-survey: cannot write " +
                              summary + ": File too large\n");
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_VPD_Folder), std::vector<std::string>{})
         << "a cut status file or its temporary file was left";
-    EXPECT_TRUE(QuorvexTest::fileExists(gc_TraceFile));
+    EXPECT_EQ(QuorvexTest::readFile(gc_TraceFile).size(), 1000U);
     EXPECT_EQ(QuorvexTest::listFolder(_work.path()),
               (std::vector<std::string>{"stderr", "stdout"}));
 }
@@ -157,6 +162,83 @@ TEST_F(FleetOutputFiles, DefaultDocumentThatCannotBeWrittenIsNamedAndEndsWith73)
                              summary + ": File too large\n");
     EXPECT_EQ(QuorvexTest::readFile(document).size(), 1200u)
         << "the survey code leaves its document cut short under its name, as the tool does";
+}
+
+// quorvex-survey started through a shell that first links the trace piece
+// of the given slot to /dev/full, where every write fails with ENOSPC as on
+// a full Trace folder: the piece's name carries the run's PID, which the
+// shell keeps when it becomes the run.
+SurveyProcess startWithFullTracePiece(std::vector<std::string> const& arguments, int slot,
+                                      std::string const& stdoutPath,
+                                      std::string const& stderrPath) {
+    std::vector<std::string> argv{"/bin/sh", "-c",
+                                  R"(ln -s /dev/full "$0.piece-$$-)" + std::to_string(slot) +
+                                      R"(" && exec "$@")",
+                                  gc_TraceFile, FleetTest::consoleWideTool()};
+    argv.insert(argv.end(), arguments.begin(), arguments.end());
+    return SurveyProcess(argv, stdoutPath, stderrPath);
+}
+
+// The listing unit runs in slot 0: its lines are lost, the machine's trace
+// is written without them and named, and the blocks stay the tool's.
+TEST_F(FleetOutputFiles, ListingTracePieceThatCannotBeWrittenIsNamedAndEndsWith73) {
+    SimulatedConsole const console(listing(gc_Identity, 1, true) + surveyedActions());
+    std::string const summary = _work.file("summary.json");
+    SurveyProcess survey = startWithFullTracePiece({"--summary", summary, gc_Identity}, 0,
+                                                   _work.file("stdout"), _work.file("stderr"));
+    EXPECT_EQ(survey.waitForExit(gc_Bound), 73) << _stderr();
+    EXPECT_EQ(_stderr(), std::string("0\n") + gc_BlockEnd + "0\nquorvex-survey: cannot write " +
+                             gc_TraceFile + ": No space left on device\n");
+    EXPECT_EQ(FleetTest::SummaryFile(summary).field("/exit_status"), "73");
+    std::string const trace = QuorvexTest::readFile(gc_TraceFile);
+    EXPECT_EQ(trace.find("lspartition"), std::string::npos) << trace;
+    EXPECT_NE(trace.find("runCmdOnPartition"), std::string::npos) << trace;
+    EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_TraceFolder),
+              std::vector<std::string>{std::filesystem::path(gc_TraceFile).filename().string()})
+        << "the linked piece is removed";
+}
+
+// At -j 2 the two surveys run in slots 0 and 1: the second one's lines are
+// lost.
+TEST_F(FleetOutputFiles, SurveyTracePieceThatCannotBeWrittenIsNamedAndEndsWith73) {
+    SimulatedConsole const console(listing(gc_Identity, 2, true) + surveyedActions());
+    SurveyProcess survey = startWithFullTracePiece({"-j", "2", gc_Identity}, 1,
+                                                   _work.file("stdout"), _work.file("stderr"));
+    EXPECT_EQ(survey.waitForExit(gc_Bound), 73) << _stderr();
+    EXPECT_EQ(_stderr(), std::string("0\n0\n") + gc_BlockEnd + "0\nquorvex-survey: cannot write " +
+                             gc_TraceFile + ": No space left on device\n");
+    std::string const trace = QuorvexTest::readFile(gc_TraceFile);
+    EXPECT_NE(trace.find("lspartition"), std::string::npos) << trace;
+    EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_TraceFolder).size(), 1U)
+        << "the linked piece is removed";
+}
+
+// A disk whose flush fails (fsync and fdatasync fail with EIO in the run and
+// its workers, for root too): every file quorvex-survey writes under a
+// temporary name is named, its old version stays, and nothing else is left.
+TEST_F(FleetOutputFiles, FilesThatCannotBeFlushedToTheDiskAreNamedAndTheOldOnesStay) {
+    SimulatedConsole const console(listing(gc_Identity, 1, true) + surveyedActions());
+    std::string const summary = _work.file("summary.json");
+    QuorvexTest::writeFile(gc_StatusFile, "old status\n");
+    QuorvexTest::writeFile(gc_TraceFile, "old trace\n");
+    QuorvexTest::writeFile(summary, "{}\n");
+    SurveyProcess survey({FleetTest::consoleWideTool(), "--summary", summary, "--report",
+                          _work.file("report"), gc_Identity},
+                         _work.file("stdout"), _work.file("stderr"), {},
+                         {SYS_fsync, SYS_fdatasync});
+    EXPECT_EQ(survey.waitForExit(gc_Bound), 73) << _stderr();
+    EXPECT_EQ(_stderr(), std::string("0\n") + gc_BlockEnd + "0\nquorvex-survey: cannot write " +
+                             gc_StatusFile + ": Input/output error\nquorvex-survey: cannot write " +
+                             gc_TraceFile +
+                             ": Input/output error\nquorvex-survey: report: cannot write " +
+                             _work.file("report/summary.json") +
+                             ": Input/output error\nquorvex-survey: cannot write " + summary +
+                             ": Input/output error\n");
+    EXPECT_EQ(QuorvexTest::readFile(gc_StatusFile), "old status\n");
+    EXPECT_EQ(QuorvexTest::readFile(gc_TraceFile), "old trace\n");
+    EXPECT_EQ(QuorvexTest::readFile(summary), "{}\n");
+    EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_TraceFolder).size(), 1U);
+    EXPECT_FALSE(QuorvexTest::fileExists(_work.file("report/index.html")));
 }
 
 // Reads the pipe until its writers are gone.

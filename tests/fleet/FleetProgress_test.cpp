@@ -17,10 +17,10 @@
 
 namespace {
 
+using FleetTest::gc_Identity;
 using QuorvexTest::CommandResult;
 using QuorvexTest::SimulatedConsole;
 
-constexpr char gc_Identity[] = "1234-ABC_10ABCDE";
 constexpr char gc_SecondIdentity[] = "5678-DEF_20FGHIJ";
 constexpr std::size_t gc_Width = 300;
 

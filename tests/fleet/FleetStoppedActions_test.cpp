@@ -25,11 +25,13 @@
 
 namespace {
 
+using FleetTest::gc_Answer;
+using FleetTest::gc_Identity;
 using FleetTest::KilledActionReference;
+using FleetTest::listing;
 using FleetTest::SurveyProcess;
 using QuorvexTest::SimulatedConsole;
 
-constexpr char gc_Identity[] = "1234-ABC_10ABCDE";
 constexpr char gc_VPD[] = "/var/adm/quorvex/VPD/";
 constexpr char gc_Trace[] =
     "/var/adm/quorvex/Trace/quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE.Trace";
@@ -37,18 +39,8 @@ constexpr char gc_Document[] = "quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC
 constexpr char gc_StatusFile[] = "quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE.status";
 // Far above any bound a test waits for.
 constexpr char gc_Hang[] = "child-delay 3600\ndelay 3600\n";
-constexpr char gc_Answer[] = "stdout Rc::0::RcCmd::0::RetStr1::done::RetStr2::\n";
 // Generous: the bound a run must keep is the limit plus one second.
 constexpr double gc_Margin = 3.0;
-
-std::string listing(int partitions) {
-    std::string line = "[lspartition 1234-ABC_10ABCDE]\nstdout ";
-    for (int id = 1; id <= partitions; ++id) {
-        line += std::to_string(id) + ",10.1.1.1" + std::to_string(id) + ",3,host" +
-                std::to_string(id) + ",Zeph,7.2;";
-    }
-    return line + "\n";
-}
 
 std::string fetchAnswer() {
     return std::string("[getFileFromPartition *]\n") + gc_Answer + "document-nolf <fetched/>\n";

@@ -1,7 +1,9 @@
 #include "SurveyProcess.h"
 
 #include "ChildProcess.h"
+#include "FailingSystemCalls.h"
 
+#include <cerrno>
 #include <chrono>
 #include <csignal>
 #include <fcntl.h>
@@ -32,7 +34,8 @@ void limitFileSize(std::optional<rlim_t> const& fileSizeLimit) {
 }
 
 [[noreturn]] void execute(std::vector<std::string> const& argv, std::string const& stdoutPath,
-                          std::string const& stderrPath, std::optional<rlim_t> fileSizeLimit) {
+                          std::string const& stderrPath, std::optional<rlim_t> fileSizeLimit,
+                          std::vector<long> const& failingCalls) {
     int const input = ::open("/dev/null", O_RDONLY);
     int const output = ::open(stdoutPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0644);
     int const error = ::open(stderrPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0644);
@@ -41,6 +44,9 @@ void limitFileSize(std::optional<rlim_t> const& fileSizeLimit) {
         ::_exit(126);
     }
     limitFileSize(fileSizeLimit);
+    if (!failingCalls.empty() && !QuorvexTest::failSystemCalls(failingCalls, EIO).empty()) {
+        ::_exit(125);
+    }
     std::vector<char*> arguments = QuorvexTest::argumentPointers(argv);
     ::execv(arguments[0], arguments.data());
     ::_exit(127);
@@ -54,14 +60,15 @@ double monotonicSeconds() {
 }
 
 SurveyProcess::SurveyProcess(std::vector<std::string> const& argv, std::string const& stdoutPath,
-                             std::string const& stderrPath, std::optional<rlim_t> fileSizeLimit) {
+                             std::string const& stderrPath, std::optional<rlim_t> fileSizeLimit,
+                             std::vector<long> const& failingCalls) {
     _started = monotonicSeconds();
     _pid = ::fork();
     if (_pid < 0) {
         throw std::runtime_error("cannot start " + argv.front());
     }
     if (_pid == 0) {
-        execute(argv, stdoutPath, stderrPath, fileSizeLimit);
+        execute(argv, stdoutPath, stderrPath, fileSizeLimit, failingCalls);
     }
 }
 

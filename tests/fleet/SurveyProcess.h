@@ -18,8 +18,11 @@ public:
     // size limit, every file write of the process and of whatever it starts
     // fails past that many bytes with EFBIG (SIGXFSZ ignored), as on a full
     // disk, for root too; its standard output and error must stay below it.
+    // With failingCalls, those system calls (SYS_fsync, say) fail with EIO
+    // in the process and whatever it starts, as on a failing disk.
     SurveyProcess(std::vector<std::string> const& argv, std::string const& stdoutPath,
-                  std::string const& stderrPath, std::optional<rlim_t> fileSizeLimit = {});
+                  std::string const& stderrPath, std::optional<rlim_t> fileSizeLimit = {},
+                  std::vector<long> const& failingCalls = {});
     // Kills and reaps the process if it still runs.
     ~SurveyProcess();
     SurveyProcess(SurveyProcess const&) = delete;

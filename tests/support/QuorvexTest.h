@@ -4,6 +4,7 @@
 //   TemporaryFiles.h     temporary and scratch folders, exact file contents
 //   ChildProcess.h       commands and code in child and fresh processes
 //   DescriptorLimit.h    a process that can open no more descriptors
+//   FailingSystemCalls.h system calls that fail as on a failing disk
 //   Sandbox.h            the sandbox runner and a read-only /tmp
 //   SimulatedConsole.h   the simulated console and its invocation log
 //   Normalise.h          temporary file names and time stamps made fixed
@@ -20,6 +21,7 @@
 #include "ChildProcess.h"
 #include "DescriptorLimit.h"
 #include "ExpectedOutput.h"
+#include "FailingSystemCalls.h"
 #include "FlushCountingBuffer.h"
 #include "Lines.h"
 #include "ModelText.h"
