@@ -33,7 +33,7 @@ constexpr char gc_Remedy[] =
 // The paths the sandbox provides; none may appear on the host.
 std::vector<std::string> const& _consolePaths() {
     static std::vector<std::string> const paths{"/var/adm", "/opt/vtc", "/opt/lsvtc",
-                                                "/usr/bin/runact-api"};
+                                                "/usr/bin/runact-api", "/var/lib/quorvex-survey"};
     return paths;
 }
 
@@ -128,7 +128,8 @@ TEST(SandboxHost, NothingAppearsOnTheHost) {
     }
     CommandResult const run =
         runInSandbox({}, {"sh", "-c",
-                          "touch /var/adm/quorvex/VPD/x /var/adm/quorvex/Trace/y /opt/vtc/bin/z && "
+                          "touch /var/adm/quorvex/VPD/x /var/adm/quorvex/Trace/y /opt/vtc/bin/z "
+                          "/var/lib/quorvex-survey/h && "
                           "/usr/bin/runact-api -c x >/dev/null; /opt/lsvtc/bin/lsvtc -t0"});
     if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
@@ -372,6 +373,7 @@ TEST(SandboxHost, BadPathsAreUsageErrors) {
               _sandbox({"--bind", "/etc/hostname:relative", "--", "true"}).exitStatus);
     EXPECT_EQ(gc_ExitUsage, _sandbox({"--bind", "/etc/hostname", "--", "true"}).exitStatus);
     EXPECT_EQ(gc_ExitUsage, _sandbox({"--tmp-size"}).exitStatus);
+    EXPECT_EQ(gc_ExitUsage, _sandbox({"--state", "/nonexistent", "--", "true"}).exitStatus);
 }
 
 TEST(SandboxHost, ContradictoryFolderOptionsAreUsageErrors) {
@@ -386,6 +388,7 @@ TEST(SandboxHost, HelpDocumentsEveryOption) {
     for (char const* option :
          {"--sim PATH", "--vpd DIR", "--trace DIR", "--no-vpd-dir", "--no-trace-dir",
           "--readonly-vpd", "--readonly-trace", "--readonly-tmp", "--tmp-size SIZE",
+          "--state DIR", "--readonly-state", "/var/lib/quorvex-survey",
           "--bind SRC:DST", "77", "120", "125", "QUORVEX_SANDBOX=namespace|proot",
           "QUORVEX_SANDBOX_FAIL_MOUNT=PATH", "QUORVEX_SANDBOX_KIND"}) {
         EXPECT_NE(std::string::npos, run.stdoutText.find(option)) << option;
