@@ -42,7 +42,7 @@ std::optional<report::HistoryRecord> const& RunHistory::member() const {
 }
 
 std::optional<std::string> RunHistory::failure() const {
-    if (!_record || _record->recorded) {
+    if (!_record || !_record->error) {
         return std::nullopt;
     }
     return "cannot record the run in " + _record->file + ": " + *_record->error;

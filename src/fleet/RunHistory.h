@@ -26,7 +26,8 @@ public:
     void record(report::RunSummary summary);
     // What the summary's history member says: nullopt with --no-history.
     std::optional<report::HistoryRecord> const& member() const;
-    // "cannot record the run in FILE: reason" when the last attempt failed.
+    // "cannot record the run in FILE: reason" when the last attempt failed;
+    // nullopt before the first.
     std::optional<std::string> failure() const;
 
 private:

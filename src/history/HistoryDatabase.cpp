@@ -40,9 +40,10 @@ void makeFile(std::string const& path) {
     if (error) {
         throw util::SystemError("create", folder, error.value());
     }
+    bool const exists = fs::exists(path, error);
     int const descriptor = ::open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0644);
     if (descriptor < 0) {
-        throw util::SystemError("open", path, errno);
+        throw util::SystemError(exists ? "open" : "create", path, errno);
     }
     ::close(descriptor);
 }

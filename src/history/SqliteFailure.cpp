@@ -12,6 +12,9 @@ namespace {
 // The failures that come from a system call, whose errno says more than
 // SQLite's own words.
 bool isFileSystemFailure(int code) {
+    // A write that fails other than for want of room (SQLITE_IOERR, "disk
+    // I/O error") keeps its errno in the file SQLite wrote, out of reach:
+    // SQLite's own words are all there is then.
     return code == SQLITE_CANTOPEN || code == SQLITE_IOERR || code == SQLITE_READONLY ||
            code == SQLITE_FULL || code == SQLITE_PERM;
 }
