@@ -119,11 +119,11 @@ void addRecapOptions(CLI::App& app, Options& options) {
 
 // Where the run is recorded (docs/history.md): a file, or nowhere.
 void addHistoryOptions(CLI::App& app, Options& options) {
-    CLI::Option* const history =
-        app.add_option("--history", options.historyFile, "record the run in the history database FILE")
-            ->type_name("FILE")
-            ->default_str(options.historyFile)
-            ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    CLI::Option* const history = app.add_option("--history", options.historyFile,
+                                                "record the run in the history database FILE")
+                                     ->type_name("FILE")
+                                     ->default_str(options.historyFile)
+                                     ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
     CLI::Option* const noHistory = app.add_flag_callback(
         "--no-history", [&options] { options.recordHistory = false; },
         "record nothing in the history database");

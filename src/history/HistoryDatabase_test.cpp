@@ -163,9 +163,8 @@ TEST(HistoryDatabase, RecordedRunIsThereWhenOpenedAgain) {
 TEST(HistoryDatabase, RunThatFailsHalfwayLeavesNothing) {
     QuorvexTest::TemporaryDirectory const work;
     history::HistoryDatabase database(work.file("h.sqlite"));
-    database.connection().exec(
-        "CREATE TRIGGER refuse BEFORE INSERT ON partition_results "
-        "BEGIN SELECT RAISE(ABORT, 'partition refused'); END");
+    database.connection().exec("CREATE TRIGGER refuse BEFORE INSERT ON partition_results "
+                               "BEGIN SELECT RAISE(ABORT, 'partition refused'); END");
     std::optional<history::HistoryError> const failure = thrownBy<history::HistoryError>(
         [&] { database.recordRun(oneSurveyedPartition(), {}, "/v"); });
     ASSERT_TRUE(failure);

@@ -104,9 +104,9 @@ void RunRecorder::amend(long long runId, report::RunSummary const& summary,
 // transaction, and an id once used is never given again, even after a prune.
 long long RunRecorder::_nextRunId() {
     return _database
-               .execAndGet("SELECT max(coalesce((SELECT seq FROM sqlite_sequence "
-                           "WHERE name = 'runs'), 0), coalesce((SELECT max(id) FROM runs), 0)) + 1")
-               .getInt64();
+        .execAndGet("SELECT max(coalesce((SELECT seq FROM sqlite_sequence "
+                    "WHERE name = 'runs'), 0), coalesce((SELECT max(id) FROM runs), 0)) + 1")
+        .getInt64();
 }
 
 void RunRecorder::_insertRun(long long runId, report::RunSummary const& summary,
@@ -136,7 +136,8 @@ void RunRecorder::_insertMachine(long long runId, report::MachineSummary const& 
     _machineInsert.bind(2, machine.identity);
     _machineInsert.bind(3, report::overallCode(machine.partitions));
     if (machine.listingFailure) {
-        _machineInsert.bind(4, compactText(report::listingFailureDocument(*machine.listingFailure)));
+        _machineInsert.bind(4,
+                            compactText(report::listingFailureDocument(*machine.listingFailure)));
     } else {
         _machineInsert.bind(4);
     }

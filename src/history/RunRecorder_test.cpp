@@ -40,14 +40,17 @@ report::RunSummary twoMachines() {
     summary.started = "2023-11-14T23:13:20+01:00";
     summary.ended = "2023-11-14T23:20:00+01:00";
     summary.exitStatus = 4;
-    summary.machines.push_back({"9119-MHE_21ABCDE",
-                                "/s1",
+    summary.machines.push_back(
+        {"9119-MHE_21ABCDE",
+         "/s1",
+         std::nullopt,
+         {surveyed, timedOut, partition("db1", Outcome::Interrupted),
+          partition("web", Outcome::Inactive), partition("x", Outcome::WorkerDied)},
+         std::nullopt});
+    summary.machines.push_back({"8286-42A_0000001",
+                                "/s2",
                                 std::nullopt,
-                                {surveyed, timedOut, partition("db1", Outcome::Interrupted),
-                                 partition("web", Outcome::Inactive),
-                                 partition("x", Outcome::WorkerDied)},
-                                std::nullopt});
-    summary.machines.push_back({"8286-42A_0000001", "/s2", std::nullopt, {},
+                                {},
                                 report::ListingFailure{"lspartition -c 8286", 1, "not found"}});
     return summary;
 }
@@ -116,8 +119,8 @@ TEST_F(RunRecorderTest, PartitionRowsNamedByHostWithTheDerivedColumnsLeftEmpty) 
 
 TEST_F(RunRecorderTest, SummaryKeptCompactWithTheRunIdInItsHistoryMember) {
     _record(twoMachines());
-    _record(twoMachines(), {{"tool", "quorvex-survey"},
-                            {"history", {{"file", "/h"}, {"run_id", nullptr}}}});
+    _record(twoMachines(),
+            {{"tool", "quorvex-survey"}, {"history", {{"file", "/h"}, {"run_id", nullptr}}}});
     EXPECT_EQ(_rows("SELECT summary FROM runs ORDER BY id"),
               (std::vector<std::string>{
                   "null", R"({"tool":"quorvex-survey","history":{"file":"/h","run_id":2}})"}));

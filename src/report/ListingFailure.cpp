@@ -117,10 +117,10 @@ std::string listingFailureText(ListingFailure const& failure) {
 }
 
 nlohmann::ordered_json listingFailureDocument(ListingFailure const& failure) {
-    return {{"command", failure.command},
-            {"exit_status",
-             failure.exitStatus ? nlohmann::ordered_json(*failure.exitStatus) : nullptr},
-            {"message", failure.message}};
+    return {
+        {"command", failure.command},
+        {"exit_status", failure.exitStatus ? nlohmann::ordered_json(*failure.exitStatus) : nullptr},
+        {"message", failure.message}};
 }
 
 } // namespace report

@@ -42,11 +42,11 @@ TEST(RunSummary, RunAndMachineKeysComeInTheSchemasOrder) {
     EXPECT_EQ(keysOf(document["machines"][0]),
               (std::vector<std::string>{"identity", "return_code", "status_file", "trace_file",
                                         "counts", "partitions"}));
-    EXPECT_EQ(keysOf(document), (std::vector<std::string>{
-                                    "schema_version", "tool", "version", "console_host", "started",
-                                    "ended", "elapsed_seconds", "options", "interrupted",
-                                    "return_code", "exit_status", "history", "totals",
-                                    "machines"}));
+    EXPECT_EQ(
+        keysOf(document),
+        (std::vector<std::string>{"schema_version", "tool", "version", "console_host", "started",
+                                  "ended", "elapsed_seconds", "options", "interrupted",
+                                  "return_code", "exit_status", "history", "totals", "machines"}));
 }
 
 TEST(RunSummary, UnknownPartitionFactsAreNullAndNoStopMeansNoTimeLimit) {

@@ -74,13 +74,15 @@ std::string consistencyProblems(std::string const& path) {
     if (integrity != "ok") {
         problems += "integrity_check: " + integrity + "\n";
     }
-    if (database.execAndGet("SELECT count(*) FROM runs r WHERE partitions != (SELECT count(*) "
-                            "FROM partition_results p WHERE p.run_id = r.id)")
+    if (database
+            .execAndGet("SELECT count(*) FROM runs r WHERE partitions != (SELECT count(*) "
+                        "FROM partition_results p WHERE p.run_id = r.id)")
             .getInt() != 0) {
         problems += "a run without all its partitions\n";
     }
-    if (database.execAndGet("SELECT count(*) FROM partition_results WHERE run_id NOT IN "
-                            "(SELECT id FROM runs)")
+    if (database
+            .execAndGet("SELECT count(*) FROM partition_results WHERE run_id NOT IN "
+                        "(SELECT id FROM runs)")
             .getInt() != 0) {
         problems += "partitions of a run that is not there\n";
     }
@@ -110,8 +112,7 @@ protected:
 
     std::vector<std::string> _surveyArguments(std::vector<std::string> const& arguments) const {
         std::vector<std::string> argv{FleetTest::consoleWideTool(), "--summary",
-                                      _work.file("summary.json"), "--report",
-                                      _work.file("report")};
+                                      _work.file("summary.json"), "--report", _work.file("report")};
         argv.insert(argv.end(), arguments.begin(), arguments.end());
         return argv;
     }
@@ -150,10 +151,8 @@ protected:
         EXPECT_EQ(summary.validationProblems(), "");
         EXPECT_EQ(summary.field("/exit_status"), "74");
         EXPECT_EQ(summary.field("/history"),
-                  nlohmann::json({{"file", file},
-                                  {"run_id", nullptr},
-                                  {"recorded", false},
-                                  {"error", reason}})
+                  nlohmann::json(
+                      {{"file", file}, {"run_id", nullptr}, {"recorded", false}, {"error", reason}})
                       .dump());
         EXPECT_TRUE(QuorvexTest::fileExists(_work.file("report/index.html")));
         EXPECT_TRUE(QuorvexTest::fileExists(
@@ -176,8 +175,9 @@ TEST_F(FleetHistory, RunIsRecordedInTheDefaultFileWithTheSummaryItWrote) {
     EXPECT_EQ(nlohmann::json::parse(database.execAndGet("SELECT summary FROM runs").getString()),
               nlohmann::json::parse(QuorvexTest::readFile(_work.file("summary.json"))))
         << "the history keeps the summary the run wrote";
-    EXPECT_EQ(database.execAndGet("SELECT outcome FROM partition_results WHERE partition = "
-                                  "'host1' AND machine = '1234-ABC_10ABCDE'")
+    EXPECT_EQ(database
+                  .execAndGet("SELECT outcome FROM partition_results WHERE partition = "
+                              "'host1' AND machine = '1234-ABC_10ABCDE'")
                   .getString(),
               "surveyed");
 }
@@ -239,9 +239,8 @@ TEST_F(FleetHistory, HistoryLockedPastTheTimeoutEndsWith74SayingAnotherProcessHo
     SurveyProcess survey = _start({gc_Identity});
     int const exitStatus = survey.waitForExit(gc_Bound);
     holder.exec("ROLLBACK");
-    _expectNotRecorded(
-        exitStatus, gc_DefaultHistory,
-        "the database is locked: another process has held it for more than 5 s");
+    _expectNotRecorded(exitStatus, gc_DefaultHistory,
+                       "the database is locked: another process has held it for more than 5 s");
     EXPECT_GE(survey.secondsTaken(), 5.0) << "the run did not wait for the lock";
     EXPECT_EQ(countOf(gc_DefaultHistory, "SELECT count(*) FROM runs"), 0);
 }
@@ -328,9 +327,9 @@ TEST_F(FleetHistory, TwoRunsRecordedAtOnceAreBothRecorded) {
     holder.exec("ROLLBACK");
     EXPECT_EQ(first.waitForExit(gc_Bound), 0) << _stderr();
     EXPECT_EQ(second.waitForExit(gc_Bound), 0) << QuorvexTest::readFile(_work.file("other.err"));
-    std::set<std::string> const ids{_summary().field("/history/run_id"),
-                                    FleetTest::SummaryFile(_work.file("other.json"))
-                                        .field("/history/run_id")};
+    std::set<std::string> const ids{
+        _summary().field("/history/run_id"),
+        FleetTest::SummaryFile(_work.file("other.json")).field("/history/run_id")};
     EXPECT_EQ(ids, (std::set<std::string>{"1", "2"}));
     EXPECT_EQ(countOf(file, "SELECT count(*) FROM runs"), 2);
     EXPECT_EQ(consistencyProblems(file), "");
@@ -347,12 +346,14 @@ TEST_F(FleetHistory, ClockSetBackBetweenRunsKeepsTheRecordingOrder) {
     EXPECT_EQ(_run({gc_Identity}), 0) << _stderr();
     EXPECT_EQ(_summary().field("/history/run_id"), "2");
     SQLite::Database database(gc_DefaultHistory, SQLite::OPEN_READONLY);
-    EXPECT_EQ(database.execAndGet("SELECT group_concat(id) FROM (SELECT id FROM runs "
-                                  "ORDER BY started_unix)")
+    EXPECT_EQ(database
+                  .execAndGet("SELECT group_concat(id) FROM (SELECT id FROM runs "
+                              "ORDER BY started_unix)")
                   .getString(),
               "2,1");
-    EXPECT_EQ(database.execAndGet("SELECT max(id) FROM runs WHERE id < 2 AND console = "
-                                  "(SELECT console FROM runs WHERE id = 2)")
+    EXPECT_EQ(database
+                  .execAndGet("SELECT max(id) FROM runs WHERE id < 2 AND console = "
+                              "(SELECT console FROM runs WHERE id = 2)")
                   .getInt(),
               1)
         << "the previous run of the second is the first";
@@ -387,8 +388,8 @@ bool killWhileRecording(SurveyProcess& survey, std::string const& file, int paus
             return true;
         }
         siginfo_t ended{};
-        if (::waitid(P_PID, static_cast<id_t>(survey.pid()), &ended,
-                     WEXITED | WNOHANG | WNOWAIT) == 0 &&
+        if (::waitid(P_PID, static_cast<id_t>(survey.pid()), &ended, WEXITED | WNOHANG | WNOWAIT) ==
+                0 &&
             ended.si_pid != 0) {
             return false;
         }

@@ -41,8 +41,9 @@ constexpr char gc_BlockEnd[] = "\nquorvexPYLON_VPD_Survey_ClientPartition Return
 // The history database, in the sandbox's own state folder, is past a file
 // size limit of a few hundred bytes at its first page: named after the files
 // that could not be written, its exit status 74 outweighed by their 73.
-constexpr char gc_HistoryPastTheLimit[] = "quorvex-survey: cannot record the run in "
-                                          "/var/lib/quorvex-survey/history.sqlite: disk I/O error\n";
+constexpr char gc_HistoryPastTheLimit[] =
+    "quorvex-survey: cannot record the run in "
+    "/var/lib/quorvex-survey/history.sqlite: disk I/O error\n";
 
 // The listing of a machine with partitions first..first+count-1, all active
 // or all inactive.

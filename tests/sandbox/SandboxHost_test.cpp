@@ -387,10 +387,10 @@ TEST(SandboxHost, HelpDocumentsEveryOption) {
     EXPECT_EQ(0, run.exitStatus);
     for (char const* option :
          {"--sim PATH", "--vpd DIR", "--trace DIR", "--no-vpd-dir", "--no-trace-dir",
-          "--readonly-vpd", "--readonly-trace", "--readonly-tmp", "--tmp-size SIZE",
-          "--state DIR", "--readonly-state", "/var/lib/quorvex-survey",
-          "--bind SRC:DST", "77", "120", "125", "QUORVEX_SANDBOX=namespace|proot",
-          "QUORVEX_SANDBOX_FAIL_MOUNT=PATH", "QUORVEX_SANDBOX_KIND"}) {
+          "--readonly-vpd", "--readonly-trace", "--readonly-tmp", "--tmp-size SIZE", "--state DIR",
+          "--readonly-state", "/var/lib/quorvex-survey", "--bind SRC:DST", "77", "120", "125",
+          "QUORVEX_SANDBOX=namespace|proot", "QUORVEX_SANDBOX_FAIL_MOUNT=PATH",
+          "QUORVEX_SANDBOX_KIND"}) {
         EXPECT_NE(std::string::npos, run.stdoutText.find(option)) << option;
     }
 }
