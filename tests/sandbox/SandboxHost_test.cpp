@@ -327,7 +327,8 @@ TEST(SandboxHost, ProotRefusesTmpSizeWithItsReason) {
 
 // A checkout in a folder only its owner may enter (a home folder) is out of
 // the unprivileged user's reach: the sandbox, its seccomp helper and the
-// simulator are copied into a folder that user may read.
+// simulator are copied into a folder that user may read. The state folder,
+// made under /var/lib where /var is already a layer, can be written.
 TEST(SandboxHost, UnprivilegedCallerGetsASandboxEvenFromAPrivateCheckout) {
     if (::geteuid() != 0 || !fileExists("/usr/bin/setpriv")) {
         GTEST_SKIP() << "needs root and setpriv to become an unprivileged user";
@@ -344,7 +345,8 @@ TEST(SandboxHost, UnprivilegedCallerGetsASandboxEvenFromAPrivateCheckout) {
     CommandResult const run =
         runCommand({"/usr/bin/setpriv", "--reuid=65534", "--regid=65534", "--clear-groups",
                     "/usr/bin/env", "-C", "/", sandbox, "--sim", simulator, "--", "sh", "-c",
-                    "test -d /var/adm/quorvex/VPD && test -x /usr/bin/runact-api"});
+                    "test -d /var/adm/quorvex/VPD && test -x /usr/bin/runact-api && "
+                    "touch /var/lib/quorvex-survey/history.sqlite"});
     if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
