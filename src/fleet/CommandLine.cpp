@@ -129,6 +129,19 @@ void addRecapOptions(CLI::App& app, Options& options) {
     recap->excludes(noRecap);
 }
 
+// Where the run is recorded (docs/history.md): a file, or nowhere.
+void addHistoryOptions(CLI::App& app, Options& options) {
+    CLI::Option* const history = app.add_option("--history", options.historyFile,
+                                                "record the run in the history database FILE")
+                                     ->type_name("FILE")
+                                     ->default_str(options.historyFile)
+                                     ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    CLI::Option* const noHistory = app.add_flag_callback(
+        "--no-history", [&options] { options.recordHistory = false; },
+        "record nothing in the history database");
+    history->excludes(noHistory);
+}
+
 // The survey's options; the report subcommand adds its own.
 void addSurveyOptions(CLI::App& app, Options& options) {
     addWholeNumber(app, gc_Jobs, options.jobs,
@@ -143,6 +156,7 @@ void addSurveyOptions(CLI::App& app, Options& options) {
     app.add_flag("--all", options.all, "every managed machine the console lists");
     app.add_flag("--wait", options.waitForFolder,
                  "wait for another run using the result folder to end, rather than exit 75");
+    addHistoryOptions(app, options);
     app.add_option("IDENTITY", options.identities, "a managed machine (type-model_serial)");
     report::addReportOption(app, options.reportFolder);
 }
@@ -287,9 +301,10 @@ struct OutputName {
     char const* what;
     std::string Options::*value;
 };
-constexpr std::array<OutputName, 2> gc_OutputNames{
+constexpr std::array<OutputName, 3> gc_OutputNames{
     {{"--summary", "a file name", &Options::summaryFile},
-     {"--report", "a folder name", &Options::reportFolder}}};
+     {"--report", "a folder name", &Options::reportFolder},
+     {"--history", "a file name", &Options::historyFile}}};
 
 // An empty name would turn the output off without a word (an unset
 // variable in a timer's script, say). The parser takes the next word as the

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "history/HistoryDatabase.h"
 #include "report/ReportCommand.h"
 
 #include <optional>
@@ -24,6 +25,10 @@ struct Options {
     // --wait: wait for another run using the same result folder to end,
     // rather than exit with gc_ExitTemporaryFailure.
     bool waitForFolder = false;
+    // --history FILE: the database the run is recorded in, unless
+    // --no-history turns recordHistory off.
+    std::string historyFile = history::gc_DefaultHistoryFile;
+    bool recordHistory = true;
     // As given, an identity given more than once kept at its first place.
     std::vector<std::string> identities;
 };

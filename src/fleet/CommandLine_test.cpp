@@ -224,6 +224,26 @@ TEST(CommandLine, SurveyHasNoReportRequest) {
     EXPECT_FALSE(parse({"A_1"}).parsed.reportRequest.has_value());
 }
 
+TEST(CommandLine, HistoryIsRecordedInTheDefaultFileUnlessTold) {
+    EXPECT_EQ(parse({"--all"}).parsed.options.historyFile,
+              "/var/lib/quorvex-survey/history.sqlite");
+    EXPECT_TRUE(parse({"--all"}).parsed.options.recordHistory);
+    EXPECT_EQ(parse({"--all", "--history", "h.sqlite"}).parsed.options.historyFile, "h.sqlite");
+    EXPECT_FALSE(parse({"--all", "--no-history"}).parsed.options.recordHistory);
+}
+
+TEST(CommandLine, HistoryAndNoHistoryExcludeEachOther) {
+    ParseRun const run = parse({"--all", "--history", "h.sqlite", "--no-history"});
+    ASSERT_TRUE(run.parsed.exitStatus.has_value());
+    EXPECT_EQ(*run.parsed.exitStatus, 64);
+    EXPECT_NE(run.err.find("--no-history"), std::string::npos) << run.err;
+}
+
+TEST(CommandLine, EmptyHistoryNameIsRefused) {
+    expectRefused({"--history", "", "--all"}, "--history needs a file name, not an empty value");
+    expectRefused({"--history=", "--all"}, "--history needs a file name, not an empty value");
+}
+
 TEST(CommandLine, WaitIsOffUnlessGiven) {
     EXPECT_FALSE(parse({"--all"}).parsed.options.waitForFolder);
     EXPECT_TRUE(parse({"--all", "--wait"}).parsed.options.waitForFolder);
@@ -259,6 +279,9 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
               "  --all                   every managed machine the console lists\n"
               "  --wait                  wait for another run using the result folder to end, "
               "rather than exit 75\n"
+              "  --history FILE          record the run in the history database FILE "
+              "(default /var/lib/quorvex-survey/history.sqlite)\n"
+              "  --no-history            record nothing in the history database\n"
               "  --report DIR            after the run, write its report into DIR\n"
               "\n"
               "Subcommands:\n"

@@ -5,6 +5,7 @@
 #include "fleet/ProcessTree.h"
 #include "fleet/Recap.h"
 #include "fleet/RunFiles.h"
+#include "fleet/RunHistory.h"
 #include "fleet/RunLock.h"
 #include "fleet/SignalPipe.h"
 #include "fleet/Summary.h"
@@ -38,10 +39,10 @@ struct RunClock {
 
 // A signal outweighs a file that could not be written, which outweighs a
 // console whose machines could not be listed (sysexits.h's EX_UNAVAILABLE),
-// which outweighs the overall code: 128 + signal, then 73, then 69, then 0,
-// 4 or 8.
+// which outweighs a history that could not be recorded (EX_IOERR), which
+// outweighs the overall code: 128 + signal, then 73, 69, 74, then 0, 4 or 8.
 int finalExitStatus(fleet::SurveyRun const& run, std::vector<std::string> const& failures,
-                    fleet::MachineListing const& listing) {
+                    fleet::MachineListing const& listing, fleet::RunHistory const& history) {
     int const status = run.exitStatus();
     if (status >= 128) {
         return status;
@@ -49,7 +50,10 @@ int finalExitStatus(fleet::SurveyRun const& run, std::vector<std::string> const&
     if (!failures.empty()) {
         return fleet::gc_ExitCannotCreate;
     }
-    return listing.failure ? fleet::gc_ExitUnavailable : status;
+    if (listing.failure) {
+        return fleet::gc_ExitUnavailable;
+    }
+    return history.failure() ? fleet::gc_ExitHistoryNotRecorded : status;
 }
 
 // Who holds the result folder, as a second run reads it in the lock file.
@@ -119,24 +123,29 @@ report::RunSummary summaryOf(fleet::Options const& options, fleet::SurveyRun con
     return fleet::runSummary(facts, run.machines());
 }
 
-// The report first, then the summary, so that the summary's exit status
-// counts a report that could not be written. Returns what could not be
-// written, "cannot write PATH: reason" each.
+// The history first (the status files and traces are written by now), then
+// the report, which shows the run's changes, then the summary, so that the
+// summary's exit status counts a report that could not be written. Returns
+// what could not be written, "cannot write PATH: reason" each.
 std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::SurveyRun const& run,
-                                       RunClock const& clock,
-                                       fleet::MachineListing const& listing) {
+                                       RunClock const& clock, fleet::MachineListing const& listing,
+                                       fleet::RunHistory& history) {
     std::vector<std::string> failures = run.writeFailures();
     report::RunSummary summary = summaryOf(options, run, clock, listing);
-    // The report's copy of the summary tells the same exit status as the
-    // run, but for a report that cannot be written, which it cannot know.
-    summary.exitStatus = finalExitStatus(run, failures, listing);
+    // The history's and the report's copies of the summary tell the same
+    // exit status as the run, but for a file written after them, which they
+    // cannot know.
+    summary.exitStatus = finalExitStatus(run, failures, listing, history);
+    history.record(summary);
+    summary.history = history.member();
+    summary.exitStatus = finalExitStatus(run, failures, listing, history);
     if (!options.reportFolder.empty()) {
         if (std::optional<std::string> const failure =
                 report::writeRunReport(report::summaryDocument(summary), options.reportFolder)) {
             failures.push_back(*failure);
         }
     }
-    summary.exitStatus = finalExitStatus(run, failures, listing);
+    summary.exitStatus = finalExitStatus(run, failures, listing, history);
     try {
         if (!options.summaryFile.empty()) {
             util::writeFileAtomically(options.summaryFile,
@@ -148,12 +157,13 @@ std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::Sur
     return failures;
 }
 
-// The console's host name when the run writes a summary or report, asked in
+// The console's host name when the run writes a summary or report or records
+// its history (which knows a console by it), asked in
 // a child process once every unit of work has ended: the host name command
 // runs through system(), which ignores SIGINT in its caller meanwhile, and a
 // signal then must still reach the run. Asked here when no child can be made.
 std::string consoleHostFor(fleet::Options const& options) {
-    if (options.summaryFile.empty() && options.reportFolder.empty()) {
+    if (options.summaryFile.empty() && options.reportFolder.empty() && !options.recordHistory) {
         return {};
     }
     fleet::ChildProcess child([] { return Utility::get_HostName(); });
@@ -172,15 +182,16 @@ std::string consoleHostFor(fleet::Options const& options) {
 // makes them be written again saying so; once they are in place the
 // signals are held, and the run is finished.
 std::vector<std::string> finishRun(fleet::Options const& options, fleet::SurveyRun& run,
-                                   RunClock clock, fleet::MachineListing const& listing) {
+                                   RunClock clock, fleet::MachineListing const& listing,
+                                   fleet::RunHistory& history) {
     clock.consoleHost = consoleHostFor(options);
     run.noteSignal();
     int const signalSeen = run.interruptingSignal();
-    std::vector<std::string> failures = writeRunFiles(options, run, clock, listing);
+    std::vector<std::string> failures = writeRunFiles(options, run, clock, listing, history);
     fleet::holdSignals();
     run.noteSignal();
     if (run.interruptingSignal() != signalSeen) {
-        failures = writeRunFiles(options, run, clock, listing);
+        failures = writeRunFiles(options, run, clock, listing, history);
     }
     return failures;
 }
@@ -220,11 +231,16 @@ void printAfterBlocks(fleet::SurveyRun const& run, std::vector<std::string> cons
 }
 
 // What ends the run's standard error: the files that could not be written,
-// then, for a run stopped by SIGHUP or SIGPIPE, which nobody sends on
-// purpose (a closed terminal, a reader gone), why it stopped. SIGINT and
-// SIGTERM are asked for, and the summary records every one.
+// the history that could not be recorded, then, for a run stopped by SIGHUP
+// or SIGPIPE, which nobody sends on purpose (a closed terminal, a reader
+// gone), why it stopped. SIGINT and SIGTERM are asked for, and the summary
+// records every one.
 std::vector<std::string> closingMessages(fleet::SurveyRun const& run,
-                                         std::vector<std::string> messages) {
+                                         std::vector<std::string> messages,
+                                         fleet::RunHistory const& history) {
+    if (std::optional<std::string> const failure = history.failure()) {
+        messages.push_back(*failure);
+    }
     int const signalNumber = run.interruptingSignal();
     if (signalNumber == SIGHUP || signalNumber == SIGPIPE) {
         messages.push_back(std::string("stopped by ") + fleet::signalName(signalNumber));
@@ -273,9 +289,10 @@ int main(int argc, char** argv) {
     fleet::MachineListing const listing = machinesToSurvey(options);
     fleet::SurveyRun run(options, listing.identities);
     run.run();
-    std::vector<std::string> const failures = finishRun(options, run, clock, listing);
+    fleet::RunHistory history(options);
+    std::vector<std::string> const failures = finishRun(options, run, clock, listing, history);
     // Nothing the run started outlives it.
     fleet::endChildrenExcept({});
-    printAfterBlocks(run, closingMessages(run, failures), recapText(options, run, clock));
-    return finalExitStatus(run, failures, listing);
+    printAfterBlocks(run, closingMessages(run, failures, history), recapText(options, run, clock));
+    return finalExitStatus(run, failures, listing, history);
 }

@@ -116,6 +116,13 @@ std::string listingFailureText(ListingFailure const& failure) {
     return text + ": " + failure.message;
 }
 
+nlohmann::ordered_json listingFailureDocument(ListingFailure const& failure) {
+    return {
+        {"command", failure.command},
+        {"exit_status", failure.exitStatus ? nlohmann::ordered_json(*failure.exitStatus) : nullptr},
+        {"message", failure.message}};
+}
+
 } // namespace report
 
 namespace report {

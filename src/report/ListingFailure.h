@@ -37,6 +37,9 @@ std::string listingCommandInTrace(std::string const& trace);
 // A listing command of the trace that the time limit stopped.
 ListingFailure stoppedListing(std::string const& trace, unsigned int timeoutSeconds);
 
+// The summary's "listing_failure" object: command, exit_status, message.
+nlohmann::ordered_json listingFailureDocument(ListingFailure const& failure);
+
 // One line for an operator: "<command> exited with status N: <message>".
 std::string listingFailureText(ListingFailure const& failure);
 // The same for a summary's "listing_failure" object, read as a report reads

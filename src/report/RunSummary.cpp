@@ -64,17 +64,11 @@ Json partitionDocument(PartitionSummary const& partition) {
     return entry;
 }
 
-Json failureDocument(ListingFailure const& failure) {
-    return {{"command", failure.command},
-            {"exit_status", orNull(failure.exitStatus)},
-            {"message", failure.message}};
-}
-
 // Present only when the listing failed, after the keys every document has,
 // as "time_limit" is for a partition.
 void addListingFailure(Json& document, std::optional<ListingFailure> const& failure) {
     if (failure) {
-        document["listing_failure"] = failureDocument(*failure);
+        document["listing_failure"] = listingFailureDocument(*failure);
     }
 }
 
@@ -96,6 +90,16 @@ Json optionsDocument(SummaryOptions const& options) {
             {"identities", options.identities}};
 }
 
+Json historyDocument(std::optional<HistoryRecord> const& history) {
+    if (!history) {
+        return nullptr;
+    }
+    return {{"file", history->file},
+            {"run_id", orNull(history->runId)},
+            {"recorded", history->recorded},
+            {"error", orNull(history->error)}};
+}
+
 } // namespace
 
 Json summaryDocument(RunSummary const& summary) {
@@ -111,6 +115,7 @@ Json summaryDocument(RunSummary const& summary) {
                      {"interrupted", orNull(summary.interruptedBy)},
                      {"return_code", overallCode(summary.machines)},
                      {"exit_status", orNull(summary.exitStatus)},
+                     {"history", historyDocument(summary.history)},
                      {"totals", totalsOf(summary.machines)},
                      {"machines", arrayOf(summary.machines, &machineDocument)}};
     addListingFailure(document, summary.listingFailure);

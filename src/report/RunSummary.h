@@ -64,6 +64,16 @@ struct SummaryOptions {
     std::vector<std::string> identities;
 };
 
+// Where the run was recorded in the history database (docs/history.md).
+struct HistoryRecord {
+    std::string file;
+    // The run's id in the database once recorded.
+    std::optional<long long> runId;
+    bool recorded = false;
+    // Why it could not be recorded.
+    std::optional<std::string> error;
+};
+
 // Whole seconds when taken from file times, which have no fraction; else the
 // run's measured time.
 using ElapsedSeconds = std::variant<long long, double>;
@@ -84,6 +94,9 @@ struct RunSummary {
     // Set when the console's machine listing (--all) failed: the run then
     // has no machines.
     std::optional<ListingFailure> listingFailure;
+    // nullopt when the run keeps no history (--no-history, or a report read
+    // from files).
+    std::optional<HistoryRecord> history;
 };
 
 // The summary's document, its keys in the schema's order: counts per machine

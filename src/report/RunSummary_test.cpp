@@ -42,10 +42,11 @@ TEST(RunSummary, RunAndMachineKeysComeInTheSchemasOrder) {
     EXPECT_EQ(keysOf(document["machines"][0]),
               (std::vector<std::string>{"identity", "return_code", "status_file", "trace_file",
                                         "counts", "partitions"}));
-    EXPECT_EQ(keysOf(document), (std::vector<std::string>{
-                                    "schema_version", "tool", "version", "console_host", "started",
-                                    "ended", "elapsed_seconds", "options", "interrupted",
-                                    "return_code", "exit_status", "totals", "machines"}));
+    EXPECT_EQ(
+        keysOf(document),
+        (std::vector<std::string>{"schema_version", "tool", "version", "console_host", "started",
+                                  "ended", "elapsed_seconds", "options", "interrupted",
+                                  "return_code", "exit_status", "history", "totals", "machines"}));
 }
 
 TEST(RunSummary, UnknownPartitionFactsAreNullAndNoStopMeansNoTimeLimit) {
@@ -105,6 +106,24 @@ TEST(RunSummary, OptionsAndRunFactsUnknownToTheWriterAreNull) {
               document["options"].dump());
     EXPECT_EQ(nullptr, document["interrupted"]);
     EXPECT_EQ(nullptr, document["exit_status"]);
+}
+
+TEST(RunSummary, RunWithoutHistoryHasANullHistory) {
+    EXPECT_EQ("null", report::summaryDocument(report::RunSummary{})["history"].dump());
+}
+
+TEST(RunSummary, RecordedRunGivesItsFileAndId) {
+    report::RunSummary run;
+    run.history = report::HistoryRecord{"/var/lib/h.sqlite", 42, true, std::nullopt};
+    EXPECT_EQ(R"({"file":"/var/lib/h.sqlite","run_id":42,"recorded":true,"error":null})",
+              report::summaryDocument(run)["history"].dump());
+}
+
+TEST(RunSummary, RunNotRecordedGivesWhy) {
+    report::RunSummary run;
+    run.history = report::HistoryRecord{"/h.sqlite", std::nullopt, false, "locked"};
+    EXPECT_EQ(R"({"file":"/h.sqlite","run_id":null,"recorded":false,"error":"locked"})",
+              report::summaryDocument(run)["history"].dump());
 }
 
 TEST(RunSummary, TextReplacesBytesThatAreNotUtf8) {

@@ -25,4 +25,22 @@ TEST(LocalTime, OffsetOfTheLocalZone) {
         ::testing::ExitedWithCode(0), "");
 }
 
+TEST(LocalTime, TimeTextReadBackWithItsOffset) {
+    EXPECT_EQ(util::secondsOfTimeText("2023-11-14T23:13:20+01:00"), 1700000000);
+    EXPECT_EQ(util::secondsOfTimeText("2023-11-14T17:43:20-04:30"), 1700000000);
+    EXPECT_EQ(util::secondsOfTimeText("1970-01-01T00:00:00+00:00"), 0);
+}
+
+TEST(LocalTime, TimeTextOfTheLocalZoneReadBack) {
+    EXPECT_EQ(util::secondsOfTimeText(util::localTimeText(1700000000)), 1700000000);
+}
+
+TEST(LocalTime, TextOfAnotherFormHasNoTime) {
+    for (char const* text : {"", "2023-11-14", "2023-11-14T23:13:20", "2023-11-14T23:13:20Z",
+                             "2023-11-14T23:13:20+01:00 ", "2023-11-14 23:13:20+01:00",
+                             "2023-11-14T23:13:20*01:00", "x023-11-14T23:13:20+01:00"}) {
+        EXPECT_EQ(util::secondsOfTimeText(text), std::nullopt) << text;
+    }
+}
+
 } // namespace

@@ -40,6 +40,12 @@ constexpr char gc_Hang[] = "child-delay 3600\ndelay 3600\n";
 // A run that never ends within it was waiting for a hung console command.
 constexpr double gc_Bound = 30.0;
 constexpr char gc_BlockEnd[] = "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n";
+// The history database, in the sandbox's own state folder, is past a file
+// size limit of a few hundred bytes at its first page: named after the files
+// that could not be written, its exit status 74 outweighed by their 73.
+constexpr char gc_HistoryPastTheLimit[] =
+    "quorvex-survey: cannot record the run in "
+    "/var/lib/quorvex-survey/history.sqlite: disk I/O error\n";
 
 // The listing of a machine with partitions first..first+count-1, all active
 // or all inactive.
@@ -137,8 +143,10 @@ TEST_F(FleetOutputFiles, StatusFileAndSummaryThatCannotBeWrittenAreNamedAndEndWi
     // No partition was contacted: the block is the overall code alone.
     EXPECT_EQ(_stderr(), std::string(gc_BlockEnd) + "8\nquorvex-survey: cannot write " +
                              gc_StatusFile + ": File too large\nquorvex-survey: cannot write " +
-                             gc_TraceFile + ": File too large\nquorvex-survey: cannot write " +
-                             summary + ": File too large\n");
+                             gc_TraceFile + ": File too large
+quorvex-survey: cannot write " +
+                             summary + ": File too large
+" + gc_HistoryPastTheLimit);
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_VPD_Folder), std::vector<std::string>{})
         << "a cut status file or its temporary file was left";
     EXPECT_EQ(QuorvexTest::readFile(gc_TraceFile).size(), 1000U);
@@ -159,7 +167,7 @@ TEST_F(FleetOutputFiles, DefaultDocumentThatCannotBeWrittenIsNamedAndEndsWith73)
         "quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-1.VPD.xml";
     EXPECT_EQ(_stderr(), std::string("8\n") + gc_BlockEnd + "8\nquorvex-survey: cannot write " +
                              document + ": File too large\nquorvex-survey: cannot write " +
-                             summary + ": File too large\n");
+                             summary + ": File too large\n" + gc_HistoryPastTheLimit);
     EXPECT_EQ(QuorvexTest::readFile(document).size(), 1200u)
         << "the survey code leaves its document cut short under its name, as the tool does";
 }

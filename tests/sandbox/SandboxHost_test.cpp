@@ -33,7 +33,7 @@ constexpr char gc_Remedy[] =
 // The paths the sandbox provides; none may appear on the host.
 std::vector<std::string> const& _consolePaths() {
     static std::vector<std::string> const paths{"/var/adm", "/opt/vtc", "/opt/lsvtc",
-                                                "/usr/bin/runact-api"};
+                                                "/usr/bin/runact-api", "/var/lib/quorvex-survey"};
     return paths;
 }
 
@@ -128,7 +128,8 @@ TEST(SandboxHost, NothingAppearsOnTheHost) {
     }
     CommandResult const run =
         runInSandbox({}, {"sh", "-c",
-                          "touch /var/adm/quorvex/VPD/x /var/adm/quorvex/Trace/y /opt/vtc/bin/z && "
+                          "touch /var/adm/quorvex/VPD/x /var/adm/quorvex/Trace/y /opt/vtc/bin/z "
+                          "/var/lib/quorvex-survey/h && "
                           "/usr/bin/runact-api -c x >/dev/null; /opt/lsvtc/bin/lsvtc -t0"});
     if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
@@ -326,7 +327,8 @@ TEST(SandboxHost, ProotRefusesTmpSizeWithItsReason) {
 
 // A checkout in a folder only its owner may enter (a home folder) is out of
 // the unprivileged user's reach: the sandbox, its seccomp helper and the
-// simulator are copied into a folder that user may read.
+// simulator are copied into a folder that user may read. The state folder,
+// made under /var/lib where /var is already a layer, can be written.
 TEST(SandboxHost, UnprivilegedCallerGetsASandboxEvenFromAPrivateCheckout) {
     if (::geteuid() != 0 || !fileExists("/usr/bin/setpriv")) {
         GTEST_SKIP() << "needs root and setpriv to become an unprivileged user";
@@ -343,7 +345,8 @@ TEST(SandboxHost, UnprivilegedCallerGetsASandboxEvenFromAPrivateCheckout) {
     CommandResult const run =
         runCommand({"/usr/bin/setpriv", "--reuid=65534", "--regid=65534", "--clear-groups",
                     "/usr/bin/env", "-C", "/", sandbox, "--sim", simulator, "--", "sh", "-c",
-                    "test -d /var/adm/quorvex/VPD && test -x /usr/bin/runact-api"});
+                    "test -d /var/adm/quorvex/VPD && test -x /usr/bin/runact-api && "
+                    "touch /var/lib/quorvex-survey/history.sqlite"});
     if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }
@@ -372,6 +375,7 @@ TEST(SandboxHost, BadPathsAreUsageErrors) {
               _sandbox({"--bind", "/etc/hostname:relative", "--", "true"}).exitStatus);
     EXPECT_EQ(gc_ExitUsage, _sandbox({"--bind", "/etc/hostname", "--", "true"}).exitStatus);
     EXPECT_EQ(gc_ExitUsage, _sandbox({"--tmp-size"}).exitStatus);
+    EXPECT_EQ(gc_ExitUsage, _sandbox({"--state", "/nonexistent", "--", "true"}).exitStatus);
 }
 
 TEST(SandboxHost, ContradictoryFolderOptionsAreUsageErrors) {
@@ -385,9 +389,10 @@ TEST(SandboxHost, HelpDocumentsEveryOption) {
     EXPECT_EQ(0, run.exitStatus);
     for (char const* option :
          {"--sim PATH", "--vpd DIR", "--trace DIR", "--no-vpd-dir", "--no-trace-dir",
-          "--readonly-vpd", "--readonly-trace", "--readonly-tmp", "--tmp-size SIZE",
-          "--bind SRC:DST", "77", "120", "125", "QUORVEX_SANDBOX=namespace|proot",
-          "QUORVEX_SANDBOX_FAIL_MOUNT=PATH", "QUORVEX_SANDBOX_KIND"}) {
+          "--readonly-vpd", "--readonly-trace", "--readonly-tmp", "--tmp-size SIZE", "--state DIR",
+          "--readonly-state", "/var/lib/quorvex-survey", "--bind SRC:DST", "77", "120", "125",
+          "QUORVEX_SANDBOX=namespace|proot", "QUORVEX_SANDBOX_FAIL_MOUNT=PATH",
+          "QUORVEX_SANDBOX_KIND"}) {
         EXPECT_NE(std::string::npos, run.stdoutText.find(option)) << option;
     }
 }

@@ -193,6 +193,34 @@ TEST(Sandbox, VpdAndTraceOptionsBindHostFolders) {
     EXPECT_EQ("t", QuorvexTest::readFile(trace.file("b.Trace")));
 }
 
+// quorvex-survey records its runs there by default: a test or a demo run in
+// the sandbox never writes the host's.
+TEST(Sandbox, StateFolderIsFreshAndPrivate) {
+    QuorvexTest::writeFile("/var/lib/quorvex-survey/outer.sqlite", "outer");
+    CommandResult const run = _nested(
+        {}, "ls -A /var/lib/quorvex-survey; echo inner > /var/lib/quorvex-survey/inner.sqlite");
+    EXPECT_EQ("", run.stdoutText);
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_FALSE(fileExists("/var/lib/quorvex-survey/inner.sqlite"));
+    EXPECT_EQ("outer", QuorvexTest::readFile("/var/lib/quorvex-survey/outer.sqlite"));
+    ::unlink("/var/lib/quorvex-survey/outer.sqlite");
+}
+
+TEST(Sandbox, StateOptionBindsAHostFolder) {
+    QuorvexTest::TemporaryDirectory state;
+    CommandResult const run =
+        _nested({"--state", state.path()}, "printf h > /var/lib/quorvex-survey/history.sqlite");
+    EXPECT_EQ(0, run.exitStatus) << run.stderrText;
+    EXPECT_EQ("h", QuorvexTest::readFile(state.file("history.sqlite")));
+}
+
+TEST(Sandbox, ReadonlyStateRefusesWritesThere) {
+    CommandResult const run = _nested(
+        {"--readonly-state"}, "touch /var/lib/quorvex-survey/x; echo $?; touch /tmp/y; echo $?");
+    EXPECT_EQ("1\n0\n", run.stdoutText);
+    EXPECT_NE(std::string::npos, run.stderrText.find(_readonlyRefusal())) << run.stderrText;
+}
+
 TEST(Sandbox, BindReplacesAConsoleTool) {
     QuorvexTest::TemporaryDirectory folder;
     QuorvexTest::writeFile(folder.file("big-listing"),
