@@ -46,9 +46,14 @@ std::string baseName(std::string const& path) {
     return slash == std::string::npos ? path : path.substr(slash + 1);
 }
 
-std::unordered_set<std::string> knownHashes(SQLite::Database& db) {
+// The contents of the console's previous run: the documents that may not
+// have changed. A content held for other runs only is read again, and its
+// row is kept as it is.
+std::unordered_set<std::string> knownHashes(SQLite::Database& db, RunPair const& runs) {
     std::unordered_set<std::string> hashes;
-    SQLite::Statement select(db, "SELECT hash FROM documents");
+    SQLite::Statement select(db, "SELECT DISTINCT document_hash FROM partition_results"
+                                 " WHERE run_id = :previous AND document_hash IS NOT NULL");
+    bindRuns(select, runs);
     while (select.executeStep()) {
         hashes.insert(select.getColumn(0).getString());
     }
@@ -121,14 +126,15 @@ ChangeRecorder::ChangeRecorder(std::string documentFolder)
 
 void ChangeRecorder::record(SQLite::Database& db, long long runId) const {
     RunPair const runs = runPairOf(db, runId);
-    _readDocuments(db, runId);
+    _readDocuments(db, runs);
     recordPartitionStates(db, runs);
     insertMachineEvents(db, runs);
     insertPartitionEvents(db, runs);
     insertComponentEvents(db, runs);
 }
 
-void ChangeRecorder::_readDocuments(SQLite::Database& db, long long runId) const {
+void ChangeRecorder::_readDocuments(SQLite::Database& db, RunPair const& runs) const {
+    long long const runId = runs.run;
     std::vector<DocumentRow> rows;
     std::vector<std::string> paths;
     SQLite::Statement select(db, "SELECT machine, partition, document FROM partition_results"
@@ -138,15 +144,16 @@ void ChangeRecorder::_readDocuments(SQLite::Database& db, long long runId) const
         rows.push_back({select.getColumn(0).getString(), select.getColumn(1).getString()});
         paths.push_back(_documentFolder + "/" + baseName(select.getColumn(2).getString()));
     }
-    std::unordered_set<std::string> const known = knownHashes(db);
+    std::unordered_set<std::string> const known = knownHashes(db, runs);
     DocumentWriter writer(db, runId);
     DocumentIngest(known, readingThreads())
         .run(paths, [&](std::size_t index, DocumentIngestResult&& result) {
             writer.write(rows[index], std::move(result));
         });
-    SQLite::Statement settle(db, "UPDATE partition_results SET inventory = d.inventory,"
-                                 " inventory_problem = d.problem FROM documents AS d"
-                                 " WHERE run_id = ? AND d.hash = partition_results.document_hash");
+    SQLite::Statement settle(db, "UPDATE partition_results SET (inventory, inventory_problem) ="
+                                 " (SELECT inventory, problem FROM documents AS d"
+                                 "  WHERE d.hash = partition_results.document_hash)"
+                                 " WHERE run_id = ? AND document_hash IS NOT NULL");
     settle.bind(1, static_cast<std::int64_t>(runId));
     settle.exec();
 }

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "history/RunPair.h"
+
 #include <SQLiteCpp/Database.h>
 
 #include <string>
@@ -26,7 +28,7 @@ public:
 private:
     std::string _documentFolder;
 
-    void _readDocuments(SQLite::Database& db, long long runId) const;
+    void _readDocuments(SQLite::Database& db, RunPair const& runs) const;
 };
 
 } // namespace history

@@ -35,7 +35,7 @@ class DocumentIngest {
 public:
     using Delivery = std::function<void(std::size_t index, DocumentIngestResult&& result)>;
 
-    // knownHashes: the contents the history holds (not read again).
+    // knownHashes: contents held already, which are not read again.
     DocumentIngest(std::unordered_set<std::string> const& knownHashes, unsigned threads);
 
     // Calls deliver once per path, with the path's index, in any order.
