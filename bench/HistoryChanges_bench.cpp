@@ -54,11 +54,11 @@ void writeText(std::string const& path, std::string const& text) {
     }
 }
 
-std::string property(std::string const& indent, std::string const& keyword,
-                     std::string const& name, std::string const& value) {
+std::string property(std::string const& indent, std::string const& keyword, std::string const& name,
+                     std::string const& value) {
     return indent + "<Property displayName=\"" + name + "\" name=\"" + keyword + "\">\n" + indent +
-           "   " + keyword + "\n" + indent + "   <Value type=\"string\">" + value +
-           "</Value>\n" + indent + "</Property>\n";
+           "   " + keyword + "\n" + indent + "   <Value type=\"string\">" + value + "</Value>\n" +
+           indent + "</Property>\n";
 }
 
 std::string resource(std::string const& name, std::string const& id, std::string const& body) {
@@ -140,10 +140,12 @@ std::string document(int round, int machine, long long index) {
     return "<?xml version=\"1.0\" encoding=\"UTF-8\"?><com.zor.inventory version=\"1.0\">\n"
            "   <ResourceSet class=\"com.zor.inventory.Hardware\" timestamp=\"1700000000000\""
            " type=\"Hardware\" version=\"1.0\">\n"
-           "      <Resource displayName=\"" + system + "\" uniqueId=\"" + system + "\">\n" +
-           "         " + system + "\n         <ResourceList displayName=\"Partitions\">\n" +
+           "      <Resource displayName=\"" +
+           system + "\" uniqueId=\"" + system + "\">\n" + "         " + system +
+           "\n         <ResourceList displayName=\"Partitions\">\n" +
            "            <Resource displayName=\"" + host + "\" uniqueId=\"" + id + "\">\n" +
-           "               " + host + "\n" + partitionBody(host, id, variantOf(round, index), index) +
+           "               " + host + "\n" +
+           partitionBody(host, id, variantOf(round, index), index) +
            "            </Resource>\n         </ResourceList>\n      </Resource>\n"
            "   </ResourceSet>\n</com.zor.inventory>\n";
 }

@@ -237,7 +237,8 @@ void ScenarioParser::_parseDocumentReplacement(std::string const& value) {
     std::size_t const end = middle == std::string::npos ? middle : value.find(value[0], middle + 1);
     if (value.size() < 3 || end != value.size() - 1 || middle == 1) {
         _fail("document-replace takes /OLD/NEW/: a delimiter, a text to find, the delimiter, "
-              "its replacement and the delimiter, not \"" + value + "\"");
+              "its replacement and the delimiter, not \"" +
+              value + "\"");
     }
     if (!_response.document) {
         _fail("\"document-replace\" must follow the document it changes");

@@ -331,11 +331,10 @@ TEST_F(ScenarioFile, DocumentReplaceTakesAnyDelimiterAndAnEmptyReplacement) {
 
 TEST_F(ScenarioFile, DocumentReplaceOfASimulatedConsoleDocumentGivesANewSerialNumber) {
     std::string const documents = QuorvexTest::sourceRoot() + "/sim/scenarios/documents";
-    Response const response =
-        load("[getFileFromPartition 1]\ndocument-file " + documents +
-             "/aurora.VPD.xml\ndocument-replace /Y050BG52D018/Y050BG52D999/\n"
-             "document-replace /FW950.80/FW950.90/\n")
-            .find("getFileFromPartition", "1");
+    Response const response = load("[getFileFromPartition 1]\ndocument-file " + documents +
+                                   "/aurora.VPD.xml\ndocument-replace /Y050BG52D018/Y050BG52D999/\n"
+                                   "document-replace /FW950.80/FW950.90/\n")
+                                  .find("getFileFromPartition", "1");
     std::string expected = QuorvexTest::readFile(documents + "/aurora.VPD.xml");
     expected.replace(expected.find("Y050BG52D018"), 12, "Y050BG52D999");
     expected.replace(expected.find("FW950.80"), 8, "FW950.90");

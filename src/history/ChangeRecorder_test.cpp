@@ -38,7 +38,8 @@ std::string documentHead(std::string const& host) {
            " version=\"1.0\">\n"
            "<Resource displayName=\"M\" uniqueId=\"M\">\nM\n"
            "<ResourceList displayName=\"Partitions\">\n"
-           "<Resource displayName=\"" + host + "\" uniqueId=\"M-" + host + "\">\n" + host + "\n";
+           "<Resource displayName=\"" +
+           host + "\" uniqueId=\"M-" + host + "\">\n" + host + "\n";
 }
 
 std::string documentTail() {
@@ -124,8 +125,9 @@ protected:
 
     // A column of one partition result, "null" for none.
     std::string column(long long run, std::string const& partition, std::string const& name) {
-        SQLite::Statement select(_db, "SELECT " + name + " FROM partition_results"
-                                                         " WHERE run_id = ? AND partition = ?");
+        SQLite::Statement select(_db, "SELECT " + name +
+                                          " FROM partition_results"
+                                          " WHERE run_id = ? AND partition = ?");
         select.bind(1, static_cast<std::int64_t>(run));
         select.bind(2, partition);
         EXPECT_TRUE(select.executeStep());
@@ -247,7 +249,8 @@ TEST_F(HistoryChangeRecorder, InterruptedRunCarriesTheFailingStreakOn) {
     EXPECT_EQ("1", column(cut, "a", "last_surveyed_run"));
     EXPECT_EQ("2", column(cut, "b", "last_surveyed_run"));
     EXPECT_EQ("null", column(cut, "b", "failing_since_run"));
-    EXPECT_EQ((Lines{"partition still_failing M a 2 2"}), events(record({failing("a"), surveyed("b")})));
+    EXPECT_EQ((Lines{"partition still_failing M a 2 2"}),
+              events(record({failing("a"), surveyed("b")})));
 }
 
 TEST_F(HistoryChangeRecorder, InterruptedRunNeitherRecoversNorBreaksAStreak) {

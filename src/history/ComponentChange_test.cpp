@@ -10,7 +10,10 @@ using history::StoredComponent;
 
 StoredComponent adapter(std::string const& location, std::string const& serial,
                         std::string const& firmware = "1.0") {
-    return {'L', location, "ent-" + location, "Adapters",
+    return {'L',
+            location,
+            "ent-" + location,
+            "Adapters",
             {{"SN", "", serial}, {"FW", "", firmware}, {"YL", "", location}}};
 }
 

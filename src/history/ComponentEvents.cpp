@@ -18,17 +18,23 @@ namespace {
 // between compares with its last inventory).
 std::string changedDocuments() {
     return std::string() +
-    "SELECT machine, partition, before, after FROM (SELECT c.machine, c.partition,"
-    "  c.document_hash AS after,"
-    "  CASE WHEN p.inventory = '" + gc_InventoryRead + "' THEN p.document_hash ELSE (SELECT x.document_hash"
-    "    FROM partition_results AS x JOIN runs AS r ON r.id = x.run_id"
-    "    WHERE x.machine = c.machine AND x.partition = c.partition AND x.run_id < :run"
-    "      AND x.inventory = '" + gc_InventoryRead + "' AND r.console = :console"
-    "    ORDER BY x.run_id DESC LIMIT 1) END AS before"
-    " FROM partition_results AS c LEFT JOIN partition_results AS p"
-    "  ON p.run_id = :previous AND p.machine = c.machine AND p.partition = c.partition"
-    " WHERE c.run_id = :run AND c.inventory = '" + gc_InventoryRead + "')"
-    " WHERE before IS NOT NULL AND before <> after ORDER BY machine, partition";
+           "SELECT machine, partition, before, after FROM (SELECT c.machine, c.partition,"
+           "  c.document_hash AS after,"
+           "  CASE WHEN p.inventory = '" +
+           gc_InventoryRead +
+           "' THEN p.document_hash ELSE (SELECT x.document_hash"
+           "    FROM partition_results AS x JOIN runs AS r ON r.id = x.run_id"
+           "    WHERE x.machine = c.machine AND x.partition = c.partition AND x.run_id < :run"
+           "      AND x.inventory = '" +
+           gc_InventoryRead +
+           "' AND r.console = :console"
+           "    ORDER BY x.run_id DESC LIMIT 1) END AS before"
+           " FROM partition_results AS c LEFT JOIN partition_results AS p"
+           "  ON p.run_id = :previous AND p.machine = c.machine AND p.partition = c.partition"
+           " WHERE c.run_id = :run AND c.inventory = '" +
+           gc_InventoryRead +
+           "')"
+           " WHERE before IS NOT NULL AND before <> after ORDER BY machine, partition";
 }
 
 constexpr char gc_InsertEvent[] =

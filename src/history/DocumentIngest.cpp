@@ -109,8 +109,7 @@ void readAll(DocumentIngest const& ingest, std::vector<std::string> const& paths
 
 } // namespace
 
-DocumentIngest::DocumentIngest(std::unordered_set<std::string> const& knownHashes,
-                               unsigned threads)
+DocumentIngest::DocumentIngest(std::unordered_set<std::string> const& knownHashes, unsigned threads)
     : _knownHashes(knownHashes), _threads(threads == 0 ? 1 : threads) {}
 
 DocumentIngestResult DocumentIngest::ingest(std::string const& path) const {

@@ -15,13 +15,13 @@ namespace history {
 struct DocumentIngestResult {
     // The reading of a document the history does not hold yet.
     struct Reading {
-        std::string inventory;  // read, unreadable or default
+        std::string inventory; // read, unreadable or default
         std::optional<std::string> problem;
         std::string components; // encodeComponents()
     };
 
-    std::string hash;              // empty when the file could not be read
-    std::string readFailure;       // "cannot read PATH: <errno text>"
+    std::string hash;               // empty when the file could not be read
+    std::string readFailure;        // "cannot read PATH: <errno text>"
     std::optional<Reading> reading; // none for a content already held
 };
 

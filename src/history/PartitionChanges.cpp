@@ -46,21 +46,34 @@ std::string const& inactive() {
 
 std::string freshStates() {
     return "UPDATE partition_results SET"
-           " failing_since_run = CASE WHEN outcome IN " + failingOutcomes() + " THEN :run END,"
-           " runs_failing = CASE WHEN outcome IN " + failingOutcomes() + " THEN 1 END,"
-           " last_surveyed_run = CASE WHEN outcome = " + surveyed() + " THEN :run END"
+           " failing_since_run = CASE WHEN outcome IN " +
+           failingOutcomes() +
+           " THEN :run END,"
+           " runs_failing = CASE WHEN outcome IN " +
+           failingOutcomes() +
+           " THEN 1 END,"
+           " last_surveyed_run = CASE WHEN outcome = " +
+           surveyed() +
+           " THEN :run END"
            " WHERE run_id = :run";
 }
 
 std::string carriedStates() {
     return "UPDATE partition_results AS c SET"
-           " failing_since_run = CASE WHEN c.outcome IN " + failingOutcomes() +
+           " failing_since_run = CASE WHEN c.outcome IN " +
+           failingOutcomes() +
            "   THEN coalesce(p.failing_since_run, :run)"
-           "   WHEN c.outcome = " + interrupted() + " THEN p.failing_since_run END,"
-           " runs_failing = CASE WHEN c.outcome IN " + failingOutcomes() +
+           "   WHEN c.outcome = " +
+           interrupted() +
+           " THEN p.failing_since_run END,"
+           " runs_failing = CASE WHEN c.outcome IN " +
+           failingOutcomes() +
            "   THEN coalesce(p.runs_failing, 0) + 1"
-           "   WHEN c.outcome = " + interrupted() + " THEN p.runs_failing END,"
-           " last_surveyed_run = CASE WHEN c.outcome = " + surveyed() +
+           "   WHEN c.outcome = " +
+           interrupted() +
+           " THEN p.runs_failing END,"
+           " last_surveyed_run = CASE WHEN c.outcome = " +
+           surveyed() +
            "   THEN :run ELSE p.last_surveyed_run END"
            " FROM partition_results AS p"
            " WHERE c.run_id = :run AND p.run_id = :previous"
@@ -92,7 +105,8 @@ void insertMachineEvents(SQLite::Database& db, RunPair const& runs) {
     if (!runs.previous) {
         return;
     }
-    executeForRuns(db,
+    executeForRuns(
+        db,
         "INSERT INTO events (run_id, scope, kind, machine)"
         " SELECT :run, 'machine', kind, machine FROM ("
         "  SELECT c.machine, 'appeared' AS kind, 0 AS rank FROM machine_results AS c"
@@ -122,10 +136,13 @@ std::string partitionPairs() {
     return "WITH pairs AS (SELECT c.machine, c.partition, c.outcome, c.reason,"
            "  c.failing_since_run, c.runs_failing, p.partition IS NOT NULL AS known,"
            "  p.failing_since_run AS was_failing_since,"
-           "  CASE WHEN p.outcome = " + interrupted() + " THEN (SELECT x.outcome"
+           "  CASE WHEN p.outcome = " +
+           interrupted() +
+           " THEN (SELECT x.outcome"
            "    FROM partition_results AS x JOIN runs AS r ON r.id = x.run_id"
            "    WHERE x.machine = c.machine AND x.partition = c.partition AND x.run_id < :run"
-           "      AND r.console = :console AND x.outcome <> " + interrupted() +
+           "      AND r.console = :console AND x.outcome <> " +
+           interrupted() +
            "    ORDER BY x.run_id DESC LIMIT 1) ELSE p.outcome END AS was_outcome"
            " FROM partition_results AS c LEFT JOIN partition_results AS p"
            "  ON p.run_id = :previous AND p.machine = c.machine AND p.partition = c.partition"
@@ -143,23 +160,38 @@ std::string partitionEvents() {
     std::string const columns = "machine, partition, outcome, reason, ";
     return partitionPairs() +
            "SELECT :run, 'partition', kind, machine, partition, outcome, reason, since, count"
-           " FROM (SELECT " + columns + "NULL AS since, NULL AS count, 'appeared' AS kind,"
+           " FROM (SELECT " +
+           columns +
+           "NULL AS since, NULL AS count, 'appeared' AS kind,"
            "  0 AS rank FROM pairs WHERE NOT known AND machine NOT IN " +
-           listingFailedIn(":previous") +
-           " UNION ALL SELECT " + columns + "failing_since_run, runs_failing, 'newly_failing', 1"
-           "  FROM pairs WHERE outcome IN " + failingOutcomes() + " AND runs_failing = 1"
-           " UNION ALL SELECT " + columns + "failing_since_run, runs_failing, 'still_failing', 2"
-           "  FROM pairs WHERE outcome IN " + failingOutcomes() + " AND runs_failing > 1"
-           " UNION ALL SELECT " + columns + "NULL, NULL, 'recovered', 3"
-           "  FROM pairs WHERE outcome = " + surveyed() + " AND was_failing_since IS NOT NULL"
-           " UNION ALL SELECT " + columns + "NULL, NULL, 'newly_inactive', 4"
-           "  FROM pairs WHERE outcome = " + inactive() + " AND was_outcome IS NOT " + inactive() +
+           listingFailedIn(":previous") + " UNION ALL SELECT " + columns +
+           "failing_since_run, runs_failing, 'newly_failing', 1"
+           "  FROM pairs WHERE outcome IN " +
+           failingOutcomes() +
+           " AND runs_failing = 1"
+           " UNION ALL SELECT " +
+           columns +
+           "failing_since_run, runs_failing, 'still_failing', 2"
+           "  FROM pairs WHERE outcome IN " +
+           failingOutcomes() +
+           " AND runs_failing > 1"
+           " UNION ALL SELECT " +
+           columns +
+           "NULL, NULL, 'recovered', 3"
+           "  FROM pairs WHERE outcome = " +
+           surveyed() +
+           " AND was_failing_since IS NOT NULL"
+           " UNION ALL SELECT " +
+           columns +
+           "NULL, NULL, 'newly_inactive', 4"
+           "  FROM pairs WHERE outcome = " +
+           inactive() + " AND was_outcome IS NOT " + inactive() +
            " UNION ALL SELECT p.machine, p.partition, NULL, NULL, NULL, NULL, 'disappeared', 5"
            "  FROM partition_results AS p WHERE p.run_id = :previous"
            "   AND NOT EXISTS (SELECT 1 FROM partition_results AS c WHERE c.run_id = :run"
            "     AND c.machine = p.machine AND c.partition = p.partition)"
-           "   AND p.machine NOT IN " + listingFailedIn(":run") +
-           ") ORDER BY machine, partition, rank";
+           "   AND p.machine NOT IN " +
+           listingFailedIn(":run") + ") ORDER BY machine, partition, rank";
 }
 
 } // namespace
@@ -170,7 +202,8 @@ void insertPartitionEvents(SQLite::Database& db, RunPair const& runs) {
     }
     executeForRuns(db,
                    "INSERT INTO events (run_id, scope, kind, machine, partition, outcome, reason,"
-                   " failing_since_run, runs_failing) " + partitionEvents(),
+                   " failing_since_run, runs_failing) " +
+                       partitionEvents(),
                    runs);
 }
 

@@ -28,9 +28,8 @@ TEST(HistoryStoredComponent, EncodesOneLinePerComponentAndProperty) {
 
 TEST(HistoryStoredComponent, ControlCharactersAndBackslashesReadBackExactly) {
     std::string const value = "a\tb\nc\r\\d\\t";
-    std::vector<inventory::Component> const components{
-        component({inventory::ComponentKey::Kind::UniqueId, "u\n1", 1}, "n\\t",
-                  {{"SN", "", value, "g\t"}})};
+    std::vector<inventory::Component> const components{component(
+        {inventory::ComponentKey::Kind::UniqueId, "u\n1", 1}, "n\\t", {{"SN", "", value, "g\t"}})};
     std::vector<StoredComponent> const read = decodeComponents(encodeComponents(components));
     ASSERT_EQ(1u, read.size());
     EXPECT_EQ('U', read[0].keyKind);
@@ -49,8 +48,8 @@ TEST(HistoryStoredComponent, NoComponentsIsEmptyText) {
 }
 
 TEST(HistoryStoredComponent, DisplayNameKeyKindIsD) {
-    std::vector<StoredComponent> const read = decodeComponents(
-        encodeComponents({component({inventory::ComponentKey::Kind::DisplayName, "x", 1}, "x", {})}));
+    std::vector<StoredComponent> const read = decodeComponents(encodeComponents(
+        {component({inventory::ComponentKey::Kind::DisplayName, "x", 1}, "x", {})}));
     ASSERT_EQ(1u, read.size());
     EXPECT_EQ('D', read[0].keyKind);
 }
