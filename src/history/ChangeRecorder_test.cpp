@@ -159,7 +159,7 @@ private:
             insert.bind(1, static_cast<std::int64_t>(run));
             insert.bind(2, machine);
             insert.bind(3, "8");
-            insert.bind(4, "{\"command\":\"lspartition\"}");
+            insert.bind(4, R"({"command":"lspartition"})");
             insert.exec();
             insert.reset();
         }
@@ -456,6 +456,7 @@ TEST_F(HistoryChangeRecorder, PartitionsWithTheSameDocumentShareOneRow) {
 
 TEST_F(HistoryChangeRecorder, ManyDocumentsAreReadOnSeveralThreadsIntoTheSameRecord) {
     std::vector<Partition> partitions;
+    partitions.reserve(300);
     for (int index = 0; index < 300; ++index) {
         partitions.push_back(surveyed("p" + std::to_string(index), "FW" + std::to_string(index)));
     }
