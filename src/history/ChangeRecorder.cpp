@@ -10,6 +10,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <optional>
 #include <stdexcept>
 #include <thread>
 #include <unordered_set>
@@ -71,51 +72,75 @@ public:
     DocumentWriter(SQLite::Database& db, long long runId)
         : _insertDocument(db, "INSERT OR IGNORE INTO documents (hash, inventory, problem,"
                               " components) VALUES (?, ?, ?, ?)"),
-          _setHash(db, "UPDATE partition_results SET document_hash = ?"
-                       " WHERE run_id = ? AND machine = ? AND partition = ?"),
+          _setRead(db, "UPDATE partition_results SET document_hash = ?5, inventory = ?6,"
+                       " inventory_problem = ?7"
+                       " WHERE run_id = ?2 AND machine = ?3 AND partition = ?4"),
+          _setKnown(db, "UPDATE partition_results SET document_hash = ?5,"
+                        " (inventory, inventory_problem) = (SELECT inventory, problem"
+                        "  FROM documents WHERE hash = ?5)"
+                        " WHERE run_id = ?2 AND machine = ?3 AND partition = ?4"),
           _setMissing(db, std::string("UPDATE partition_results SET inventory = '") +
                               gc_InventoryMissing +
-                              "', inventory_problem = ?"
-                              " WHERE run_id = ? AND machine = ? AND partition = ?"),
+                              "', inventory_problem = ?5"
+                              " WHERE run_id = ?2 AND machine = ?3 AND partition = ?4"),
           _runId(runId) {}
 
+    // A content read now gives the partition's inventory at once; one held
+    // already takes it from its row.
     void write(DocumentRow const& row, DocumentIngestResult&& result) {
         if (result.hash.empty()) {
-            _update(_setMissing, row, result.readFailure);
+            _bindRow(_setMissing, row);
+            _setMissing.bind(5, result.readFailure);
+            _execute(_setMissing);
             return;
         }
-        if (result.reading) {
-            _insert(result);
+        if (!result.reading) {
+            _bindRow(_setKnown, row);
+            _setKnown.bind(5, result.hash);
+            _execute(_setKnown);
+            return;
         }
-        _update(_setHash, row, result.hash);
+        _insert(result);
+        _bindRow(_setRead, row);
+        _setRead.bind(5, result.hash);
+        _setRead.bind(6, result.reading->inventory);
+        _bindProblem(_setRead, 7, result.reading->problem);
+        _execute(_setRead);
     }
 
 private:
     SQLite::Statement _insertDocument;
-    SQLite::Statement _setHash;
+    SQLite::Statement _setRead;
+    SQLite::Statement _setKnown;
     SQLite::Statement _setMissing;
     long long _runId;
 
     void _insert(DocumentIngestResult const& result) {
         _insertDocument.bind(1, result.hash);
         _insertDocument.bind(2, result.reading->inventory);
-        if (result.reading->problem) {
-            _insertDocument.bind(3, *result.reading->problem);
-        } else {
-            _insertDocument.bind(3);
-        }
+        _bindProblem(_insertDocument, 3, result.reading->problem);
         _insertDocument.bindNoCopy(4, result.reading->components);
-        _insertDocument.exec();
-        _insertDocument.reset();
+        _execute(_insertDocument);
     }
 
-    void _update(SQLite::Statement& update, DocumentRow const& row, std::string const& value) {
-        update.bind(1, value);
+    void _bindRow(SQLite::Statement& update, DocumentRow const& row) {
         update.bind(2, static_cast<std::int64_t>(_runId));
         update.bind(3, row.machine);
         update.bind(4, row.partition);
-        update.exec();
-        update.reset();
+    }
+
+    static void _bindProblem(SQLite::Statement& statement, int index,
+                             std::optional<std::string> const& problem) {
+        if (problem) {
+            statement.bind(index, *problem);
+        } else {
+            statement.bind(index);
+        }
+    }
+
+    static void _execute(SQLite::Statement& statement) {
+        statement.exec();
+        statement.reset();
     }
 };
 
@@ -150,12 +175,6 @@ void ChangeRecorder::_readDocuments(SQLite::Database& db, RunPair const& runs) c
         .run(paths, [&](std::size_t index, DocumentIngestResult&& result) {
             writer.write(rows[index], std::move(result));
         });
-    SQLite::Statement settle(db, "UPDATE partition_results SET (inventory, inventory_problem) ="
-                                 " (SELECT inventory, problem FROM documents AS d"
-                                 "  WHERE d.hash = partition_results.document_hash)"
-                                 " WHERE run_id = ? AND document_hash IS NOT NULL");
-    settle.bind(1, static_cast<std::int64_t>(runId));
-    settle.exec();
 }
 
 } // namespace history
