@@ -115,6 +115,10 @@ void ScenarioParser::_parseLine(std::string const& line) {
         _parseMisbehaviour(value);
         return;
     }
+    if (key == "document-replace") {
+        _parseDocumentReplacement(value);
+        return;
+    }
     _parseText(key, value);
 }
 
@@ -222,6 +226,32 @@ void ScenarioParser::_parseMisbehaviour(std::string const& value) {
     _response.misbehaviours.insert(name);
 }
 
+// "document-replace /OLD/NEW/": the first character delimits OLD and NEW,
+// so that one document file serves runs that differ in a serial number or a
+// code level. Every occurrence in the document given so far is replaced.
+void ScenarioParser::_parseDocumentReplacement(std::string const& value) {
+    if (_tool != "getFileFromPartition") {
+        _fail("\"document-replace\" belongs in a [getFileFromPartition ...] section");
+    }
+    std::size_t const middle = value.empty() ? std::string::npos : value.find(value[0], 1);
+    std::size_t const end = middle == std::string::npos ? middle : value.find(value[0], middle + 1);
+    if (value.size() < 3 || end != value.size() - 1 || middle == 1) {
+        _fail("document-replace takes /OLD/NEW/: a delimiter, a text to find, the delimiter, "
+              "its replacement and the delimiter, not \"" +
+              value + "\"");
+    }
+    if (!_response.document) {
+        _fail("\"document-replace\" must follow the document it changes");
+    }
+    std::string const old = value.substr(1, middle - 1);
+    std::string const replacement = value.substr(middle + 1, end - middle - 1);
+    std::string& document = *_response.document;
+    for (std::size_t at = document.find(old); at != std::string::npos;
+         at = document.find(old, at + replacement.size())) {
+        document.replace(at, old.size(), replacement);
+    }
+}
+
 void ScenarioParser::_parseText(std::string const& key, std::string const& value) {
     std::size_t const dash = key.find('-');
     std::string const streamName = key.substr(0, dash);
@@ -233,8 +263,8 @@ void ScenarioParser::_parseText(std::string const& key, std::string const& value
         stream = Stream::Document;
     } else if (streamName != "stdout") {
         _fail("unknown key \"" + key +
-              "\" (expected stdout, stderr, document, their -nolf and -file forms, exit, delay, "
-              "child-delay, daemon-delay or misbehave)");
+              "\" (expected stdout, stderr, document, their -nolf and -file forms, "
+              "document-replace, exit, delay, child-delay, daemon-delay or misbehave)");
     }
     if (formName != "" && formName != "nolf" && formName != "file") {
         _fail("unknown key \"" + key + "\" (a text key ends in nothing, -nolf or -file)");

@@ -29,6 +29,7 @@ private:
     void _parseChildDelay(std::string const& value);
     void _parseDaemonDelay(std::string const& value);
     void _parseMisbehaviour(std::string const& value);
+    void _parseDocumentReplacement(std::string const& value);
     double _parseSeconds(std::string const& key, std::string const& value);
     void _parseText(std::string const& key, std::string const& value);
     void _requireOnce(std::string const& key);

@@ -160,7 +160,7 @@ TEST_F(ScenarioFile, ErrorNamesFileLineAndProblem) {
     EXPECT_EQ(
         path() +
             ":3: unknown key \"stdot\" (expected stdout, stderr, document, their -nolf and -file "
-            "forms, exit, delay, child-delay, daemon-delay or misbehave)",
+            "forms, document-replace, exit, delay, child-delay, daemon-delay or misbehave)",
         error.describe());
 }
 
@@ -310,6 +310,50 @@ TEST_F(ScenarioFile, ShippedScenariosAreValid) {
     for (char const* name :
          {"demo.scn", "empty.scn", "several-machines.scn", "slow.scn", "odd-output.scn"}) {
         EXPECT_NO_THROW(Scenario::load(QuorvexTest::shippedScenario(name))) << name;
+    }
+}
+
+TEST_F(ScenarioFile, DocumentReplaceChangesEveryOccurrenceInTheDocumentSoFar) {
+    Response const response = load("[getFileFromPartition 3]\ndocument <SN>Y050</SN> Y050\n"
+                                   "document-replace /Y050/Y0501/\ndocument Y050\n")
+                                  .find("getFileFromPartition", "3");
+    ASSERT_TRUE(response.document);
+    EXPECT_EQ("<SN>Y0501</SN> Y0501\nY050\n", *response.document);
+}
+
+TEST_F(ScenarioFile, DocumentReplaceTakesAnyDelimiterAndAnEmptyReplacement) {
+    Response const response =
+        load("[getFileFromPartition 3]\ndocument a/b c\ndocument-replace |a/b| |\n"
+             "document-replace #c##\n")
+            .find("getFileFromPartition", "3");
+    EXPECT_EQ("  \n", *response.document);
+}
+
+TEST_F(ScenarioFile, DocumentReplaceOfASimulatedConsoleDocumentGivesANewSerialNumber) {
+    std::string const documents = QuorvexTest::sourceRoot() + "/sim/scenarios/documents";
+    Response const response = load("[getFileFromPartition 1]\ndocument-file " + documents +
+                                   "/aurora.VPD.xml\ndocument-replace /Y050BG52D018/Y050BG52D999/\n"
+                                   "document-replace /FW950.80/FW950.90/\n")
+                                  .find("getFileFromPartition", "1");
+    std::string expected = QuorvexTest::readFile(documents + "/aurora.VPD.xml");
+    expected.replace(expected.find("Y050BG52D018"), 12, "Y050BG52D999");
+    expected.replace(expected.find("FW950.80"), 8, "FW950.90");
+    EXPECT_EQ(expected, *response.document);
+}
+
+TEST_F(ScenarioFile, DocumentReplaceIsRefusedWhereItCannotApply) {
+    EXPECT_EQ("\"document-replace\" belongs in a [getFileFromPartition ...] section",
+              errorOf("[runCmdOnPartition 1]\ndocument-replace /a/b/\n").problem);
+    EXPECT_EQ("\"document-replace\" must follow the document it changes",
+              errorOf("[getFileFromPartition 1]\ndocument-replace /a/b/\n").problem);
+    for (char const* value : {"", "/", "/a", "/a/b", "//b/", "/a/b/c", "/a/b//"}) {
+        EXPECT_EQ(std::string("document-replace takes /OLD/NEW/: a delimiter, a text to find, the "
+                              "delimiter, its replacement and the delimiter, not \"") +
+                      value + "\"",
+                  errorOf(std::string("[getFileFromPartition 1]\ndocument x\ndocument-replace ") +
+                          value + "\n")
+                      .problem)
+            << value;
     }
 }
 

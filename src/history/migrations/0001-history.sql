@@ -80,3 +80,34 @@ CREATE TABLE events (
 );
 CREATE INDEX events_by_run ON events (run_id, scope, kind);
 CREATE INDEX events_by_partition ON events (machine, partition, run_id);
+
+-- The VPD documents the runs read (docs/history.md, "Inventory"), one row per
+-- distinct content: partitions whose document did not change share the row,
+-- and a document already stored is neither read into components nor stored
+-- again. "hash" is the document's content hash, as in
+-- partition_results.document_hash.
+CREATE TABLE documents (
+    id         INTEGER PRIMARY KEY,
+    hash       TEXT    NOT NULL UNIQUE,
+    inventory  TEXT    NOT NULL,  -- read, unreadable or default
+    problem    TEXT,              -- "document unreadable at line L: reason"
+    components TEXT    NOT NULL   -- every component read, encoded as docs/history.md says
+);
+CREATE INDEX partition_results_by_document ON partition_results (document_hash);
+
+-- A document no partition result refers to any more goes with the last one
+-- (runs deleted by "history prune" take their partition results with them).
+CREATE TRIGGER documents_unreferenced AFTER DELETE ON partition_results
+WHEN OLD.document_hash IS NOT NULL
+BEGIN
+    DELETE FROM documents
+     WHERE hash = OLD.document_hash
+       AND NOT EXISTS (SELECT 1 FROM partition_results WHERE document_hash = OLD.document_hash);
+END;
+CREATE TRIGGER documents_unreferenced_by_update AFTER UPDATE OF document_hash ON partition_results
+WHEN OLD.document_hash IS NOT NULL AND OLD.document_hash IS NOT NEW.document_hash
+BEGIN
+    DELETE FROM documents
+     WHERE hash = OLD.document_hash
+       AND NOT EXISTS (SELECT 1 FROM partition_results WHERE document_hash = OLD.document_hash);
+END;
