@@ -1,0 +1,87 @@
+#include "history/HistoryFile.h"
+
+#include "HistoryFixture.h"
+#include "QuorvexTest.h"
+#include "history/UnusableHistory.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+using QuorvexTest::TemporaryDirectory;
+
+// The message and exit status opening path for reading fails with.
+std::pair<std::string, int> refusal(std::string const& path) {
+    try {
+        history::openHistoryForReading(path);
+    } catch (history::UnusableHistory const& failure) {
+        return {failure.what(), failure.exitStatus()};
+    }
+    return {"", 0};
+}
+
+TEST(HistoryFile, OpensAHistoryOfTheKnownSchema) {
+    QuorvexTest::ExampleHistory example;
+    SQLite::Database database = history::openHistoryForReading(example.path());
+    EXPECT_EQ(database.execAndGet("SELECT count(*) FROM runs").getInt(), 5);
+}
+
+TEST(HistoryFile, AMissingFileIsNoInput) {
+    TemporaryDirectory folder;
+    std::string const path = folder.file("none.sqlite");
+    EXPECT_EQ(refusal(path),
+              std::make_pair("cannot read " + path + ": No such file or directory", 66));
+    EXPECT_FALSE(QuorvexTest::fileExists(path));
+}
+
+TEST(HistoryFile, ADatabaseOfAnotherProgramIsADataError) {
+    TemporaryDirectory folder;
+    std::string const path = folder.file("other.sqlite");
+    SQLite::Database(path, SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE)
+        .exec("CREATE TABLE runs (id INTEGER)");
+    EXPECT_EQ(refusal(path),
+              std::make_pair(path + " is not a quorvex-survey history database", 65));
+}
+
+TEST(HistoryFile, RandomBytesAreADataError) {
+    TemporaryDirectory folder;
+    std::string const path = folder.file("noise.sqlite");
+    std::string noise;
+    for (int i = 0; i < 4096; ++i) {
+        noise += static_cast<char>((i * 7919 + 13) % 251);
+    }
+    QuorvexTest::writeFile(path, noise);
+    EXPECT_EQ(refusal(path),
+              std::make_pair(path + " is not a readable history database: file is not a database",
+                             65));
+}
+
+TEST(HistoryFile, ANewerSchemaIsADataErrorThatSaysWhichVersion) {
+    TemporaryDirectory folder;
+    std::string const path = folder.file("newer.sqlite");
+    QuorvexTest::HistoryFixture(path).database().exec("PRAGMA user_version = 2");
+    EXPECT_EQ(refusal(path),
+              std::make_pair(path + " has schema version 2, newer than this program reads (1): "
+                                    "use the quorvex-survey that wrote it",
+                             65));
+}
+
+TEST(HistoryFile, AFileMarkedOursWithoutSchemaIsADataError) {
+    TemporaryDirectory folder;
+    std::string const path = folder.file("empty.sqlite");
+    SQLite::Database(path, SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE)
+        .exec("PRAGMA application_id = " + std::to_string(history::gc_HistoryApplicationId));
+    EXPECT_EQ(refusal(path),
+              std::make_pair(path + " holds no history yet (schema version 0)", 65));
+}
+
+TEST(HistoryFile, ReadingLeavesTheFileUnchanged) {
+    QuorvexTest::ExampleHistory example;
+    std::string const before = QuorvexTest::readFile(example.path());
+    history::openHistoryForReading(example.path()).exec("SELECT count(*) FROM events");
+    EXPECT_EQ(QuorvexTest::readFile(example.path()), before);
+    EXPECT_THROW(history::openHistoryForReading(example.path()).exec("DELETE FROM runs"),
+                 SQLite::Exception);
+}
+
+} // namespace
