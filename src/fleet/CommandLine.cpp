@@ -306,7 +306,12 @@ void readCommandLine(CLI::App& app, CLI::App const& reportCommand, ParsedCommand
     }
     parsed.reportRequest.reset();
     if (historyCommand.parsed()) {
-        refuseLeftOver(refusingCommand(historyCommand));
+        // A word left over without an action is the action mistyped,
+        // which the check names.
+        CLI::App const& action = refusingCommand(historyCommand);
+        if (&action != &historyCommand) {
+            refuseLeftOver(action);
+        }
         history::checkHistoryRequest(historyCommand, *parsed.historyRequest);
         refuseLeftOver(historyCommand);
         return;

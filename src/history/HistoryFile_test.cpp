@@ -5,6 +5,10 @@
 #include "history/UnusableHistory.h"
 
 #include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <iostream>
 
 namespace {
 
@@ -82,6 +86,34 @@ TEST(HistoryFile, ReadingLeavesTheFileUnchanged) {
     EXPECT_EQ(QuorvexTest::readFile(example.path()), before);
     EXPECT_THROW(history::openHistoryForReading(example.path()).exec("DELETE FROM runs"),
                  SQLite::Exception);
+}
+
+} // namespace
+
+namespace {
+
+// The user root reads a file whatever its mode: the refused reading runs in
+// a child as the unprivileged user nobody.
+constexpr uid_t gc_Nobody = 65534;
+
+TEST(HistoryFile, AnUnreadableFileIsNoInputSaidWithErrnosText) {
+    QuorvexTest::ExampleHistory example;
+    std::filesystem::permissions(std::filesystem::path(example.path()).parent_path(),
+                                 std::filesystem::perms::owner_all |
+                                     std::filesystem::perms::others_read |
+                                     std::filesystem::perms::others_exec);
+    std::filesystem::permissions(example.path(), std::filesystem::perms::owner_read |
+                                                     std::filesystem::perms::owner_write);
+    QuorvexTest::CommandResult const result = QuorvexTest::runInChild([&] {
+        if (geteuid() == 0 && (setgid(gc_Nobody) != 0 || setuid(gc_Nobody) != 0)) {
+            return 2;
+        }
+        auto const [message, status] = refusal(example.path());
+        std::cout << status << " " << message;
+        return 0;
+    });
+    EXPECT_EQ(0, result.exitStatus) << result.stderrText;
+    EXPECT_EQ("66 cannot read " + example.path() + ": Permission denied", result.stdoutText);
 }
 
 } // namespace
