@@ -22,8 +22,27 @@ using Json = nlohmann::ordered_json;
 
 constexpr int gc_EventColumnCount = static_cast<int>(std::size(gc_EventKeys));
 
-// One event as read, every column by its key.
-using Event = std::map<std::string, Json>;
+// The columns of an event, in gc_EventKeys' order.
+enum EventColumn : std::size_t {
+    Run,
+    Console,
+    Scope,
+    Kind,
+    Machine,
+    Partition,
+    Component,
+    ComponentName,
+    Property,
+    OldValue,
+    NewValue,
+    Outcome,
+    Reason,
+    FailingSinceRun,
+    RunsFailing
+};
+
+// One event as read, its values in gc_EventKeys' order.
+using Event = std::array<Json, std::size(gc_EventKeys)>;
 
 // A group of events: its key in the JSON form, its title, and which
 // events it takes (scope "" for any scope, kind "" for any kind).
@@ -47,15 +66,15 @@ constexpr std::array<EventGroup, 8> gc_Groups{{
 }};
 
 bool belongs(EventGroup const& group, Event const& event) {
-    std::string const scope = event.at("scope").get<std::string>();
-    std::string const kind = event.at("kind").get<std::string>();
+    std::string const& scope = event[Scope].get_ref<std::string const&>();
+    std::string const& kind = event[Kind].get_ref<std::string const&>();
     bool const scopeFits = *group.scope == '\0' || scope == group.scope;
     bool const kindFits = *group.kind == '\0' || kind == group.kind || kind == group.otherKind;
     return scopeFits && kindFits;
 }
 
-std::string text(Event const& event, char const* key) {
-    Json const& value = event.at(key);
+std::string text(Event const& event, EventColumn column) {
+    Json const& value = event[column];
     if (value.is_null()) {
         return "";
     }
@@ -94,7 +113,7 @@ std::vector<Event> readEvents(SQLite::Database& database, std::vector<long long>
         while (query.executeStep()) {
             Event event;
             for (int i = 0; i < gc_EventColumnCount; ++i) {
-                event[gc_EventKeys[i]] = jsonValue(query.getColumn(i));
+                event[static_cast<std::size_t>(i)] = jsonValue(query.getColumn(i));
             }
             events.push_back(std::move(event));
         }
@@ -107,13 +126,13 @@ std::vector<Event> readEvents(SQLite::Database& database, std::vector<long long>
 std::vector<Event> latestStillFailing(std::vector<Event> const& events) {
     std::map<std::tuple<std::string, std::string, std::string>, Event> latest;
     for (Event const& event : events) {
-        latest[{text(event, "console"), text(event, "machine"), text(event, "partition")}] = event;
+        latest[{text(event, Console), text(event, Machine), text(event, Partition)}] = event;
     }
     std::vector<Event> kept;
     std::transform(latest.begin(), latest.end(), std::back_inserter(kept),
                    [](auto const& entry) { return entry.second; });
     std::stable_sort(kept.begin(), kept.end(), [](Event const& a, Event const& b) {
-        return a.at("run").get<long long>() < b.at("run").get<long long>();
+        return a[Run].get<long long>() < b[Run].get<long long>();
     });
     return kept;
 }
@@ -137,46 +156,46 @@ struct EventCell {
 };
 
 std::string runCell(Event const& event) {
-    return text(event, "run");
+    return text(event, Run);
 }
 std::string machineCell(Event const& event) {
-    return text(event, "machine");
+    return text(event, Machine);
 }
 // A whole machine appears and disappears too.
 std::string partitionCell(Event const& event) {
-    return text(event, "scope") == "machine" ? "(whole machine)" : text(event, "partition");
+    return text(event, Scope) == "machine" ? "(whole machine)" : text(event, Partition);
 }
 std::string outcomeCell(Event const& event) {
-    return text(event, "outcome");
+    return text(event, Outcome);
 }
 std::string reasonCell(Event const& event) {
-    return text(event, "reason");
+    return text(event, Reason);
 }
 std::string sinceCell(Event const& event) {
-    return text(event, "failing_since_run");
+    return text(event, FailingSinceRun);
 }
 std::string runsFailingCell(Event const& event) {
-    return text(event, "runs_failing");
+    return text(event, RunsFailing);
 }
 std::string kindCell(Event const& event) {
-    std::string kind = text(event, "kind");
+    std::string kind = text(event, Kind);
     std::replace(kind.begin(), kind.end(), '_', ' ');
     return kind;
 }
 std::string componentCell(Event const& event) {
-    return text(event, "component");
+    return text(event, Component);
 }
 std::string nameCell(Event const& event) {
-    return text(event, "component_name");
+    return text(event, ComponentName);
 }
 // What changed in a component: "serial OLD → NEW" for a replacement,
 // "KEYWORD: OLD → NEW" for a property.
 std::string detailCell(Event const& event) {
-    std::string const change = text(event, "old_value") + " \u2192 " + text(event, "new_value");
-    if (text(event, "kind") == "replaced") {
+    std::string const change = text(event, OldValue) + " \u2192 " + text(event, NewValue);
+    if (text(event, Kind) == "replaced") {
         return "serial " + change;
     }
-    return text(event, "kind") == "property_changed" ? text(event, "property") + ": " + change
+    return text(event, Kind) == "property_changed" ? text(event, Property) + ": " + change
                                                      : "";
 }
 
@@ -337,8 +356,8 @@ Json changeListJson(SQLite::Database& database, ChangeSelection const& chosen) {
         Json members = Json::array();
         for (Event const& event : groupEvents(group, events, chosen.sinceUnix.has_value())) {
             Json member = Json::object();
-            for (char const* key : gc_EventKeys) {
-                member[key] = event.at(key);
+            for (std::size_t i = 0; i < event.size(); ++i) {
+                member[gc_EventKeys[i]] = event[i];
             }
             members.push_back(std::move(member));
         }
