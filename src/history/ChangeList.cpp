@@ -4,8 +4,8 @@
 #include "history/DisplayText.h"
 #include "history/FittedTable.h"
 
-#include <cstdint>
 #include <SQLiteCpp/Statement.h>
+#include <cstdint>
 
 #include <algorithm>
 #include <array>
@@ -100,12 +100,12 @@ std::vector<long long> selectedRuns(SQLite::Database& database, ChangeSelection 
 }
 
 std::vector<Event> readEvents(SQLite::Database& database, std::vector<long long> const& runs) {
-    SQLite::Statement query(
-        database, "SELECT e.run_id, r.console, e.scope, e.kind, e.machine, e.partition,"
-                  " e.component, e.component_name, e.property, e.old_value, e.new_value,"
-                  " e.outcome, e.reason, e.failing_since_run, e.runs_failing"
-                  " FROM events e JOIN runs r ON r.id = e.run_id WHERE e.run_id = ?1"
-                  " ORDER BY e.machine, e.partition, e.component, e.property, e.id");
+    SQLite::Statement query(database,
+                            "SELECT e.run_id, r.console, e.scope, e.kind, e.machine, e.partition,"
+                            " e.component, e.component_name, e.property, e.old_value, e.new_value,"
+                            " e.outcome, e.reason, e.failing_since_run, e.runs_failing"
+                            " FROM events e JOIN runs r ON r.id = e.run_id WHERE e.run_id = ?1"
+                            " ORDER BY e.machine, e.partition, e.component, e.property, e.id");
     std::vector<Event> events;
     for (long long const run : runs) {
         query.reset();
@@ -147,7 +147,6 @@ std::vector<Event> groupEvents(EventGroup const& group, std::vector<Event> const
     }
     return members;
 }
-
 
 // One column of a group's table: its heading and how an event fills it.
 struct EventCell {
@@ -195,8 +194,7 @@ std::string detailCell(Event const& event) {
     if (text(event, Kind) == "replaced") {
         return "serial " + change;
     }
-    return text(event, Kind) == "property_changed" ? text(event, Property) + ": " + change
-                                                     : "";
+    return text(event, Kind) == "property_changed" ? text(event, Property) + ": " + change : "";
 }
 
 std::vector<EventCell> groupCells(std::string const& key) {
@@ -208,8 +206,12 @@ std::vector<EventCell> groupCells(std::string const& key) {
         return {machine, partition, outcome, reason};
     }
     if (key == "still_failing") {
-        return {machine,  partition, outcome, {{"Since run", true}, sinceCell},
-                {{"Runs", true}, runsFailingCell}, reason};
+        return {machine,
+                partition,
+                outcome,
+                {{"Since run", true}, sinceCell},
+                {{"Runs", true}, runsFailingCell},
+                reason};
     }
     if (key == "recoveries") {
         return {machine, partition, outcome};
@@ -218,16 +220,19 @@ std::vector<EventCell> groupCells(std::string const& key) {
         return {machine, {{"Change"}, kindCell}, reason};
     }
     if (key == "inventory") {
-        return {machine, partition, {{"Change"}, kindCell},
-                {{"Component", false, true}, componentCell}, {{"Name", false, true}, nameCell},
+        return {machine,
+                partition,
+                {{"Change"}, kindCell},
+                {{"Component", false, true}, componentCell},
+                {{"Name", false, true}, nameCell},
                 {{"Detail", false, true}, detailCell}};
     }
     return {machine, partition};
 }
 
 // A group's table, with the run of each event when several runs are shown.
-std::string groupText(EventGroup const& group, std::vector<Event> const& events,
-                      bool severalRuns, std::size_t width) {
+std::string groupText(EventGroup const& group, std::vector<Event> const& events, bool severalRuns,
+                      std::size_t width) {
     std::vector<EventCell> cells = groupCells(group.key);
     if (severalRuns) {
         cells.insert(cells.begin(), EventCell{{"Run", true}, runCell});
@@ -301,8 +306,9 @@ std::string sinceHeading(ChangeSelection const& selection, std::vector<long long
     if (runs.empty()) {
         return heading + ": no run recorded";
     }
-    return heading + ": " + std::to_string(runs.size()) + (runs.size() == 1 ? " run, " : " runs, ") +
-           std::to_string(runs.front()) + " to " + std::to_string(runs.back());
+    return heading + ": " + std::to_string(runs.size()) +
+           (runs.size() == 1 ? " run, " : " runs, ") + std::to_string(runs.front()) + " to " +
+           std::to_string(runs.back());
 }
 
 std::string headingText(SQLite::Database& database, ChangeSelection const& selection,

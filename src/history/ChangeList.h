@@ -27,9 +27,9 @@ struct ChangeSelection {
 // The keys of an event in the JSON forms, in the order of the events
 // table's columns.
 inline constexpr char const* gc_EventKeys[] = {
-    "run",       "console",   "scope",     "kind",    "machine",
-    "partition", "component", "component_name", "property", "old_value",
-    "new_value", "outcome",   "reason",    "failing_since_run", "runs_failing"};
+    "run",       "console",           "scope",       "kind",      "machine",   "partition",
+    "component", "component_name",    "property",    "old_value", "new_value", "outcome",
+    "reason",    "failing_since_run", "runs_failing"};
 
 // The grouped events as text for a terminal width columns wide (0: no
 // limit).
@@ -38,8 +38,7 @@ std::string changeListText(SQLite::Database& database, ChangeSelection const& se
 
 // {"run": {...}|null, "since": TEXT|null, "runs": [ids], then one array per
 // group (docs/history.md)}.
-nlohmann::ordered_json changeListJson(SQLite::Database& database,
-                                      ChangeSelection const& selection);
+nlohmann::ordered_json changeListJson(SQLite::Database& database, ChangeSelection const& selection);
 
 // Whether the history holds the run.
 bool hasRun(SQLite::Database& database, long long run);

@@ -91,8 +91,9 @@ Inventory changes (1)
 
 TEST(ChangeList, SaysAConsolesFirstRunHasNothingToCompareWith) {
     ExampleHistory example;
-    EXPECT_EQ(history::changeListText(example.database(), ofRun(1), 0),
-              R"(Changes of run 1 of cons-a, started 2026-11-01 02:00: the console's first recorded run, nothing to compare with
+    EXPECT_EQ(
+        history::changeListText(example.database(), ofRun(1), 0),
+        R"(Changes of run 1 of cons-a, started 2026-11-01 02:00: the console's first recorded run, nothing to compare with
 
 No change.
 )");

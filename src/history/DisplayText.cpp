@@ -16,8 +16,8 @@ bool isContinuationByte(char byte) {
 } // namespace
 
 std::size_t displayWidth(std::string const& text) {
-    return static_cast<std::size_t>(
-        std::count_if(text.begin(), text.end(), [](char byte) { return !isContinuationByte(byte); }));
+    return static_cast<std::size_t>(std::count_if(
+        text.begin(), text.end(), [](char byte) { return !isContinuationByte(byte); }));
 }
 
 std::string cutToWidth(std::string const& text, std::size_t width) {

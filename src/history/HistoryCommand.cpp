@@ -75,8 +75,8 @@ void addConsoleOption(CLI::App& command, HistoryRequest& request) {
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
 }
 
-void addTextOption(CLI::App& command, char const* name, std::string& target,
-                   char const* valueName, char const* description) {
+void addTextOption(CLI::App& command, char const* name, std::string& target, char const* valueName,
+                   char const* description) {
     command.add_option(name, target, description)
         ->type_name(valueName)
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
@@ -104,9 +104,9 @@ void addActions(CLI::App& history, HistoryRequest& request) {
               [&request](unsigned long long n) { request.run = static_cast<long long>(n); });
     addTextOption(*changes, "--since", request.since, "DATE", "every run started since DATE");
     addConsoleOption(*changes, request);
-    CLI::App* const partition = addAction(history, request, HistoryAction::Partition,
-                                          "partition", "one partition's outcomes and "
-                                                       "component changes over time");
+    CLI::App* const partition = addAction(history, request, HistoryAction::Partition, "partition",
+                                          "one partition's outcomes and "
+                                          "component changes over time");
     partition->add_option("MACHINE", request.machine, "the machine (type-model_serial)");
     partition->add_option("PARTITION", request.partition, "the partition's host name as listed");
     addConsoleOption(*partition, request);
@@ -122,14 +122,15 @@ void addActions(CLI::App& history, HistoryRequest& request) {
                                       "remove old runs from the history");
     addNumber(*prune, "--keep", 1, "keep the newest N runs of each console",
               [&request](unsigned long long n) { request.keep = n; });
-    addTextOption(*prune, "--before", request.before, "DATE", "remove the runs started before DATE");
+    addTextOption(*prune, "--before", request.before, "DATE",
+                  "remove the runs started before DATE");
 }
 
 } // namespace
 
 CLI::App* addHistorySubcommand(CLI::App& app, HistoryRequest& request) {
-    CLI::App* const history =
-        app.add_subcommand("history", "what the history database holds: " + std::string(gc_Actions));
+    CLI::App* const history = app.add_subcommand("history", "what the history database holds: " +
+                                                                std::string(gc_Actions));
     addActions(*history, request);
     return history;
 }
@@ -150,10 +151,9 @@ std::optional<long long> momentOf(char const* option, std::string const& text) {
 
 void checkExport(HistoryRequest const& request) {
     if (request.format != "json" && request.format != "csv") {
-        throw CLI::ValidationError(request.format.empty()
-                                       ? std::string("export needs --format json or --format csv")
-                                       : "--format takes json or csv, not '" + request.format +
-                                             "'");
+        throw CLI::ValidationError(
+            request.format.empty() ? std::string("export needs --format json or --format csv")
+                                   : "--format takes json or csv, not '" + request.format + "'");
     }
     if (request.what != "runs" && request.what != "changes" && request.what != "partitions") {
         throw CLI::ValidationError("--what takes runs, changes or partitions, not '" +
@@ -171,7 +171,8 @@ void checkAction(HistoryRequest const& request) {
     if (request.action == HistoryAction::Export) {
         checkExport(request);
     }
-    if (request.action == HistoryAction::Prune && request.keep.has_value() == !request.before.empty()) {
+    if (request.action == HistoryAction::Prune &&
+        request.keep.has_value() == !request.before.empty()) {
         throw CLI::ValidationError(request.keep ? "give either --keep or --before, not both"
                                                 : "prune needs --keep N or --before DATE");
     }
@@ -184,8 +185,8 @@ void checkHistoryRequest(CLI::App const& historyCommand, HistoryRequest& request
         std::vector<std::string> const words = historyCommand.remaining();
         throw CLI::ValidationError(words.empty() || words.front().rfind('-', 0) == 0
                                        ? std::string("name what to show: ") + gc_Actions
-                                       : "unknown history command '" + words.front() +
-                                             "': use " + gc_Actions);
+                                       : "unknown history command '" + words.front() + "': use " +
+                                             gc_Actions);
     }
     if (request.file.empty()) {
         throw CLI::ValidationError("--history needs a file name, not an empty value");
@@ -221,8 +222,7 @@ std::string changesAnswer(HistoryRequest const& request, std::size_t width) {
         throw UnusableHistory("no run " + std::to_string(*request.run) + " in " + request.file,
                               gc_ExitUsage);
     }
-    ChangeSelection const selection{request.run, request.sinceUnix, request.since,
-                                    request.console};
+    ChangeSelection const selection{request.run, request.sinceUnix, request.since, request.console};
     return request.json ? jsonText(withFile(request.file, changeListJson(database, selection)))
                         : changeListText(database, selection, width);
 }
@@ -233,11 +233,9 @@ std::string partitionConsole(SQLite::Database& database, HistoryRequest const& r
                              PartitionSelection const& selection) {
     std::vector<std::string> const consoles = consolesListing(database, selection);
     std::string const named = request.partition + " on " + request.machine;
-    if (consoles.empty() ||
-        (request.console && std::find(consoles.begin(), consoles.end(), *request.console) ==
-                                consoles.end())) {
-        throw UnusableHistory("no run " +
-                                  (request.console ? "of " + *request.console + " " : "") +
+    if (consoles.empty() || (request.console && std::find(consoles.begin(), consoles.end(),
+                                                          *request.console) == consoles.end())) {
+        throw UnusableHistory("no run " + (request.console ? "of " + *request.console + " " : "") +
                                   "listed " + named + " in " + request.file,
                               gc_ExitUsage);
     }
@@ -263,8 +261,8 @@ std::string partitionAnswer(HistoryRequest const& request, std::size_t width) {
 
 std::string exportAnswer(HistoryRequest const& request) {
     SQLite::Database database = openHistoryForReading(request.file);
-    ExportSelection const selection{request.format, request.what, request.sinceUnix,
-                                    request.since, request.console};
+    ExportSelection const selection{request.format, request.what, request.sinceUnix, request.since,
+                                    request.console};
     std::ostringstream text;
     writeExport(database, selection, text);
     if (request.output.empty()) {

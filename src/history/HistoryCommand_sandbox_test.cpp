@@ -65,8 +65,7 @@ TEST(HistoryCommand, AMissingDatabaseExits66AndIsNotCreated) {
     QuorvexTest::TemporaryDirectory folder;
     std::string const path = folder.file("history.sqlite");
     EXPECT_EQ(outcome(runHistory({"runs", "--history", path})),
-              "66||quorvex-survey: history: cannot read " + path +
-                  ": No such file or directory\n");
+              "66||quorvex-survey: history: cannot read " + path + ": No such file or directory\n");
     EXPECT_FALSE(QuorvexTest::fileExists(path));
 }
 
@@ -105,10 +104,12 @@ TEST(HistoryCommand, BadCommandLinesExit64WithTheirReason) {
         std::string message;
     };
     for (Refusal const& refusal : std::vector<Refusal>{
-             {{}, "history: name what to show: runs, changes, partition, export or prune "
-                  "(try 'quorvex-survey history --help')"},
-             {{"runz"}, "history: unknown history command 'runz': use runs, changes, partition, "
-                        "export or prune (try 'quorvex-survey history --help')"},
+             {{},
+              "history: name what to show: runs, changes, partition, export or prune "
+              "(try 'quorvex-survey history --help')"},
+             {{"runz"},
+              "history: unknown history command 'runz': use runs, changes, partition, "
+              "export or prune (try 'quorvex-survey history --help')"},
              {{"prune", "--history", file},
               "history prune: prune needs --keep N or --before DATE (try 'quorvex-survey "
               "history prune --help')"},
@@ -125,8 +126,9 @@ TEST(HistoryCommand, BadCommandLinesExit64WithTheirReason) {
              {{"changes", "--run", "2", "--since", "2026-11-01"},
               "history changes: --run and --since exclude each other: give one of them (try "
               "'quorvex-survey history changes --help')"},
-             {{"export"}, "history export: export needs --format json or --format csv (try "
-                          "'quorvex-survey history export --help')"},
+             {{"export"},
+              "history export: export needs --format json or --format csv (try "
+              "'quorvex-survey history export --help')"},
              {{"export", "--format", "xml"},
               "history export: --format takes json or csv, not 'xml' (try 'quorvex-survey "
               "history export --help')"},
@@ -136,8 +138,7 @@ TEST(HistoryCommand, BadCommandLinesExit64WithTheirReason) {
              {{"runs", "--lats", "2"},
               "history runs: unknown option --lats: did you mean --last? (try 'quorvex-survey "
               "history runs --help')"},
-             {{"changes", "--run", "99", "--history", file},
-              "history: no run 99 in " + file},
+             {{"changes", "--run", "99", "--history", file}, "history: no run 99 in " + file},
              {{"partition", "8233-E8B_10ABCDE", "lpar9", "--history", file},
               "history: no run listed lpar9 on 8233-E8B_10ABCDE in " + file}}) {
         EXPECT_EQ(outcome(runHistory(refusal.arguments)),
@@ -161,9 +162,9 @@ TEST(HistoryCommand, ExportWritesItsFileWhole) {
 TEST(HistoryCommand, ExportIntoAMissingFolderExits73) {
     ExampleHistory example;
     QuorvexTest::TemporaryDirectory folder;
-    CommandResult const result = runHistory({"export", "--format", "json", "--output",
-                                             folder.file("no/runs.json"), "--history",
-                                             example.path()});
+    CommandResult const result =
+        runHistory({"export", "--format", "json", "--output", folder.file("no/runs.json"),
+                    "--history", example.path()});
     EXPECT_EQ(result.exitStatus, 73);
     EXPECT_EQ(result.stderrText.rfind("quorvex-survey: history: cannot ", 0), 0U)
         << result.stderrText;

@@ -40,9 +40,8 @@ TEST(HistoryDate, ReadsADateAloneAsLocalMidnightAndATimeWithoutOffsetAsLocal) {
 
 TEST(HistoryDate, RefusesWhatIsNoDateOrNoSuchDay) {
     for (char const* text : {"", "yesterday", "2026-11", "2026-11-1", "2026-13-01", "2026-02-29",
-                             "2026-04-31", "2026-11-01T24:00", "2026-11-01T12:60",
-                             "2026-11-01T12", "2026-11-01T12:00+25:00", "2026-11-01T12:00 +01:00",
-                             "2026-11-01x"}) {
+                             "2026-04-31", "2026-11-01T24:00", "2026-11-01T12:60", "2026-11-01T12",
+                             "2026-11-01T12:00+25:00", "2026-11-01T12:00 +01:00", "2026-11-01x"}) {
         EXPECT_FALSE(momentOfDate(text).has_value()) << text;
     }
 }

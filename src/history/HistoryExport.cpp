@@ -5,8 +5,8 @@
 #include "history/RunList.h"
 #include "report/PartitionsCsv.h"
 
-#include <cstdint>
 #include <SQLiteCpp/Statement.h>
+#include <cstdint>
 #include <nlohmann/json.hpp>
 
 #include <iterator>
@@ -22,9 +22,9 @@ using Json = nlohmann::ordered_json;
 constexpr int gc_ExportSchemaVersion = 1;
 
 constexpr char const* gc_PartitionKeys[] = {
-    "run",          "console",   "machine",           "partition",      "partition_id",
-    "ip",           "outcome",   "status_text",       "reason",         "seconds",
-    "document",     "inventory", "inventory_problem", "document_hash",  "failing_since_run",
+    "run",          "console",          "machine",           "partition",     "partition_id",
+    "ip",           "outcome",          "status_text",       "reason",        "seconds",
+    "document",     "inventory",        "inventory_problem", "document_hash", "failing_since_run",
     "runs_failing", "last_surveyed_run"};
 
 // What is exported: the query, whose first parameter is the earliest start
@@ -34,8 +34,7 @@ struct ExportQuery {
     std::vector<std::string> keys;
 };
 
-template <std::size_t Count>
-std::vector<std::string> keyList(char const* const (&keys)[Count]) {
+template <std::size_t Count> std::vector<std::string> keyList(char const* const (&keys)[Count]) {
     return std::vector<std::string>(std::begin(keys), std::end(keys));
 }
 

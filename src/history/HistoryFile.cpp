@@ -34,8 +34,7 @@ int pragmaNumber(SQLite::Database& database, char const* pragma) {
 // this command knows.
 void checkOurs(SQLite::Database& database, std::string const& path) {
     if (pragmaNumber(database, "application_id") != gc_HistoryApplicationId) {
-        throw UnusableHistory(path + " is not a quorvex-survey history database",
-                              gc_ExitDataError);
+        throw UnusableHistory(path + " is not a quorvex-survey history database", gc_ExitDataError);
     }
     int const version = pragmaNumber(database, "user_version");
     if (version > gc_ReadableSchemaVersion) {
@@ -46,8 +45,7 @@ void checkOurs(SQLite::Database& database, std::string const& path) {
                               gc_ExitDataError);
     }
     if (version < 1) {
-        throw UnusableHistory(path + " holds no history yet (schema version 0)",
-                              gc_ExitDataError);
+        throw UnusableHistory(path + " holds no history yet (schema version 0)", gc_ExitDataError);
     }
 }
 

@@ -55,9 +55,9 @@ TEST(HistoryFile, RandomBytesAreADataError) {
         noise += static_cast<char>((i * 7919 + 13) % 251);
     }
     QuorvexTest::writeFile(path, noise);
-    EXPECT_EQ(refusal(path),
-              std::make_pair(path + " is not a readable history database: file is not a database",
-                             65));
+    EXPECT_EQ(
+        refusal(path),
+        std::make_pair(path + " is not a readable history database: file is not a database", 65));
 }
 
 TEST(HistoryFile, ANewerSchemaIsADataErrorThatSaysWhichVersion) {
@@ -75,8 +75,7 @@ TEST(HistoryFile, AFileMarkedOursWithoutSchemaIsADataError) {
     std::string const path = folder.file("empty.sqlite");
     SQLite::Database(path, SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE)
         .exec("PRAGMA application_id = " + std::to_string(history::gc_HistoryApplicationId));
-    EXPECT_EQ(refusal(path),
-              std::make_pair(path + " holds no history yet (schema version 0)", 65));
+    EXPECT_EQ(refusal(path), std::make_pair(path + " holds no history yet (schema version 0)", 65));
 }
 
 TEST(HistoryFile, ReadingLeavesTheFileUnchanged) {

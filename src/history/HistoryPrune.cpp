@@ -1,8 +1,8 @@
 #include "history/HistoryPrune.h"
 
-#include <cstdint>
 #include <SQLiteCpp/Statement.h>
 #include <SQLiteCpp/Transaction.h>
+#include <cstdint>
 
 namespace history {
 

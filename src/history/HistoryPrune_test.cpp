@@ -45,7 +45,8 @@ TEST(HistoryPrune, RemovesTheRunsStartedBeforeAMoment) {
     history::PruneResult const result = history::pruneRuns(database, before);
     EXPECT_EQ(runIds(database), (std::vector<long long>{2, 3, 4, 5}));
     EXPECT_EQ(history::pruneText(result), "Removed 1 run, kept 4.\n");
-    EXPECT_EQ(history::pruneJson(result), nlohmann::ordered_json::parse(R"({"removed": 1, "kept": 4})"));
+    EXPECT_EQ(history::pruneJson(result),
+              nlohmann::ordered_json::parse(R"({"removed": 1, "kept": 4})"));
 }
 
 TEST(HistoryPrune, RemovingNothingChangesNothing) {

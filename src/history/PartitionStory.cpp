@@ -17,7 +17,7 @@ using Json = nlohmann::ordered_json;
 
 // The keys of a run of the story, in the query's order.
 constexpr char const* gc_StoryRunKeys[] = {
-    "run",       "started",   "outcome",           "status_text",  "reason",
+    "run",       "started",           "outcome",           "status_text",  "reason",
     "inventory", "inventory_problem", "failing_since_run", "runs_failing", "change"};
 // The keys of a component event, in the query's order.
 constexpr char const* gc_ComponentKeys[] = {"run",      "kind",      "component", "component_name",
@@ -40,22 +40,19 @@ SQLite::Statement storyRuns(SQLite::Database& database, PartitionSelection const
     return query;
 }
 
-SQLite::Statement componentEvents(SQLite::Database& database,
-                                  PartitionSelection const& selection) {
+SQLite::Statement componentEvents(SQLite::Database& database, PartitionSelection const& selection) {
     SQLite::Statement query(
-        database,
-        "SELECT e.run_id, e.kind, e.component, e.component_name, e.property, e.old_value,"
-        " e.new_value FROM events e JOIN runs r ON r.id = e.run_id"
-        " WHERE e.machine = ?1 AND e.partition = ?2 AND r.console = ?3"
-        " AND e.scope = 'component' ORDER BY e.run_id, e.component, e.property, e.id");
+        database, "SELECT e.run_id, e.kind, e.component, e.component_name, e.property, e.old_value,"
+                  " e.new_value FROM events e JOIN runs r ON r.id = e.run_id"
+                  " WHERE e.machine = ?1 AND e.partition = ?2 AND r.console = ?3"
+                  " AND e.scope = 'component' ORDER BY e.run_id, e.component, e.property, e.id");
     query.bind(1, selection.machine);
     query.bind(2, selection.partition);
     query.bind(3, *selection.console);
     return query;
 }
 
-template <std::size_t Count>
-Json rows(SQLite::Statement& query, char const* const (&keys)[Count]) {
+template <std::size_t Count> Json rows(SQLite::Statement& query, char const* const (&keys)[Count]) {
     Json rows = Json::array();
     while (query.executeStep()) {
         Json row = Json::object();
@@ -87,8 +84,8 @@ std::string runsText(Json const& runs, std::size_t width) {
                        {"Inventory"},
                        {"Reason", false, true}});
     for (Json const& run : runs) {
-        std::string const reason = run["reason"].is_null() ? text(run["inventory_problem"])
-                                                           : text(run["reason"]);
+        std::string const reason =
+            run["reason"].is_null() ? text(run["inventory_problem"]) : text(run["reason"]);
         table.addRow({text(run["run"]), shownTime(text(run["started"])), text(run["outcome"]),
                       spaced(text(run["change"])), text(run["inventory"]), reason});
     }
@@ -151,16 +148,17 @@ std::string partitionStoryText(SQLite::Database& database, PartitionSelection co
                                std::size_t width) {
     Json const story = partitionStoryJson(database, selection);
     std::size_t const runCount = story["runs"].size();
-    std::string text = fitted(selection.partition + " on " + selection.machine + " (" +
-                                  *selection.console + "): listed by " +
-                                  std::to_string(runCount) + (runCount == 1 ? " run" : " runs"),
-                              width);
+    std::string text =
+        fitted(selection.partition + " on " + selection.machine + " (" + *selection.console +
+                   "): listed by " + std::to_string(runCount) + (runCount == 1 ? " run" : " runs"),
+               width);
     text += "\n" + fitted("Runs", width) + runsText(story["runs"], width);
     if (!story["component_events"].empty()) {
-        text += "\n" + fitted("Component changes (" +
-                                  std::to_string(story["component_events"].size()) + ")",
-                              width) +
-                componentsText(story["component_events"], width);
+        text +=
+            "\n" +
+            fitted("Component changes (" + std::to_string(story["component_events"].size()) + ")",
+                   width) +
+            componentsText(story["component_events"], width);
     }
     return text;
 }

@@ -4,8 +4,8 @@
 #include "history/DisplayText.h"
 #include "history/FittedTable.h"
 
-#include <cstdint>
 #include <SQLiteCpp/Statement.h>
+#include <cstdint>
 
 #include <iterator>
 
@@ -17,14 +17,14 @@ constexpr int gc_RunColumnCount = static_cast<int>(std::size(gc_RunKeys));
 
 // The newest runs, then put oldest first.
 SQLite::Statement selectRuns(SQLite::Database& database, RunSelection const& selection) {
-    SQLite::Statement query(database,
-                            std::string("SELECT * FROM (SELECT ") + gc_RunColumns +
-                                " FROM runs r WHERE ?1 IS NULL OR r.console = ?1"
-                                " ORDER BY r.id DESC LIMIT ?2) ORDER BY 1");
+    SQLite::Statement query(database, std::string("SELECT * FROM (SELECT ") + gc_RunColumns +
+                                          " FROM runs r WHERE ?1 IS NULL OR r.console = ?1"
+                                          " ORDER BY r.id DESC LIMIT ?2) ORDER BY 1");
     if (selection.console) {
         query.bind(1, *selection.console);
     }
-    query.bind(2, selection.last == 0 ? std::int64_t{-1} : static_cast<std::int64_t>(selection.last));
+    query.bind(2,
+               selection.last == 0 ? std::int64_t{-1} : static_cast<std::int64_t>(selection.last));
     return query;
 }
 

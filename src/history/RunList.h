@@ -26,9 +26,9 @@ inline constexpr char gc_RunColumns[] =
 
 // The keys of a run in the JSON forms, in gc_RunColumns' order.
 inline constexpr char const* gc_RunKeys[] = {
-    "id",         "console",       "started",        "ended",       "seconds",
-    "exit_status", "return_code",  "interrupted",    "partitions",  "surveyed",
-    "failed",     "new_failures",  "recoveries",     "inventory_changes"};
+    "id",          "console",          "started",    "ended",    "seconds", "exit_status",
+    "return_code", "interrupted",      "partitions", "surveyed", "failed",  "new_failures",
+    "recoveries",  "inventory_changes"};
 
 struct RunSelection {
     // Only this console's runs.

@@ -25,7 +25,6 @@ std::vector<std::string> const& partitionColumns() {
     return columns;
 }
 
-
 std::string fieldText(Json const& value) {
     if (value.is_null()) {
         return "";

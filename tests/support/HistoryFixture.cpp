@@ -41,14 +41,13 @@ SQLite::Database& HistoryFixture::database() {
 }
 
 long long HistoryFixture::addRun(std::string const& console, std::string const& started,
-                                std::string const& ended, int partitions, int surveyed,
-                                int failed, Number exitStatus, Text interrupted) {
+                                 std::string const& ended, int partitions, int surveyed, int failed,
+                                 Number exitStatus, Text interrupted) {
     SQLite::Statement insert(
-        _database,
-        "INSERT INTO runs (console, tool, started, ended, started_unix, recorded_unix,"
-        " exit_status, return_code, interrupted, partitions, surveyed, failed, summary)"
-        " VALUES (?1, 'quorvex-survey', ?2, ?3, CAST(strftime('%s', ?2) AS INTEGER),"
-        " CAST(strftime('%s', ?3) AS INTEGER), ?4, '0', ?5, ?6, ?7, ?8, '{}')");
+        _database, "INSERT INTO runs (console, tool, started, ended, started_unix, recorded_unix,"
+                   " exit_status, return_code, interrupted, partitions, surveyed, failed, summary)"
+                   " VALUES (?1, 'quorvex-survey', ?2, ?3, CAST(strftime('%s', ?2) AS INTEGER),"
+                   " CAST(strftime('%s', ?3) AS INTEGER), ?4, '0', ?5, ?6, ?7, ?8, '{}')");
     insert.bind(1, console);
     insert.bind(2, started);
     insert.bind(3, ended);
@@ -124,16 +123,16 @@ void HistoryFixture::_addEvent(long long run, std::string const& scope, std::str
 namespace {
 
 void addFirstRuns(HistoryFixture& history) {
-    long long const first = history.addRun("cons-a", "2026-11-01T02:00:00+01:00",
-                                           "2026-11-01T02:01:12+01:00", 3, 3, 0);
+    long long const first =
+        history.addRun("cons-a", "2026-11-01T02:00:00+01:00", "2026-11-01T02:01:12+01:00", 3, 3, 0);
     for (char const* partition : {"lpar1", "lpar2", "lpar3"}) {
         history.addPartition(first, gc_HistoryMachine, partition);
     }
     long long const second = history.addRun("cons-a", "2026-11-02T02:00:00+01:00",
                                             "2026-11-02T02:03:05+01:00", 3, 2, 1, 4);
     history.addPartition(second, gc_HistoryMachine, "lpar1");
-    history.addPartition(second, gc_HistoryMachine, "lpar2", "timed_out",
-                         "no answer within 1800 s", second, 1, "none");
+    history.addPartition(second, gc_HistoryMachine, "lpar2", "timed_out", "no answer within 1800 s",
+                         second, 1, "none");
     history.addPartition(second, gc_HistoryMachine, "lpar3");
     history.addPartitionEvent(second, "newly_failing", gc_HistoryMachine, "lpar2", "timed_out",
                               "no answer within 1800 s", second, 1);
@@ -164,8 +163,8 @@ void addInterruptedRun(HistoryFixture& history) {
 }
 
 void addRecoveringRun(HistoryFixture& history) {
-    long long const run = history.addRun("cons-a", "2026-11-04T02:00:00+01:00",
-                                         "2026-11-04T02:02:00+01:00", 3, 3, 0);
+    long long const run =
+        history.addRun("cons-a", "2026-11-04T02:00:00+01:00", "2026-11-04T02:02:00+01:00", 3, 3, 0);
     for (char const* partition : {"lpar1", "lpar2", "lpar4"}) {
         history.addPartition(run, gc_HistoryMachine, partition);
     }
@@ -173,8 +172,8 @@ void addRecoveringRun(HistoryFixture& history) {
     history.addMachineEvent(run, "listing_recovered", gc_HistoryOtherMachine);
     history.addComponentEvent(run, "added", gc_HistoryMachine, "lpar4", "U78AB.001.WZS0123-P1-C9",
                               "Fibre channel adapter");
-    history.addComponentEvent(run, "removed", gc_HistoryMachine, "lpar1",
-                              "U78AB.001.WZS0123-P1-C3", "SAS controller");
+    history.addComponentEvent(run, "removed", gc_HistoryMachine, "lpar1", "U78AB.001.WZS0123-P1-C3",
+                              "SAS controller");
 }
 
 } // namespace
