@@ -30,6 +30,17 @@ TEST(HistoryFile, OpensAHistoryOfTheKnownSchema) {
     EXPECT_EQ(database.execAndGet("SELECT count(*) FROM runs").getInt(), 5);
 }
 
+// The store writes in WAL mode: a run recording does not hold readers up.
+TEST(HistoryFile, ReadsAWalDatabaseWhileARunRecords) {
+    QuorvexTest::ExampleHistory example;
+    example.database().exec("PRAGMA journal_mode = WAL");
+    example.database().exec("BEGIN IMMEDIATE");
+    example.database().exec("DELETE FROM events");
+    SQLite::Database reader = history::openHistoryForReading(example.path());
+    EXPECT_EQ(reader.execAndGet("SELECT count(*) FROM events").getInt(), 12);
+    example.database().exec("ROLLBACK");
+}
+
 TEST(HistoryFile, AMissingFileIsNoInput) {
     TemporaryDirectory folder;
     std::string const path = folder.file("none.sqlite");
