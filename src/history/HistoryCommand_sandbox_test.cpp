@@ -61,6 +61,27 @@ TEST(HistoryCommand, ChangesOfANamedRunAndPartitionStoryAnswer) {
     EXPECT_EQ(nlohmann::ordered_json::parse(story.stdoutText)["console"], "cons-b");
 }
 
+TEST(HistoryCommand, APartitionListedByTwoConsolesNeedsTheConsole) {
+    QuorvexTest::TemporaryDirectory folder;
+    std::string const path = folder.file("history.sqlite");
+    QuorvexTest::HistoryFixture history(path);
+    QuorvexTest::addExampleRuns(history);
+    long long const run =
+        history.addRun("cons-b", "2026-11-05T03:00:00Z", "2026-11-05T03:00:09Z", 1, 1, 0);
+    history.addPartition(run, QuorvexTest::gc_HistoryMachine, "lpar1");
+    EXPECT_EQ(outcome(runHistory({"partition", QuorvexTest::gc_HistoryMachine, "lpar1",
+                                  "--history", path})),
+              "64||quorvex-survey: history: lpar1 on 8233-E8B_10ABCDE is listed by several "
+              "consoles (cons-a, cons-b): choose one with --console\n");
+    EXPECT_EQ(outcome(runHistory({"partition", QuorvexTest::gc_HistoryMachine, "lpar1",
+                                  "--console", "cons-b", "--history", path})),
+              "0|lpar1 on 8233-E8B_10ABCDE (cons-b): listed by 1 run\n"
+              "\n"
+              "Runs\n"
+              "  Run  Started           Outcome   Change  Inventory  Reason\n"
+              "    6  2026-11-05 03:00  surveyed          read\n|");
+}
+
 TEST(HistoryCommand, AMissingDatabaseExits66AndIsNotCreated) {
     QuorvexTest::TemporaryDirectory folder;
     std::string const path = folder.file("history.sqlite");
