@@ -255,10 +255,20 @@ void keepFirstOfEach(ParsedCommandLine& parsed) {
     parsed.options.identities = kept;
 }
 
-// The command a refusal belongs to: the subcommand once it was named.
+// The command a refusal belongs to: the innermost subcommand named
+// ("history runs").
 CLI::App const& refusingCommand(CLI::App const& app) {
     std::vector<CLI::App*> const subcommands = app.get_subcommands();
-    return subcommands.empty() ? app : *subcommands.front();
+    return subcommands.empty() ? app : refusingCommand(*subcommands.front());
+}
+
+// A subcommand's words after the program's name: "history runs".
+std::string commandWords(CLI::App const& command) {
+    CLI::App const* const parent = command.get_parent();
+    if (parent == nullptr || parent->get_parent() == nullptr) {
+        return command.get_name();
+    }
+    return commandWords(*parent) + " " + command.get_name();
 }
 
 // The parser runs short of words only at the end of the command line: the
@@ -284,9 +294,9 @@ std::string missingValue(CLI::App const& command, std::string const& lastArgumen
 // follows, so that the reason stays on the screen.
 ParsedCommandLine refused(CLI::App const& app, std::string const& reason) {
     CLI::App const& command = refusingCommand(app);
-    std::string const inCommand = &command == &app ? "" : command.get_name() + ": ";
+    std::string const inCommand = &command == &app ? "" : commandWords(command) + ": ";
     std::string const helpCommand =
-        std::string(gc_ProgramName) + (&command == &app ? "" : " " + command.get_name());
+        std::string(gc_ProgramName) + (&command == &app ? "" : " " + commandWords(command));
     std::cerr << gc_ProgramName << ": " << inCommand << reason << " (try '" << helpCommand
               << " --help')\n";
     ParsedCommandLine parsed;
@@ -333,14 +343,28 @@ ParsedCommandLine endingWith(std::string const& text) {
 // words when it is refused.
 void readCommandLine(CLI::App& app, CLI::App const& reportCommand, ParsedCommandLine& parsed,
                      int argc, char const* const* argv) {
+    CLI::App const& historyCommand = *app.get_subcommand("history");
     app.parse(argc, argv);
     refuseLeftOver(app);
     if (reportCommand.parsed()) {
+        parsed.historyRequest.reset();
         refuseLeftOver(reportCommand);
         report::checkReportRequest(*parsed.reportRequest);
         return;
     }
     parsed.reportRequest.reset();
+    if (historyCommand.parsed()) {
+        // A word left over without an action is the action mistyped,
+        // which the check names.
+        CLI::App const& action = refusingCommand(historyCommand);
+        if (&action != &historyCommand) {
+            refuseLeftOver(action);
+        }
+        history::checkHistoryRequest(historyCommand, *parsed.historyRequest);
+        refuseLeftOver(historyCommand);
+        return;
+    }
+    parsed.historyRequest.reset();
     refuseEmptyOutputNames(app, parsed.options, argc, argv);
     checkMachines(app, parsed.options, argc, argv);
     keepFirstOfEach(parsed);
@@ -363,6 +387,8 @@ ParsedCommandLine parseCommandLine(int argc, char const* const* argv) {
     addSurveyOptions(app, parsed.options);
     parsed.reportRequest.emplace();
     CLI::App const* const reportCommand = report::addReportSubcommand(app, *parsed.reportRequest);
+    parsed.historyRequest.emplace();
+    history::addHistorySubcommand(app, *parsed.historyRequest);
     // Set after the subcommand is added, which would inherit it.
     app.footer(gc_ExitStatusHelp);
     try {

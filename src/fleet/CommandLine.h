@@ -1,6 +1,7 @@
 #pragma once
 
 #include "history/HistoryDatabase.h"
+#include "history/HistoryCommand.h"
 #include "report/ReportCommand.h"
 
 #include <optional>
@@ -45,6 +46,8 @@ struct ParsedCommandLine {
     std::vector<std::string> warnings;
     // Set for "report [--from VPD_FOLDER] DIR", which surveys nothing.
     std::optional<report::ReportRequest> reportRequest;
+    // Set for "history ACTION [options]", which surveys nothing.
+    std::optional<history::HistoryRequest> historyRequest;
 };
 
 constexpr int gc_ExitUsage = 64;

@@ -257,6 +257,7 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
               "Usage: quorvex-survey [options] IDENTITY...\n"
               "       quorvex-survey [options] --all\n"
               "       quorvex-survey report [--from VPD_FOLDER] DIR\n"
+              "       quorvex-survey history runs|changes|partition|export|prune ...\n"
               "\n"
               "Surveys the client partitions of the PYLON console's managed machines,\n"
               "several partitions at a time.\n"
@@ -287,6 +288,8 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
               "Subcommands:\n"
               "  report                  write into DIR the report of the files earlier runs "
               "left\n"
+              "  history                 what the history database holds: runs, changes, "
+              "partition, export or prune\n"
               "\n"
               "Exit status:\n"
               "  0, 4, 8                 every listed partition surveyed, some, none\n"
@@ -299,6 +302,29 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
               "SIGPIPE,\n"
               "                          143 SIGTERM\n");
     EXPECT_EQ(run.err, "");
+}
+
+TEST(CommandLine, HistoryActionTakesItsOptionsAndSurveysNothing) {
+    ParseRun const run =
+        parse({"history", "changes", "--since", "2026-11-01T00:00Z", "--json", "--history", "h"});
+    ASSERT_FALSE(run.parsed.exitStatus.has_value()) << run.err;
+    ASSERT_TRUE(run.parsed.historyRequest.has_value());
+    EXPECT_FALSE(run.parsed.reportRequest.has_value());
+    history::HistoryRequest const& request = *run.parsed.historyRequest;
+    EXPECT_EQ(request.action, history::HistoryAction::Changes);
+    EXPECT_EQ(request.file, "h");
+    EXPECT_TRUE(request.json);
+    EXPECT_EQ(request.sinceUnix, 1793491200);
+    EXPECT_FALSE(parse({"A_1"}).parsed.historyRequest.has_value());
+}
+
+TEST(CommandLine, HistoryHelpShowsAnActionsUsage) {
+    ParseRun const run = parse({"history", "prune", "--help"});
+    ASSERT_TRUE(run.parsed.exitStatus.has_value());
+    EXPECT_EQ(*run.parsed.exitStatus, 0);
+    EXPECT_EQ(run.out.substr(0, run.out.find('\n')),
+              "Usage: quorvex-survey history prune [--history FILE] [--json] [--keep N] "
+              "[--before DATE]");
 }
 
 TEST(CommandLine, ReportHelpShowsTheReportsUsageAndOptions) {

@@ -10,7 +10,8 @@ namespace {
 
 constexpr char gc_UsageLabel[] = "Usage: ";
 
-// A subcommand's form from its options: "[--from VPD_FOLDER] DIR".
+// A subcommand's form from its options: "[--from VPD_FOLDER] DIR", "[--json]";
+// one made of actions names them: "runs|changes ...".
 std::string subcommandForm(CLI::App const& command) {
     std::string form;
     for (CLI::Option const* option : command.get_options()) {
@@ -20,10 +21,16 @@ std::string subcommandForm(CLI::App const& command) {
         if (option->get_positional()) {
             form += " " + option->get_name(true, false);
         } else {
-            form += " [" + option->get_name() + " " + option->get_type_name() + "]";
+            std::string const value =
+                option->get_type_name().empty() ? "" : " " + option->get_type_name();
+            form += " [" + option->get_name() + value + "]";
         }
     }
-    return form;
+    std::string actions;
+    for (CLI::App const* action : command.get_subcommands({})) {
+        actions += (actions.empty() ? " " : "|") + action->get_name();
+    }
+    return actions.empty() ? form : form + actions + " ...";
 }
 
 } // namespace

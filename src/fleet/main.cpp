@@ -267,6 +267,10 @@ int main(int argc, char** argv) {
     if (parsed.reportRequest) {
         return report::runReportSubcommand(*parsed.reportRequest, std::cout, std::cerr);
     }
+    if (parsed.historyRequest) {
+        return history::runHistorySubcommand(*parsed.historyRequest, std::cout, std::cerr,
+                                             fleet::terminalColumns(STDOUT_FILENO));
+    }
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;
     }

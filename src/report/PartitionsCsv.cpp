@@ -25,20 +25,6 @@ std::vector<std::string> const& partitionColumns() {
     return columns;
 }
 
-std::string csvField(std::string const& text) {
-    if (text.find_first_of(",\"\r\n") == std::string::npos) {
-        return text;
-    }
-    std::string quoted = "\"";
-    for (char const character : text) {
-        quoted += character;
-        if (character == '"') {
-            quoted += '"';
-        }
-    }
-    return quoted + "\"";
-}
-
 std::string fieldText(Json const& value) {
     if (value.is_null()) {
         return "";
@@ -78,6 +64,20 @@ void appendListingFailure(std::string& csv, Json const& failure, std::string con
 }
 
 } // namespace
+
+std::string csvField(std::string const& text) {
+    if (text.find_first_of(",\"\r\n") == std::string::npos) {
+        return text;
+    }
+    std::string quoted = "\"";
+    for (char const character : text) {
+        quoted += character;
+        if (character == '"') {
+            quoted += '"';
+        }
+    }
+    return quoted + "\"";
+}
 
 std::string partitionsCsv(Json const& summary) {
     std::string csv;

@@ -19,4 +19,8 @@ namespace report {
 // message) as the reason, every partition field empty.
 std::string partitionsCsv(nlohmann::ordered_json const& summary);
 
+// One field of an RFC 4180 row: as it is, or quoted with inner quotes
+// doubled when it holds a comma, a double quote, CR or LF.
+std::string csvField(std::string const& text);
+
 } // namespace report
