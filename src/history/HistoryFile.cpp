@@ -33,14 +33,14 @@ int pragmaNumber(SQLite::Database& database, char const* pragma) {
 // The marks the store leaves: its application id and a schema version
 // this command knows.
 void checkOurs(SQLite::Database& database, std::string const& path) {
-    if (pragmaNumber(database, "application_id") != gc_HistoryApplicationId) {
+    if (pragmaNumber(database, "application_id") != gc_ApplicationId) {
         throw UnusableHistory(path + " is not a quorvex-survey history database", gc_ExitDataError);
     }
     int const version = pragmaNumber(database, "user_version");
-    if (version > gc_ReadableSchemaVersion) {
+    if (version > newestSchemaVersion()) {
         throw UnusableHistory(path + " has schema version " + std::to_string(version) +
                                   ", newer than this program reads (" +
-                                  std::to_string(gc_ReadableSchemaVersion) +
+                                  std::to_string(newestSchemaVersion()) +
                                   "): use the quorvex-survey that wrote it",
                               gc_ExitDataError);
     }

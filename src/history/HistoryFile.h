@@ -1,5 +1,9 @@
 #pragma once
 
+#include "history/HistoryDatabase.h"
+#include "history/Migrations.h"
+#include "history/SqliteFailure.h"
+
 #include <SQLiteCpp/Database.h>
 #include <SQLiteCpp/Exception.h>
 
@@ -10,8 +14,6 @@ namespace history {
 
 // Opening the history database for the history command, and the exit
 // statuses it ends with (sysexits.h's numbers, docs/history.md).
-
-inline constexpr char gc_DefaultHistoryFile[] = "/var/lib/quorvex-survey/history.sqlite";
 
 // A bad command line, or a run or partition it names that is not there.
 inline constexpr int gc_ExitUsage = 64;
@@ -25,14 +27,6 @@ inline constexpr int gc_ExitCannotCreate = 73;
 inline constexpr int gc_ExitIoError = 74;
 // Another process held the database for longer than the busy timeout.
 inline constexpr int gc_ExitTemporaryFailure = 75;
-
-// The newest schema (PRAGMA user_version) this command reads.
-inline constexpr int gc_ReadableSchemaVersion = 1;
-// PRAGMA application_id of a quorvex-survey history ("QVSH"), as the store
-// sets it when it makes the file.
-inline constexpr std::int32_t gc_HistoryApplicationId = 0x51565348;
-// How long a query waits for a run that is recording.
-inline constexpr int gc_BusyTimeoutMilliseconds = 5000;
 
 // The history in path, opened read-only, once it is known to be a
 // quorvex-survey history of a schema this command reads; throws

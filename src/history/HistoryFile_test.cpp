@@ -85,7 +85,7 @@ TEST(HistoryFile, AFileMarkedOursWithoutSchemaIsADataError) {
     TemporaryDirectory folder;
     std::string const path = folder.file("empty.sqlite");
     SQLite::Database(path, SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE)
-        .exec("PRAGMA application_id = " + std::to_string(history::gc_HistoryApplicationId));
+        .exec("PRAGMA application_id = " + std::to_string(history::gc_ApplicationId));
     EXPECT_EQ(refusal(path), std::make_pair(path + " holds no history yet (schema version 0)", 65));
 }
 

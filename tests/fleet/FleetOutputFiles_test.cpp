@@ -143,10 +143,8 @@ TEST_F(FleetOutputFiles, StatusFileAndSummaryThatCannotBeWrittenAreNamedAndEndWi
     // No partition was contacted: the block is the overall code alone.
     EXPECT_EQ(_stderr(), std::string(gc_BlockEnd) + "8\nquorvex-survey: cannot write " +
                              gc_StatusFile + ": File too large\nquorvex-survey: cannot write " +
-                             gc_TraceFile + ": File too large
-quorvex-survey: cannot write " +
-                             summary + ": File too large
-" + gc_HistoryPastTheLimit);
+                             gc_TraceFile + ": File too large\nquorvex-survey: cannot write " +
+                             summary + ": File too large\n" + gc_HistoryPastTheLimit);
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_VPD_Folder), std::vector<std::string>{})
         << "a cut status file or its temporary file was left";
     EXPECT_EQ(QuorvexTest::readFile(gc_TraceFile).size(), 1000U);
