@@ -133,6 +133,7 @@ void addSurveyOptions(CLI::App& app, Options& options) {
                  "wait for another run using the result folder to end, rather than exit 75");
     app.add_option("IDENTITY", options.identities, "a managed machine (type-model_serial)");
     report::addReportOption(app, options.reportFolder);
+    report::addStaleAfterOption(app, options.staleAfterRuns);
 }
 
 // The long options app knows, for guessing what a mistyped one meant.

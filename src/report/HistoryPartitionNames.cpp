@@ -18,4 +18,9 @@ std::vector<std::string> historyPartitionNames(nlohmann::ordered_json const& par
     return names;
 }
 
+std::string historyMachineName(nlohmann::ordered_json const& machine) {
+    nlohmann::ordered_json const& identity = member(machine, "identity");
+    return identity.is_string() ? identity.get<std::string>() : "";
+}
+
 } // namespace report

@@ -13,4 +13,8 @@ namespace report {
 // The report finds each row's history under (machine, this name).
 std::vector<std::string> historyPartitionNames(nlohmann::ordered_json const& partitions);
 
+// The name the history gives a machine of the summary: its identity; "" for
+// a machine without one.
+std::string historyMachineName(nlohmann::ordered_json const& machine);
+
 } // namespace report

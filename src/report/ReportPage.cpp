@@ -304,8 +304,7 @@ std::vector<std::string> historyCellsOf(Json const& machine,
     if (!since || !hasHistoryColumns(*since)) {
         return std::vector<std::string>(partitions.size());
     }
-    std::string const identity =
-        member(machine, "identity").is_string() ? member(machine, "identity").get<std::string>() : "";
+    std::string const identity = historyMachineName(machine);
     std::vector<std::string> cells;
     for (std::string const& name : historyPartitionNames(partitions)) {
         cells.push_back(historyCells(*since, identity, name));

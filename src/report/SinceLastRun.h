@@ -8,6 +8,10 @@
 
 namespace report {
 
+// Partitions not surveyed for this many runs in a row are stale, unless
+// --stale-after says otherwise.
+inline constexpr int gc_DefaultStaleAfterRuns = 3;
+
 // What changed since the console's previous run, as the history database
 // keeps it for one run (docs/history.md), in the form the report shows:
 // counts and lists of the changes, and each partition's failing streak and
@@ -52,7 +56,7 @@ struct SinceLastRun {
     // The console's previous run: none for the first recorded run.
     std::optional<long long> previousRunId;
     std::string previousStarted;
-    int staleAfterRuns = 3;
+    int staleAfterRuns = gc_DefaultStaleAfterRuns;
 
     std::vector<PartitionChange> newFailures;
     std::vector<PartitionChange> recoveries;

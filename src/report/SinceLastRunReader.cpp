@@ -52,8 +52,8 @@ std::string readRuns(SQLite::Database& db, SinceLastRun& since) {
 
 // The partition's change from an events row (see the query in readEvents).
 PartitionChange partitionChange(SQLite::Statement const& row) {
-    return {row.getColumn(2).getString(), row.getColumn(3).getString(),
-            row.getColumn(9).getString(), row.getColumn(10).getString(),
+    return {row.getColumn(2).getString(),    row.getColumn(3).getString(),
+            row.getColumn(9).getString(),    row.getColumn(10).getString(),
             optionalText(row.getColumn(11)), row.getColumn(12).getInt64()};
 }
 
@@ -67,12 +67,24 @@ ComponentChange componentChange(SQLite::Statement const& row) {
 // The list a partition event of this kind goes to; none for a kind this
 // reader does not know (one a newer program records).
 std::vector<PartitionChange>* partitionList(SinceLastRun& since, std::string const& kind) {
-    if (kind == "newly_failing") { return &since.newFailures; }
-    if (kind == "recovered") { return &since.recoveries; }
-    if (kind == "still_failing") { return &since.stillFailing; }
-    if (kind == "newly_inactive") { return &since.newlyInactive; }
-    if (kind == "appeared") { return &since.partitionsAppeared; }
-    if (kind == "disappeared") { return &since.partitionsDisappeared; }
+    if (kind == "newly_failing") {
+        return &since.newFailures;
+    }
+    if (kind == "recovered") {
+        return &since.recoveries;
+    }
+    if (kind == "still_failing") {
+        return &since.stillFailing;
+    }
+    if (kind == "newly_inactive") {
+        return &since.newlyInactive;
+    }
+    if (kind == "appeared") {
+        return &since.partitionsAppeared;
+    }
+    if (kind == "disappeared") {
+        return &since.partitionsDisappeared;
+    }
     return nullptr;
 }
 

@@ -12,9 +12,6 @@ namespace report {
 // read-only with a busy timeout, so that a run recording meanwhile is waited
 // for and never disturbed.
 
-// Partitions not surveyed for this many runs in a row are stale, unless
-// --stale-after says otherwise.
-inline constexpr int gc_DefaultStaleAfterRuns = 3;
 // How long a reader waits for a run that is recording its history.
 inline constexpr int gc_HistoryBusyTimeoutMilliseconds = 10000;
 

@@ -77,9 +77,9 @@ std::string componentText(ComponentChange const& change) {
 // What happened to the component: the kind, and the old and new value of a
 // replacement (serial numbers) or of a changed property.
 std::string componentChangeText(ComponentChange const& change) {
-    std::string const values =
-        " <span class=\"old-value\">" + escapeHtml(change.oldValue) +
-        "</span> &rarr; <span class=\"new-value\">" + escapeHtml(change.newValue) + "</span>";
+    std::string const values = " <span class=\"old-value\">" + escapeHtml(change.oldValue) +
+                               "</span> &rarr; <span class=\"new-value\">" +
+                               escapeHtml(change.newValue) + "</span>";
     if (change.kind == "replaced") {
         return "replaced, serial number" + values;
     }
@@ -90,8 +90,8 @@ std::string componentChangeText(ComponentChange const& change) {
 }
 
 std::string componentChangeItem(ComponentChange const& change) {
-    return "<li>" + partitionName(change.machine, change.partition) + ": " +
-           componentText(change) + " " + componentChangeText(change) + "</li>\n";
+    return "<li>" + partitionName(change.machine, change.partition) + ": " + componentText(change) +
+           " " + componentChangeText(change) + "</li>\n";
 }
 
 std::string machineItem(std::string const& machine) {
@@ -133,19 +133,19 @@ Kind kind(char const* id, char const* heading, std::vector<Change> const& change
 
 // The kinds of change in the order the section shows them.
 std::vector<Kind> kindsOf(SinceLastRun const& since) {
-    return {kind("new-failures", "New failures", since.newFailures, partitionChangeItem),
-            kind("recoveries", "Recovered", since.recoveries, partitionChangeItem),
-            kind("still-failing", "Still failing", since.stillFailing, partitionChangeItem),
-            kind("newly-inactive", "Newly inactive", since.newlyInactive, partitionChangeItem),
-            kind("inventory-changes", "Inventory changes", since.inventoryChanges,
-                 componentChangeItem),
-            kind("partitions-appeared", "Partitions appeared", since.partitionsAppeared,
-                 partitionChangeItem),
-            kind("partitions-disappeared", "Partitions disappeared", since.partitionsDisappeared,
-                 partitionChangeItem),
-            kind("machines-appeared", "Machines appeared", since.machinesAppeared, machineItem),
-            kind("machines-disappeared", "Machines disappeared", since.machinesDisappeared,
-                 machineItem)};
+    return {
+        kind("new-failures", "New failures", since.newFailures, partitionChangeItem),
+        kind("recoveries", "Recovered", since.recoveries, partitionChangeItem),
+        kind("still-failing", "Still failing", since.stillFailing, partitionChangeItem),
+        kind("newly-inactive", "Newly inactive", since.newlyInactive, partitionChangeItem),
+        kind("inventory-changes", "Inventory changes", since.inventoryChanges, componentChangeItem),
+        kind("partitions-appeared", "Partitions appeared", since.partitionsAppeared,
+             partitionChangeItem),
+        kind("partitions-disappeared", "Partitions disappeared", since.partitionsDisappeared,
+             partitionChangeItem),
+        kind("machines-appeared", "Machines appeared", since.machinesAppeared, machineItem),
+        kind("machines-disappeared", "Machines disappeared", since.machinesDisappeared,
+             machineItem)};
 }
 
 // Each kind's count first, those with changes linking to their list; then
@@ -155,9 +155,9 @@ std::string countsAndLists(SinceLastRun const& since) {
     std::string text = "<ul class=\"change-counts\">\n";
     std::string lists;
     for (Kind const& kind : kinds) {
-        std::string const label = kind.count == 0 ? std::string(kind.heading)
-                                                  : "<a href=\"#" + std::string(kind.id) + "\">" +
-                                                        kind.heading + "</a>";
+        std::string const label =
+            kind.count == 0 ? std::string(kind.heading)
+                            : "<a href=\"#" + std::string(kind.id) + "\">" + kind.heading + "</a>";
         text += std::string("<li") + (kind.count == 0 ? " class=\"none\"" : "") + "><b>" +
                 std::to_string(kind.count) + "</b>" + label + "</li>\n";
         lists += kind.list;
