@@ -1,5 +1,6 @@
 #include "report/SinceLastRunSection.h"
 
+#include "report/Outcome.h"
 #include "report/ReadableTime.h"
 #include "utility/TextSafety.h"
 
@@ -36,8 +37,45 @@ std::string timeElement(std::string const& isoTime) {
            (readable ? *readable : escapeHtml(isoTime)) + "</time>";
 }
 
-std::string firstLine(std::string const& text) {
-    return text.substr(0, text.find('\n'));
+// A reason on one line: its lines joined by spaces, cut after
+// gc_ReasonCharacters bytes (the partitions table has it whole).
+constexpr std::size_t gc_ReasonCharacters = 160;
+
+std::string oneLine(std::string const& text) {
+    std::string line;
+    for (char const character : text) {
+        bool const blank =
+            character == ' ' || character == '\n' || character == '\t' || character == '\r';
+        if (!blank) {
+            line += character;
+        } else if (!line.empty() && line.back() != ' ') {
+            line += ' ';
+        }
+    }
+    if (!line.empty() && line.back() == ' ') {
+        line.pop_back();
+    }
+    if (line.size() <= gc_ReasonCharacters) {
+        return line;
+    }
+    std::size_t cut = gc_ReasonCharacters;
+    // Not inside a character's UTF-8 bytes.
+    while (cut > 0 && (static_cast<unsigned char>(line[cut]) & 0xC0U) == 0x80U) {
+        --cut;
+    }
+    return line.substr(0, cut) + "\u2026";
+}
+
+// The outcome's key and its label, as the table shows them; the name as it
+// is for an outcome the table lacks.
+std::string outcomeText(std::string const& name) {
+    std::optional<Outcome> const outcome = outcomeNamed(name);
+    if (!outcome) {
+        return escapeHtml(name);
+    }
+    return "<span class=\"outcome-name\"><span class=\"key " +
+           std::string(textOf(*outcome).pageClass) + "\"></span>" + textOf(*outcome).label +
+           "</span>";
 }
 
 // "host on machine", kept whole on their lines.
@@ -53,14 +91,14 @@ std::string runsText(long long runs) {
 std::string partitionChangeItem(PartitionChange const& change) {
     std::string item = "<li>" + partitionName(change.machine, change.partition);
     if (!change.outcome.empty()) {
-        item += ": " + escapeHtml(change.outcome);
+        item += ": " + outcomeText(change.outcome);
     }
     if (change.failingSince && change.runsFailing > 1) {
         item += ", failing since " + timeElement(*change.failingSince) + " (" +
                 runsText(change.runsFailing) + ")";
     }
     if (!change.reason.empty()) {
-        item += " &middot; <q>" + escapeHtml(firstLine(change.reason)) + "</q>";
+        item += " &middot; <q>" + escapeHtml(oneLine(change.reason)) + "</q>";
     }
     return item + "</li>\n";
 }

@@ -74,14 +74,31 @@ TEST(SinceLastRunSection, StillFailingSaysSinceWhenAndForHowManyRuns) {
     SinceLastRun::PartitionChange still = change("<b>x", "fetch_failure");
     still.failingSince = gc_Since;
     still.runsFailing = 3;
-    still.reason = "file not found\nsecond line";
+    still.reason = "file not found\n  second line\n\n";
     since.stillFailing = {still};
     EXPECT_NE(std::string::npos,
               report::sinceLastRunSection(since).find(
                   "<li><b>&lt;b&gt;x</b> on <span class=\"machine-name\">9119-MHE_21ABCDE</span>: "
-                  "fetch_failure, failing since <time datetime=\"2026-11-20T08:00:00+01:00\">Fri "
-                  "20 Nov 2026 08:00:00 UTC+01:00</time> (3 runs) &middot; <q>file not "
-                  "found</q></li>"));
+                  "<span class=\"outcome-name\"><span class=\"key f\"></span>fetch "
+                  "failure</span>, failing since <time datetime=\"2026-11-20T08:00:00+01:00\">Fri "
+                  "20 Nov 2026 08:00:00 UTC+01:00</time> (3 runs) &middot; <q>file not found "
+                  "second line</q></li>"));
+}
+
+TEST(SinceLastRunSection, LongReasonIsCutBetweenCharactersWithAnEllipsis) {
+    SinceLastRun since = compared();
+    SinceLastRun::PartitionChange failure = change("a", "channel_failure");
+    failure.reason = std::string(159, 'x') + "\xC3\xA9tail";
+    since.newFailures = {failure};
+    EXPECT_NE(std::string::npos, report::sinceLastRunSection(since).find(
+                                     "<q>" + std::string(159, 'x') + "\u2026</q>"));
+}
+
+TEST(SinceLastRunSection, OutcomeTheTableLacksShowsItsName) {
+    SinceLastRun since = compared();
+    since.newFailures = {change("a", "teleported")};
+    EXPECT_NE(std::string::npos,
+              report::sinceLastRunSection(since).find("9119-MHE_21ABCDE</span>: teleported</li>"));
 }
 
 TEST(SinceLastRunSection, InventoryChangesShowOldAndNewValues) {
