@@ -210,7 +210,7 @@ TEST(ReportCommand, HistoryGivesTheChangesOfTheNewestRunOfTheFilesConsole) {
     std::string const page = QuorvexTest::readFile(root.file("r/index.html"));
     EXPECT_NE(std::string::npos, page.find("Compared with the run started <time "
                                            "datetime=\"2026-11-20T08:00:00+01:00\">"));
-    EXPECT_NE(std::string::npos, page.find("<td class=outcome>surveyed<td><td><time "
+    EXPECT_NE(std::string::npos, page.find("<td class=outcome>surveyed<td><time "
                                            "datetime=\"2026-11-21T08:00:00+01:00\""));
 }
 

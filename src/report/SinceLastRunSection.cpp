@@ -227,13 +227,15 @@ bool hasHistoryColumns(SinceLastRun const& since) {
     return !since.unavailable;
 }
 
+// The last survey first: at a narrow width the table's box shows it, and the
+// stale mark with it, beside the outcome.
 std::string historyColumns() {
-    return "<col class=\"failing-since\"><col class=\"last-surveyed\">";
+    return "<col class=\"last-surveyed\"><col class=\"failing-since\">";
 }
 
 std::string historyHeadings() {
-    return "<th data-column=\"failing-since\">Failing since</th>"
-           "<th data-column=\"last-surveyed\">Last surveyed</th>";
+    return "<th data-column=\"last-surveyed\">Last surveyed</th>"
+           "<th data-column=\"failing-since\">Failing since</th>";
 }
 
 std::string historyCells(SinceLastRun const& since, std::string const& machine,
@@ -243,14 +245,13 @@ std::string historyCells(SinceLastRun const& since, std::string const& machine,
         return "<td><td>";
     }
     SinceLastRun::PartitionState const& state = found->second;
-    std::string cells =
-        "<td>" + (state.failingSince ? shortTimeElement(*state.failingSince) : "") + "<td>";
-    cells += state.lastSurveyed ? shortTimeElement(*state.lastSurveyed) : "never";
+    std::string cells = "<td>" + (state.lastSurveyed ? shortTimeElement(*state.lastSurveyed)
+                                                     : std::string("never"));
     if (state.isStale) {
         cells += " <b class=stale title=\"not surveyed for " + runsText(state.runsNotSurveyed) +
                  " in a row\">stale</b>";
     }
-    return cells;
+    return cells + "<td>" + (state.failingSince ? shortTimeElement(*state.failingSince) : "");
 }
 
 } // namespace report

@@ -24,10 +24,10 @@ bool hasHistoryColumns(SinceLastRun const& since);
 std::string historyColumns();
 std::string historyHeadings();
 
-// A partition's two cells, left open as the table's other cells: when its
-// failing streak began, and when it was last surveyed with, for a
-// partition not surveyed for since.staleAfterRuns runs in a row, the stale
-// mark. Empty cells for a partition the history does not know.
+// A partition's two cells, left open as the table's other cells: when it
+// was last surveyed with, for a partition not surveyed for
+// since.staleAfterRuns runs in a row, the stale mark; and when its failing
+// streak began. Empty cells for a partition the history does not know.
 std::string historyCells(SinceLastRun const& since, std::string const& machine,
                          std::string const& partition);
 

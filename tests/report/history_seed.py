@@ -12,8 +12,9 @@ import os
 import sqlite3
 
 FAILING = {"channel_failure", "client_failure", "fetch_failure", "timed_out", "worker_died"}
-STARTS = ["2026-11-21T08:00:00+01:00", "2026-11-22T08:00:00+01:00",
-          "2026-11-23T08:00:00+01:00", "2026-11-24T08:00:00+01:00"]
+# The runs before the report's own, which started when its summary says.
+EARLIER_STARTS = ["2026-11-21T08:00:00+01:00", "2026-11-22T08:00:00+01:00",
+                  "2026-11-23T08:00:00+01:00"]
 
 
 def partition_names(machine):
@@ -38,9 +39,9 @@ def create(path, source_root):
     return database
 
 
-def add_runs(database, console):
+def add_runs(database, console, newest_start):
     runs = []
-    for started in STARTS:
+    for started in EARLIER_STARTS + [newest_start]:
         cursor = database.execute(
             "INSERT INTO runs (console, tool, started, ended, started_unix, recorded_unix,"
             " exit_status, return_code, partitions, surveyed, failed, summary)"
@@ -103,7 +104,7 @@ def add_other_changes(database, newest, machine, surveyed):
 def seed(path, source_root, summary):
     """Writes the database at path for the summary's console and partitions."""
     database = create(path, source_root)
-    runs = add_runs(database, summary["console_host"])
+    runs = add_runs(database, summary["console_host"], summary["started"])
     first_failure, surveyed = True, None
     for machine in summary["machines"]:
         for name, partition in partition_names(machine):

@@ -507,11 +507,11 @@ class HistoryTest(unittest.TestCase):
         headings = self.script("return Array.from(document.querySelectorAll('#parts thead th'))"
                                ".map(th => th.textContent);")
         outcome = headings.index("Outcome")
-        self.assertEqual(["Failing since", "Last surveyed"], headings[outcome + 1:outcome + 3])
+        self.assertEqual(["Last surveyed", "Failing since"], headings[outcome + 1:outcome + 3])
         cells = self.script(
             "return Array.from(document.querySelectorAll('#parts tbody tr')).map(r =>"
             " [r.cells[1].textContent, r.cells[2].textContent,"
-            "  r.cells[arguments[0]].textContent, r.cells[arguments[0] + 1].textContent]);",
+            "  r.cells[arguments[0] + 1].textContent, r.cells[arguments[0]].textContent]);",
             outcome + 1)
         rows = csv_rows(history_report())
         self.assertEqual(CSV_COLUMNS + ["failing_since", "last_surveyed"], rows[0])
