@@ -259,7 +259,8 @@
             return;
         }
         var fits = 0;
-        var left = scrollBox.getBoundingClientRect().left + scrollBox.clientLeft - scrollBox.scrollLeft;
+        var box = scrollBox.getBoundingClientRect();
+        var left = box.left + scrollBox.clientLeft - scrollBox.scrollLeft;
         headers.forEach(function (header) {
             var end = header.getBoundingClientRect().right - left;
             if (end <= room) {
