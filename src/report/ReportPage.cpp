@@ -12,6 +12,7 @@
 #include "report/SinceLastRunSection.h"
 #include "utility/TextSafety.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <optional>
 #include <set>
@@ -305,10 +306,9 @@ std::vector<std::string> historyCellsOf(Json const& machine,
         return std::vector<std::string>(partitions.size());
     }
     std::string const identity = historyMachineName(machine);
-    std::vector<std::string> cells;
-    for (std::string const& name : historyPartitionNames(partitions)) {
-        cells.push_back(historyCells(*since, identity, name));
-    }
+    std::vector<std::string> cells = historyPartitionNames(partitions);
+    std::transform(cells.begin(), cells.end(), cells.begin(),
+                   [&](std::string const& name) { return historyCells(*since, identity, name); });
     return cells;
 }
 

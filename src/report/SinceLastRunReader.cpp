@@ -38,7 +38,7 @@ std::string readRuns(SQLite::Database& db, SinceLastRun& since) {
     if (!run.executeStep()) {
         throw std::runtime_error("the history holds no run " + std::to_string(since.runId));
     }
-    std::string const console = run.getColumn(0).getString();
+    std::string console = run.getColumn(0).getString();
     SQLite::Statement previous(
         db, "SELECT id, started FROM runs WHERE console = ? AND id < ? ORDER BY id DESC LIMIT 1");
     previous.bind(1, console);

@@ -73,7 +73,7 @@ std::string outcomeText(std::string const& name) {
     if (!outcome) {
         return escapeHtml(name);
     }
-    return "<span class=\"outcome-name\"><span class=\"key " +
+    return R"(<span class="outcome-name"><span class="key )" +
            std::string(textOf(*outcome).pageClass) + "\"></span>" + textOf(*outcome).label +
            "</span>";
 }
@@ -165,25 +165,25 @@ struct Kind {
 };
 
 template <typename Change, typename Item>
-Kind kind(char const* id, char const* heading, std::vector<Change> const& changes, Item item) {
+Kind kindOf(char const* id, char const* heading, std::vector<Change> const& changes, Item item) {
     return {id, heading, changes.size(), changeList(id, heading, changes, item)};
 }
 
 // The kinds of change in the order the section shows them.
 std::vector<Kind> kindsOf(SinceLastRun const& since) {
-    return {
-        kind("new-failures", "New failures", since.newFailures, partitionChangeItem),
-        kind("recoveries", "Recovered", since.recoveries, partitionChangeItem),
-        kind("still-failing", "Still failing", since.stillFailing, partitionChangeItem),
-        kind("newly-inactive", "Newly inactive", since.newlyInactive, partitionChangeItem),
-        kind("inventory-changes", "Inventory changes", since.inventoryChanges, componentChangeItem),
-        kind("partitions-appeared", "Partitions appeared", since.partitionsAppeared,
-             partitionChangeItem),
-        kind("partitions-disappeared", "Partitions disappeared", since.partitionsDisappeared,
-             partitionChangeItem),
-        kind("machines-appeared", "Machines appeared", since.machinesAppeared, machineItem),
-        kind("machines-disappeared", "Machines disappeared", since.machinesDisappeared,
-             machineItem)};
+    return {kindOf("new-failures", "New failures", since.newFailures, partitionChangeItem),
+            kindOf("recoveries", "Recovered", since.recoveries, partitionChangeItem),
+            kindOf("still-failing", "Still failing", since.stillFailing, partitionChangeItem),
+            kindOf("newly-inactive", "Newly inactive", since.newlyInactive, partitionChangeItem),
+            kindOf("inventory-changes", "Inventory changes", since.inventoryChanges,
+                   componentChangeItem),
+            kindOf("partitions-appeared", "Partitions appeared", since.partitionsAppeared,
+                   partitionChangeItem),
+            kindOf("partitions-disappeared", "Partitions disappeared", since.partitionsDisappeared,
+                   partitionChangeItem),
+            kindOf("machines-appeared", "Machines appeared", since.machinesAppeared, machineItem),
+            kindOf("machines-disappeared", "Machines disappeared", since.machinesDisappeared,
+                   machineItem)};
 }
 
 // Each kind's count first, those with changes linking to their list; then
@@ -230,7 +230,7 @@ bool hasHistoryColumns(SinceLastRun const& since) {
 // The last survey first: at a narrow width the table's box shows it, and the
 // stale mark with it, beside the outcome.
 std::string historyColumns() {
-    return "<col class=\"last-surveyed\"><col class=\"failing-since\">";
+    return R"(<col class="last-surveyed"><col class="failing-since">)";
 }
 
 std::string historyHeadings() {
