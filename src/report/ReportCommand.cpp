@@ -5,6 +5,7 @@
 #include "report/ReportWriter.h"
 #include "report/SinceLastRunReader.h"
 #include "utility/SystemError.h"
+#include "utility/WholeNumber.h"
 
 #include <CLI/CLI.hpp>
 #include <optional>
@@ -74,6 +75,17 @@ std::optional<SinceLastRun> newestChanges(ReportRequest const& request,
     }
 }
 
+// The number of runs in text, or a refusal that says what the option takes.
+int staleAfterValue(std::string const& text) {
+    std::optional<unsigned long long> const runs =
+        util::wholeNumberWithin(text, 1, gc_MostStaleAfterRuns);
+    if (!runs) {
+        throw CLI::ValidationError("--stale-after takes " + staleAfterWords() + ", not '" + text +
+                                   "'");
+    }
+    return static_cast<int>(*runs);
+}
+
 } // namespace
 
 CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request) {
@@ -109,12 +121,17 @@ CLI::Option* addReportOption(CLI::App& app, std::string& folder) {
 
 CLI::Option* addStaleAfterOption(CLI::App& app, int& staleAfterRuns) {
     return app
-        .add_option("--stale-after", staleAfterRuns,
-                    "mark partitions not surveyed for N runs in a row stale")
+        .add_option_function<std::string>(
+            "--stale-after",
+            [&staleAfterRuns](std::string const& text) { staleAfterRuns = staleAfterValue(text); },
+            "mark partitions not surveyed for N runs in a row stale")
         ->type_name("N")
         ->default_str(std::to_string(gc_DefaultStaleAfterRuns))
-        ->check(CLI::PositiveNumber)
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+}
+
+std::string staleAfterWords() {
+    return "a whole number of runs from 1 to " + std::to_string(gc_MostStaleAfterRuns);
 }
 
 int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors) {

@@ -53,8 +53,17 @@ void checkReportRequest(ReportRequest const& request);
 CLI::Option* addReportOption(CLI::App& app, std::string& folder);
 
 // Registers "--stale-after N" on app (the run and "report"): partitions not
-// surveyed for N runs in a row (N at least 1) are marked stale.
+// surveyed for N runs in a row are marked stale. Any other value than a whole
+// number from 1 to gc_MostStaleAfterRuns is refused while parsing with a
+// CLI::ValidationError that says what the option takes.
 CLI::Option* addStaleAfterOption(CLI::App& app, int& staleAfterRuns);
+
+// The largest --stale-after: far more runs than a console's history keeps.
+inline constexpr int gc_MostStaleAfterRuns = 1000000;
+
+// What --stale-after takes, in the words of the errors ("a whole number of
+// runs from 1 to 1000000").
+std::string staleAfterWords();
 
 // Writes the report of the survey files in request.vpdFolder into
 // request.folder and prints the page's path on out. With

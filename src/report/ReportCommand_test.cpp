@@ -256,12 +256,20 @@ TEST(ReportCommand, SubcommandTakesHistoryAndStaleAfter) {
     EXPECT_EQ(5, request.staleAfterRuns);
 }
 
-TEST(ReportCommand, StaleAfterRefusesZeroAndWords) {
-    for (char const* value : {"0", "-1", "three"}) {
+TEST(ReportCommand, StaleAfterRefusesZeroWordsAndHugeNumbersSayingWhatItTakes) {
+    for (std::string const value : {"0", "three", "2x", "-1", "1000001"}) {
         CLI::App app;
         int staleAfter = 3;
         report::addStaleAfterOption(app, staleAfter);
-        EXPECT_THROW(parse(app, {"--stale-after", value}), CLI::ValidationError) << value;
+        try {
+            parse(app, {"--stale-after=" + value});
+            ADD_FAILURE() << "taken: " << value;
+        } catch (CLI::ValidationError const& refusal) {
+            EXPECT_EQ("--stale-after takes a whole number of runs from 1 to 1000000, not '" +
+                          value + "'",
+                      std::string(refusal.what()));
+        }
+        EXPECT_EQ(3, staleAfter);
     }
 }
 
