@@ -135,7 +135,7 @@ constexpr char gc_FrontendLockHeldOnInstall[] =
 
 constexpr char gc_Packages[] = "cmake g++ make libgtest-dev util-linux time proot python3 "
                                "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev "
-                               "systemd man-db";
+                               "systemd man-db libsqlite3-dev libsqlitecpp-dev";
 
 std::string _waitingLine(std::string const& lock, std::string const& seconds) {
     return "ensure-deps: another package manager holds apt's lock " + lock +

@@ -2,12 +2,12 @@
 
 #include "fleet/HelpFormatter.h"
 #include "fleet/OptionSpelling.h"
+#include "utility/WholeNumber.h"
 
 #include <CLI/CLI.hpp>
 
 #include <algorithm>
 #include <array>
-#include <charconv>
 #include <iostream>
 #include <iterator>
 #include <memory>
@@ -91,15 +91,13 @@ bool isOptionLike(std::string const& word) {
 
 // The number in text, or a refusal that says what the option takes.
 unsigned long long wholeNumber(WholeNumber const& number, std::string const& text) {
-    unsigned long long value = 0;
-    char const* const end = text.data() + text.size();
-    auto const [stop, failure] = std::from_chars(text.data(), end, value);
-    if (text.empty() || failure != std::errc{} || stop != end || value < number.lowest ||
-        value > number.highest) {
+    std::optional<unsigned long long> const value =
+        util::wholeNumberWithin(text, number.lowest, number.highest);
+    if (!value) {
         throw CLI::ValidationError(errorName(number.names) + " takes " + numberWords(number) +
                                    ", not '" + text + "'");
     }
-    return value;
+    return *value;
 }
 
 // The parser only splits the words; the number is read here, so that a
@@ -159,6 +157,7 @@ void addSurveyOptions(CLI::App& app, Options& options) {
     addHistoryOptions(app, options);
     app.add_option("IDENTITY", options.identities, "a managed machine (type-model_serial)");
     report::addReportOption(app, options.reportFolder);
+    report::addStaleAfterOption(app, options.staleAfterRuns);
 }
 
 // The long options app knows, for guessing what a mistyped one meant.
@@ -285,7 +284,11 @@ std::string missingValue(CLI::App const& command, std::string const& lastArgumen
     if (option == nullptr || option->get_type_size() == 0) {
         return parserReason;
     }
-    std::string const words = valueWords(option->get_type_name());
+    // --jobs and --stale-after both call their value N; the report says what
+    // its N takes.
+    std::string const words = option->check_lname("stale-after")
+                                  ? report::staleAfterWords()
+                                  : valueWords(option->get_type_name());
     return errorName(option->get_name(false, true)) + " needs a value" +
            (words.empty() ? "" : " (" + words + ")");
 }

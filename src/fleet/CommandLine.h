@@ -18,6 +18,9 @@ struct Options {
     std::string summaryFile;
     // --report DIR: the run's report is written there.
     std::string reportFolder;
+    // --stale-after N: the report marks partitions not surveyed for N runs
+    // in a row stale.
+    int staleAfterRuns = report::gc_DefaultStaleAfterRuns;
     bool quiet = false;
     // --recap (true) or --no-recap (false); nullopt: a recap when standard
     // error is a terminal and the run is not quiet.

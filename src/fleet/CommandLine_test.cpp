@@ -249,6 +249,11 @@ TEST(CommandLine, WaitIsOffUnlessGiven) {
     EXPECT_TRUE(parse({"--all", "--wait"}).parsed.options.waitForFolder);
 }
 
+TEST(CommandLine, StaleAfterIsTakenForTheRunsReport) {
+    EXPECT_EQ(3, parse({"--all"}).parsed.options.staleAfterRuns);
+    EXPECT_EQ(5, parse({"--all", "--stale-after", "5"}).parsed.options.staleAfterRuns);
+}
+
 TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
     ParseRun const run = parse({"--help"});
     ASSERT_TRUE(run.parsed.exitStatus.has_value());
@@ -256,7 +261,8 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
     EXPECT_EQ(run.out,
               "Usage: quorvex-survey [options] IDENTITY...\n"
               "       quorvex-survey [options] --all\n"
-              "       quorvex-survey report [--from VPD_FOLDER] DIR\n"
+              "       quorvex-survey report [--from VPD_FOLDER] [--history FILE] [--stale-after "
+              "N] DIR\n"
               "       quorvex-survey history runs|changes|partition|export|prune ...\n"
               "\n"
               "Surveys the client partitions of the PYLON console's managed machines,\n"
@@ -284,6 +290,8 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
               "(default /var/lib/quorvex-survey/history.sqlite)\n"
               "  --no-history            record nothing in the history database\n"
               "  --report DIR            after the run, write its report into DIR\n"
+              "  --stale-after N         mark partitions not surveyed for N runs in a row "
+              "stale (default 3)\n"
               "\n"
               "Subcommands:\n"
               "  report                  write into DIR the report of the files earlier runs "
@@ -331,7 +339,8 @@ TEST(CommandLine, ReportHelpShowsTheReportsUsageAndOptions) {
     ParseRun const run = parse({"report", "--help"});
     ASSERT_TRUE(run.parsed.exitStatus.has_value());
     EXPECT_EQ(*run.parsed.exitStatus, 0);
-    EXPECT_EQ(run.out, "Usage: quorvex-survey report [--from VPD_FOLDER] DIR\n"
+    EXPECT_EQ(run.out, "Usage: quorvex-survey report [--from VPD_FOLDER] [--history FILE] "
+                       "[--stale-after N] DIR\n"
                        "\n"
                        "write into DIR the report of the files earlier runs left\n"
                        "\n"
@@ -341,7 +350,11 @@ TEST(CommandLine, ReportHelpShowsTheReportsUsageAndOptions) {
                        "Options:\n"
                        "  -h, --help              print this help and exit\n"
                        "  --from VPD_FOLDER       where the status files and VPD documents are "
-                       "(default /var/adm/quorvex/VPD)\n");
+                       "(default /var/adm/quorvex/VPD)\n"
+                       "  --history FILE          show what changed in the newest run FILE "
+                       "holds of this console\n"
+                       "  --stale-after N         mark partitions not surveyed for N runs in a "
+                       "row stale (default 3)\n");
     EXPECT_EQ(run.err, "");
 }
 

@@ -2,6 +2,7 @@
 
 #include "history/HistoryDatabase.h"
 #include "report/ReportCommand.h"
+#include "report/SinceLastRunReader.h"
 
 #include <exception>
 
@@ -46,6 +47,16 @@ std::optional<std::string> RunHistory::failure() const {
         return std::nullopt;
     }
     return "cannot record the run in " + _record->file + ": " + *_record->error;
+}
+
+std::optional<report::SinceLastRun> RunHistory::sinceLastRun(int staleAfterRuns) const {
+    if (!_record) {
+        return std::nullopt;
+    }
+    if (_record->runId) {
+        return report::sinceLastRunFor(_record->file, *_record->runId, staleAfterRuns);
+    }
+    return report::historyNotRecorded(_record->error.value_or(""));
 }
 
 } // namespace fleet

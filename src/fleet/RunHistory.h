@@ -2,6 +2,7 @@
 
 #include "fleet/CommandLine.h"
 #include "report/RunSummary.h"
+#include "report/SinceLastRun.h"
 
 #include <optional>
 #include <string>
@@ -29,6 +30,10 @@ public:
     // "cannot record the run in FILE: reason" when the last attempt failed;
     // nullopt before the first.
     std::optional<std::string> failure() const;
+    // What the run's report shows of its history: the changes it brought
+    // once recorded, why not when it could not be; nullopt with
+    // --no-history.
+    std::optional<report::SinceLastRun> sinceLastRun(int staleAfterRuns) const;
 
 private:
     std::optional<report::HistoryRecord> _record;

@@ -141,7 +141,8 @@ std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::Sur
     summary.exitStatus = finalExitStatus(run, failures, listing, history);
     if (!options.reportFolder.empty()) {
         if (std::optional<std::string> const failure =
-                report::writeRunReport(report::summaryDocument(summary), options.reportFolder)) {
+                report::writeRunReport(report::summaryDocument(summary), options.reportFolder,
+                                       history.sinceLastRun(options.staleAfterRuns))) {
             failures.push_back(*failure);
         }
     }

@@ -13,6 +13,8 @@ namespace report {
 extern std::string_view const gc_PageSkeleton;
 // report.css, written inline into the page's <style>.
 extern std::string_view const gc_PageStyle;
+// history.css, added to the page's <style> when the page shows the history.
+extern std::string_view const gc_HistoryStyle;
 // report.js, written inline into the page's <script>.
 extern std::string_view const gc_PageScript;
 

@@ -25,6 +25,7 @@ TEST(PageAssets, EmbeddedPageFilesAreTheSourceFilesByteForByte) {
     ASSERT_FALSE(skeleton.empty());
     EXPECT_EQ(skeleton, report::gc_PageSkeleton);
     EXPECT_EQ(pageFile("report.css"), report::gc_PageStyle);
+    EXPECT_EQ(pageFile("history.css"), report::gc_HistoryStyle);
     EXPECT_EQ(pageFile("report.js"), report::gc_PageScript);
 }
 
@@ -40,6 +41,7 @@ std::string lowerCase(std::string_view text) {
 // early and show the rest as text.
 TEST(PageAssets, InlineStyleAndScriptHoldNoEndTagOfTheirElement) {
     EXPECT_EQ(std::string::npos, lowerCase(report::gc_PageStyle).find("</style"));
+    EXPECT_EQ(std::string::npos, lowerCase(report::gc_HistoryStyle).find("</style"));
     EXPECT_EQ(std::string::npos, lowerCase(report::gc_PageScript).find("</script"));
 }
 

@@ -1,5 +1,6 @@
 #include "report/PartitionsCsv.h"
 
+#include "report/HistoryPartitionNames.h"
 #include "report/JsonMember.h"
 #include "report/ListingFailure.h"
 #include "utility/TextSafety.h"
@@ -49,7 +50,7 @@ void appendRow(std::string& csv, std::vector<std::string> const& fields) {
 // machine listing failed (no machine, no code): no partition, the outcome
 // listing_failed, the failure as the reason.
 void appendListingFailure(std::string& csv, Json const& failure, std::string const& machine,
-                          std::string const& machineCode) {
+                          std::string const& machineCode, bool withHistory) {
     if (failure.is_null()) {
         return;
     }
@@ -60,7 +61,49 @@ void appendListingFailure(std::string& csv, Json const& failure, std::string con
                               : column == "reason" ? validUtf8(listingFailureText(failure))
                                                    : std::string();
                    });
+    if (withHistory) {
+        row.insert(row.end(), {"", ""});
+    }
     appendRow(csv, row);
+}
+
+bool hasHistory(std::optional<SinceLastRun> const& since) {
+    return since && !since->unavailable;
+}
+
+// The history's two fields of a partition.
+std::vector<std::string> historyFields(SinceLastRun const& since, std::string const& machine,
+                                       std::string const& partition) {
+    auto const found = since.partitions.find({machine, partition});
+    if (found == since.partitions.end()) {
+        return {"", ""};
+    }
+    return {validUtf8(found->second.failingSince.value_or("")),
+            validUtf8(found->second.lastSurveyed.value_or(""))};
+}
+
+// A machine's partition rows; with the history, its fields at the end.
+void appendPartitions(std::string& csv, Json const& machine,
+                      std::optional<SinceLastRun> const& since) {
+    Json const& partitions = member(machine, "partitions");
+    std::string const identity = historyMachineName(machine);
+    std::vector<std::string> const names = historyPartitionNames(partitions);
+    std::size_t index = 0;
+    for (Json const& partition : partitions) {
+        std::vector<std::string> row = {fieldText(member(machine, "identity")),
+                                        fieldText(member(machine, "return_code")),
+                                        fieldText(member(partition, "id"))};
+        std::transform(partitionColumns().begin(), partitionColumns().end(),
+                       std::back_inserter(row), [&](std::string const& column) {
+                           return fieldText(member(partition, column.c_str()));
+                       });
+        if (hasHistory(since)) {
+            std::vector<std::string> const fields = historyFields(*since, identity, names[index]);
+            row.insert(row.end(), fields.begin(), fields.end());
+        }
+        appendRow(csv, row);
+        ++index;
+    }
 }
 
 } // namespace
@@ -79,28 +122,22 @@ std::string csvField(std::string const& text) {
     return quoted + "\"";
 }
 
-std::string partitionsCsv(Json const& summary) {
+std::string partitionsCsv(Json const& summary, std::optional<SinceLastRun> const& since) {
     std::string csv;
     std::vector<std::string> header = {"machine", "machine_return_code", "partition_id"};
     header.insert(header.end(), partitionColumns().begin(), partitionColumns().end());
+    if (hasHistory(since)) {
+        header.insert(header.end(), {"failing_since", "last_surveyed"});
+    }
     appendRow(csv, header);
     for (Json const& machine : member(summary, "machines")) {
         appendListingFailure(csv, member(machine, "listing_failure"),
                              fieldText(member(machine, "identity")),
-                             fieldText(member(machine, "return_code")));
-        for (Json const& partition : member(machine, "partitions")) {
-            std::vector<std::string> row = {fieldText(member(machine, "identity")),
-                                            fieldText(member(machine, "return_code")),
-                                            fieldText(member(partition, "id"))};
-            std::transform(partitionColumns().begin(), partitionColumns().end(),
-                           std::back_inserter(row), [&](std::string const& column) {
-                               return fieldText(member(partition, column.c_str()));
-                           });
-            appendRow(csv, row);
-        }
+                             fieldText(member(machine, "return_code")), hasHistory(since));
+        appendPartitions(csv, machine, since);
     }
     if (member(summary, "machines").empty()) {
-        appendListingFailure(csv, member(summary, "listing_failure"), "", "");
+        appendListingFailure(csv, member(summary, "listing_failure"), "", "", hasHistory(since));
     }
     return csv;
 }

@@ -1,6 +1,10 @@
 #pragma once
 
+#include "report/SinceLastRun.h"
+
 #include <nlohmann/json.hpp>
+
+#include <optional>
 
 #include <string>
 
@@ -17,7 +21,14 @@ namespace report {
 // run whose machine listing failed one row without machine: the outcome
 // listing_failed and the failure (command, exit status, the console's
 // message) as the reason, every partition field empty.
-std::string partitionsCsv(nlohmann::ordered_json const& summary);
+//
+// With the history (since, unless it could not be read), two columns follow
+// at the end: failing_since and last_surveyed, the start (as the summaries
+// write it) of the failing streak's first run and of the latest run that
+// surveyed the partition, empty when there is none. Without it, the columns
+// are those above alone.
+std::string partitionsCsv(nlohmann::ordered_json const& summary,
+                          std::optional<SinceLastRun> const& since = std::nullopt);
 
 // One field of an RFC 4180 row: as it is, or quoted with inner quotes
 // doubled when it holds a comma, a double quote, CR or LF.

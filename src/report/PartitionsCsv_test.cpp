@@ -1,5 +1,7 @@
 #include "report/PartitionsCsv.h"
 
+#include "QuorvexTest.h"
+
 #include <gtest/gtest.h>
 
 namespace {
@@ -83,6 +85,20 @@ TEST(PartitionsCsv, ARunWhoseMachineListingFailedHasOneRowWithoutMachine) {
     EXPECT_EQ(std::string(header) + ",,,,,,listing_failed,,,,,,,/opt/lsvtc/bin/lsvtc -t0: "
                                     "stopped after the time limit of 1 s\r\n",
               report::partitionsCsv(summary));
+}
+
+// Without history the CSV is what it was before the history existed.
+TEST(PartitionsCsv, CsvWithoutHistoryIsTheCsvOfBefore) {
+    Json const partition = {{"id", "3"},
+                            {"host", "host3"},
+                            {"ip", "10.1.1.13"},
+                            {"outcome", "channel_failure"},
+                            {"status_text", "RELAY Failed, rc = 1"},
+                            {"return_code", "8"},
+                            {"reason", "why,\n\"so\""}};
+    EXPECT_TRUE(QuorvexTest::matchesExpectedFile(
+        report::partitionsCsv(summaryWith(partition)),
+        QuorvexTest::expectedOutputFile("report/partitions-without-history.csv")));
 }
 
 } // namespace

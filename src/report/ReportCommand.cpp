@@ -1,8 +1,11 @@
 #include "report/ReportCommand.h"
 
 #include "report/FolderReader.h"
+#include "report/JsonMember.h"
 #include "report/ReportWriter.h"
+#include "report/SinceLastRunReader.h"
 #include "utility/SystemError.h"
+#include "utility/WholeNumber.h"
 
 #include <CLI/CLI.hpp>
 #include <optional>
@@ -14,9 +17,10 @@ namespace {
 
 // Why the report could not be written ("report: cannot write ..."), or nothing.
 std::optional<std::string> reportFailure(nlohmann::ordered_json const& summary,
-                                         std::string const& vpdFolder, std::string const& folder) {
+                                         std::string const& vpdFolder, std::string const& folder,
+                                         std::optional<SinceLastRun> const& since) {
     try {
-        writeReport(summary, vpdFolder, folder);
+        writeReport(summary, vpdFolder, folder, since);
     } catch (std::exception const& failure) {
         return std::string("report: ") + failure.what();
     }
@@ -43,6 +47,45 @@ std::optional<nlohmann::ordered_json> readSummaryReporting(std::string const& vp
     return summary;
 }
 
+// The changes of the newest run the history holds of the summary's console;
+// nothing, said on errors, when it holds none or cannot be read: the report
+// is still worth writing without them.
+std::optional<SinceLastRun> newestChanges(ReportRequest const& request,
+                                          nlohmann::ordered_json const& summary,
+                                          std::ostream& errors) {
+    nlohmann::ordered_json const& host = member(summary, "console_host");
+    std::string const console = host.is_string() ? host.get<std::string>() : "";
+    try {
+        std::optional<long long> const run = newestRunOf(request.historyFile, console);
+        if (!run) {
+            errors << gc_ProgramName << ": report: " << request.historyFile
+                   << " holds no run of the console " << console
+                   << ": the report shows no changes\n";
+            return std::nullopt;
+        }
+        return readSinceLastRun(request.historyFile, *run, request.staleAfterRuns);
+    } catch (util::SystemError const& failure) {
+        errors << gc_ProgramName << ": report: " << failure.what()
+               << ": the report shows no changes\n";
+        return std::nullopt;
+    } catch (std::exception const& failure) {
+        errors << gc_ProgramName << ": report: cannot read the history " << request.historyFile
+               << ": " << failure.what() << ": the report shows no changes\n";
+        return std::nullopt;
+    }
+}
+
+// The number of runs in text, or a refusal that says what the option takes.
+int staleAfterValue(std::string const& text) {
+    std::optional<unsigned long long> const runs =
+        util::wholeNumberWithin(text, 1, gc_MostStaleAfterRuns);
+    if (!runs) {
+        throw CLI::ValidationError("--stale-after takes " + staleAfterWords() + ", not '" + text +
+                                   "'");
+    }
+    return static_cast<int>(*runs);
+}
+
 } // namespace
 
 CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request) {
@@ -54,6 +97,12 @@ CLI::App* addReportSubcommand(CLI::App& app, ReportRequest& request) {
         ->type_name("VPD_FOLDER")
         ->default_str(gc_DefaultVpdFolder)
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    command
+        ->add_option("--history", request.historyFile,
+                     "show what changed in the newest run FILE holds of this console")
+        ->type_name("FILE")
+        ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    addStaleAfterOption(*command, request.staleAfterRuns);
     command->add_option("DIR", request.folder, "folder to write the report into");
     return command;
 }
@@ -70,14 +119,31 @@ CLI::Option* addReportOption(CLI::App& app, std::string& folder) {
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
 }
 
+CLI::Option* addStaleAfterOption(CLI::App& app, int& staleAfterRuns) {
+    return app
+        .add_option_function<std::string>(
+            "--stale-after",
+            [&staleAfterRuns](std::string const& text) { staleAfterRuns = staleAfterValue(text); },
+            "mark partitions not surveyed for N runs in a row stale")
+        ->type_name("N")
+        ->default_str(std::to_string(gc_DefaultStaleAfterRuns))
+        ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+}
+
+std::string staleAfterWords() {
+    return "a whole number of runs from 1 to " + std::to_string(gc_MostStaleAfterRuns);
+}
+
 int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors) {
     std::optional<nlohmann::ordered_json> const summary =
         readSummaryReporting(request.vpdFolder, errors);
     if (!summary) {
         return gc_ExitNothingToRead;
     }
+    std::optional<SinceLastRun> const since =
+        request.historyFile.empty() ? std::nullopt : newestChanges(request, *summary, errors);
     if (std::optional<std::string> const failure =
-            reportFailure(*summary, request.vpdFolder, request.folder)) {
+            reportFailure(*summary, request.vpdFolder, request.folder, since)) {
         errors << gc_ProgramName << ": " << *failure << "\n";
         return gc_ExitCannotCreate;
     }
@@ -86,8 +152,9 @@ int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::os
 }
 
 std::optional<std::string> writeRunReport(nlohmann::ordered_json const& summary,
-                                          std::string const& folder) {
-    return reportFailure(summary, gc_DefaultVpdFolder, folder);
+                                          std::string const& folder,
+                                          std::optional<SinceLastRun> const& since) {
+    return reportFailure(summary, gc_DefaultVpdFolder, folder, since);
 }
 
 } // namespace report

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "report/SinceLastRun.h"
+
 #include <CLI/App.hpp>
 #include <nlohmann/json.hpp>
 
@@ -25,10 +27,15 @@ inline constexpr int gc_ExitNothingToRead = 64;
 // "report" alike.
 inline constexpr int gc_ExitCannotCreate = 73;
 
-// What "report [--from VPD_FOLDER] DIR" was given.
+// What "report [--from VPD_FOLDER] [--history FILE] [--stale-after N] DIR"
+// was given.
 struct ReportRequest {
     std::string vpdFolder = gc_DefaultVpdFolder;
     std::string folder;
+    // The history database whose newest run of the files' console the report
+    // compares; none: the report shows no history.
+    std::string historyFile;
+    int staleAfterRuns = gc_DefaultStaleAfterRuns;
 };
 
 // Registers the subcommand "report [--from VPD_FOLDER] DIR" on app, filling
@@ -45,8 +52,25 @@ void checkReportRequest(ReportRequest const& request);
 // Registers the option "--report DIR" on app, filling folder when given.
 CLI::Option* addReportOption(CLI::App& app, std::string& folder);
 
+// Registers "--stale-after N" on app (the run and "report"): partitions not
+// surveyed for N runs in a row are marked stale. Any other value than a whole
+// number from 1 to gc_MostStaleAfterRuns is refused while parsing with a
+// CLI::ValidationError that says what the option takes.
+CLI::Option* addStaleAfterOption(CLI::App& app, int& staleAfterRuns);
+
+// The largest --stale-after: far more runs than a console's history keeps.
+inline constexpr int gc_MostStaleAfterRuns = 1000000;
+
+// What --stale-after takes, in the words of the errors ("a whole number of
+// runs from 1 to 1000000").
+std::string staleAfterWords();
+
 // Writes the report of the survey files in request.vpdFolder into
-// request.folder and prints the page's path on out. Returns 0;
+// request.folder and prints the page's path on out. With
+// request.historyFile, the report shows what changed in the newest run the
+// history holds of the files' console (their console_host); one line on
+// errors says when the history holds none or cannot be read, and the report
+// is then written without history. Returns 0;
 // gc_ExitCannotCreate with the reason on errors when a file cannot be written; gc_ExitNothingToRead
 // with the reason on errors, writing nothing, when the VPD folder gives nothing to read.
 int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::ostream& errors);
@@ -55,7 +79,9 @@ int runReportSubcommand(ReportRequest const& request, std::ostream& out, std::os
 // the console's VPD folder; prints nothing, so that the run's standard
 // streams stay what the survey prints. Why it could not be written
 // ("report: cannot write PATH: reason"), or nothing when it was.
-[[nodiscard]] std::optional<std::string> writeRunReport(nlohmann::ordered_json const& summary,
-                                                        std::string const& folder);
+// With since, the report shows what changed since the last run.
+[[nodiscard]] std::optional<std::string>
+writeRunReport(nlohmann::ordered_json const& summary, std::string const& folder,
+               std::optional<SinceLastRun> const& since = std::nullopt);
 
 } // namespace report

@@ -1,6 +1,7 @@
 #include "report/ReportPage.h"
 
 #include "report/DocumentCopies.h"
+#include "report/HistoryPartitionNames.h"
 #include "report/JsonMember.h"
 #include "report/ListingFailure.h"
 #include "report/Outcome.h"
@@ -8,8 +9,10 @@
 #include "report/PageSkeleton.h"
 #include "report/ReadableTime.h"
 #include "report/ReportCommand.h"
+#include "report/SinceLastRunSection.h"
 #include "utility/TextSafety.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <optional>
 #include <set>
@@ -277,12 +280,13 @@ std::string reasonDetails(Json const& reason) {
 // Cells are left open (HTML closes them) to keep 50,000 rows small; only
 // the cells the style sheet colours or aligns carry a class.
 void appendPartitionRow(std::string& page, Json const& partition, std::string const& identity,
-                        std::string const& anchor, std::set<std::string> const& linkedDocuments) {
+                        std::string const& anchor, std::set<std::string> const& linkedDocuments,
+                        std::string const& historyCells) {
     RowOutcome const outcome = rowOutcome(member(partition, "outcome"));
     page += "<tr" + anchor + " class=" + outcome.pageClass + "><td>" + identity +
             "<td class=number>" + htmlText(member(partition, "id")) + "<td>" +
             htmlText(member(partition, "host")) + "<td>" + htmlText(member(partition, "ip")) +
-            "<td class=outcome>" + outcome.label + "<td>" +
+            "<td class=outcome>" + outcome.label + historyCells + "<td>" +
             htmlText(member(partition, "status_text")) + "<td class=number>" +
             secondsText(member(partition, "seconds")) + "<td>" +
             documentLink(member(partition, "document"), linkedDocuments) + "<td>" +
@@ -293,15 +297,34 @@ void appendPartitionRow(std::string& page, Json const& partition, std::string co
     page += "</tr>\n";
 }
 
+// The history's cells of a machine's partitions, in listing order; none
+// without history.
+std::vector<std::string> historyCellsOf(Json const& machine,
+                                        std::optional<SinceLastRun> const& since) {
+    Json const& partitions = member(machine, "partitions");
+    if (!since || !hasHistoryColumns(*since)) {
+        return std::vector<std::string>(partitions.size());
+    }
+    std::string const identity = historyMachineName(machine);
+    std::vector<std::string> cells = historyPartitionNames(partitions);
+    std::transform(cells.begin(), cells.end(), cells.begin(),
+                   [&](std::string const& name) { return historyCells(*since, identity, name); });
+    return cells;
+}
+
 void appendPartitionRows(std::string& page, Json const& machines,
-                         std::set<std::string> const& linkedDocuments) {
+                         std::set<std::string> const& linkedDocuments,
+                         std::optional<SinceLastRun> const& since) {
     std::size_t index = 0;
     for (Json const& machine : machines) {
         std::string const identity = htmlText(member(machine, "identity"));
+        std::vector<std::string> const history = historyCellsOf(machine, since);
         std::string anchor = " id=m" + std::to_string(index);
+        std::size_t row = 0;
         for (Json const& partition : member(machine, "partitions")) {
-            appendPartitionRow(page, partition, identity, anchor, linkedDocuments);
+            appendPartitionRow(page, partition, identity, anchor, linkedDocuments, history[row]);
             anchor.clear();
+            ++row;
         }
         ++index;
     }
@@ -335,16 +358,32 @@ std::vector<Placeholder> runPlaceholders(Json const& summary) {
         {"outcome-totals", [&totals](std::string& page) { appendOutcomeTotals(page, totals); }},
         textPlaceholder("tool", htmlText(member(summary, "tool"))),
         textPlaceholder("version", htmlText(member(summary, "version"))),
-        textPlaceholder("style", std::string(gc_PageStyle)),
         textPlaceholder("script", std::string(gc_PageScript)),
+    };
+}
+
+// The history's parts of the page: the section, the columns and the
+// history's style; all empty without history, so that the page is then
+// the page of before.
+std::vector<Placeholder> historyPlaceholders(std::optional<SinceLastRun> const& since) {
+    bool const columns = since && hasHistoryColumns(*since);
+    return {
+        textPlaceholder("style",
+                        std::string(gc_PageStyle) + (since ? std::string(gc_HistoryStyle) : "")),
+        textPlaceholder("since-last-run", since ? sinceLastRunSection(*since) : ""),
+        textPlaceholder("history-columns", columns ? historyColumns() : ""),
+        textPlaceholder("history-headings", columns ? historyHeadings() : ""),
     };
 }
 
 } // namespace
 
-std::string reportPage(Json const& summary, std::set<std::string> const& linkedDocuments) {
+std::string reportPage(Json const& summary, std::set<std::string> const& linkedDocuments,
+                       std::optional<SinceLastRun> const& since) {
     Json const& machines = member(summary, "machines");
     std::vector<Placeholder> placeholders = runPlaceholders(summary);
+    std::vector<Placeholder> const history = historyPlaceholders(since);
+    placeholders.insert(placeholders.end(), history.begin(), history.end());
     placeholders.push_back(
         {"machine-rows", [&machines](std::string& page) { appendMachineRows(page, machines); }});
     placeholders.push_back({"outcome-keys", appendOutcomeKeys});
@@ -353,7 +392,7 @@ std::string reportPage(Json const& summary, std::set<std::string> const& linkedD
                                 appendMachineOptions(page, machines);
                             }});
     placeholders.push_back({"partition-rows", [&](std::string& page) {
-                                appendPartitionRows(page, machines, linkedDocuments);
+                                appendPartitionRows(page, machines, linkedDocuments, since);
                             }});
     std::string page;
     page.reserve(expectedSize(summary));

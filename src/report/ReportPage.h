@@ -1,6 +1,10 @@
 #pragma once
 
+#include "report/SinceLastRun.h"
+
 #include <nlohmann/json.hpp>
+
+#include <optional>
 
 #include <set>
 #include <string>
@@ -16,7 +20,12 @@ namespace report {
 // escaped for HTML. linkedDocuments are the documents, as the summary names
 // them, that have a copy in the report folder's documents/ (copyDocuments());
 // each links to its copy relative to the page.
+//
+// With since, the page shows the history too: the section "Since the last
+// run" above the tables and the columns "Failing since" and "Last surveyed";
+// without it, it is the page as it was before there was a history.
 std::string reportPage(nlohmann::ordered_json const& summary,
-                       std::set<std::string> const& linkedDocuments);
+                       std::set<std::string> const& linkedDocuments,
+                       std::optional<SinceLastRun> const& since = std::nullopt);
 
 } // namespace report

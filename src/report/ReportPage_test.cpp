@@ -1,5 +1,6 @@
 #include "report/ReportPage.h"
 
+#include "QuorvexTest.h"
 #include "report/Outcome.h"
 #include "report/PageAssets.h"
 #include "report/PageSkeleton.h"
@@ -284,6 +285,16 @@ TEST(ReportPage, ARunWhoseMachineListingFailedSaysSoBesideItsTimes) {
     std::string const html = report::reportPage(run, {});
     EXPECT_NE(std::string::npos, html.find("<b>listing failed</b>: /opt/lsvtc/bin/lsvtc -t0 exited "
                                            "with status 127: not found"));
+}
+
+// The page of a run without history is the page as it was before the
+// history existed, byte for byte: the history adds to it only when it is
+// given.
+TEST(ReportPage, PageWithoutHistoryIsThePageOfBefore) {
+    std::string const html = page(Json::array(
+        {partitionEntry("1", "a", "surveyed"), partitionEntry("2", "b", "channel_failure")}));
+    EXPECT_TRUE(QuorvexTest::matchesExpectedFile(
+        html, QuorvexTest::expectedOutputFile("report/page-without-history.html")));
 }
 
 } // namespace

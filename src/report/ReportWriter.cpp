@@ -98,7 +98,7 @@ void keepPreviousReport(std::string const& base) {
 } // namespace
 
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
-                 std::string const& folder) {
+                 std::string const& folder, std::optional<SinceLastRun> const& since) {
     createFolder(folder);
     std::string const base = fs::path(folder).string() + "/";
     keepPreviousReport(base);
@@ -106,9 +106,9 @@ void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFo
     // same shape.
     createFolder(base + gc_DocumentFolder);
     writeFileAtomically(base + "summary.json", summaryText(summary));
-    writeFileAtomically(base + "partitions.csv", partitionsCsv(summary));
+    writeFileAtomically(base + "partitions.csv", partitionsCsv(summary, since));
     std::set<std::string> const copied = copyDocuments(summary, vpdFolder, folder);
-    writeFileAtomically(base + "index.html", reportPage(summary, copied));
+    writeFileAtomically(base + "index.html", reportPage(summary, copied, since));
 }
 
 } // namespace report

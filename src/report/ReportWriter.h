@@ -1,6 +1,10 @@
 #pragma once
 
+#include "report/SinceLastRun.h"
+
 #include <nlohmann/json.hpp>
+
+#include <optional>
 
 #include <string>
 
@@ -20,7 +24,12 @@ namespace report {
 // 2026-11-24T133210+0100; the page's modification time when that summary
 // cannot be read), with "-2", "-3"... added when a report of that time is
 // already kept. Nothing is ever replaced; earlier reports stay until removed.
+//
+// With since (the run's changes from the history database), the page shows
+// what changed since the last run and the CSV two columns more; without it,
+// both are what they were before there was a history.
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
-                 std::string const& folder);
+                 std::string const& folder,
+                 std::optional<SinceLastRun> const& since = std::nullopt);
 
 } // namespace report

@@ -63,6 +63,8 @@ constexpr char gc_NoMachine[] =
 constexpr char gc_JobsTake[] = "-j/--jobs takes a whole number from 1 to 1024, not ";
 constexpr char gc_TimeoutTakes[] =
     "-t/--timeout takes a whole number of seconds from 0 to 31536000, not ";
+constexpr char gc_StaleAfterTakes[] =
+    "--stale-after takes a whole number of runs from 1 to 1000000, not ";
 
 INSTANTIATE_TEST_SUITE_P(
     Cases, FleetBadCommandLine,
@@ -105,6 +107,28 @@ INSTANTIATE_TEST_SUITE_P(
                        {"report", "--bogus", "/tmp/report"},
                        "report: unknown option --bogus",
                        "quorvex-survey report"},
+        BadCommandLine{"ZeroStaleAfter",
+                       {"--all", "--stale-after", "0"},
+                       std::string(gc_StaleAfterTakes) + "'0'"},
+        BadCommandLine{"StaleAfterWithTrailingCharacters",
+                       {"--all", "--stale-after=2x"},
+                       std::string(gc_StaleAfterTakes) + "'2x'"},
+        BadCommandLine{"StaleAfterWithoutValue",
+                       {"--all", "--stale-after"},
+                       "--stale-after needs a value (a whole number of runs from 1 to 1000000)"},
+        BadCommandLine{"ReportWithTooLargeStaleAfter",
+                       {"report", "--stale-after", "1000001", "/tmp/report"},
+                       "report: " + std::string(gc_StaleAfterTakes) + "'1000001'",
+                       "quorvex-survey report"},
+        BadCommandLine{"ReportStaleAfterNotANumber",
+                       {"report", "--stale-after", "three", "/tmp/report"},
+                       "report: " + std::string(gc_StaleAfterTakes) + "'three'",
+                       "quorvex-survey report"},
+        BadCommandLine{"ReportStaleAfterWithoutValue",
+                       {"report", "/tmp/report", "--stale-after"},
+                       "report: --stale-after needs a value (a whole number of runs from 1 to "
+                       "1000000)",
+                       "quorvex-survey report"},
         BadCommandLine{"ReportWithoutFolder",
                        {"report"},
                        "report: no DIR given (the folder to write the report into)",
@@ -141,7 +165,9 @@ TEST(FleetCommandLine, ReportHelpIsPrintedAndNothingRuns) {
     SimulatedConsole const console(gc_Console);
     CommandResult const result = runSurvey({"report", "--help"});
     EXPECT_EQ(result.exitStatus, 0) << result.stderrText;
-    EXPECT_EQ(result.stdoutText.rfind("Usage: quorvex-survey report [--from VPD_FOLDER] DIR\n", 0),
+    EXPECT_EQ(result.stdoutText.rfind("Usage: quorvex-survey report [--from VPD_FOLDER] "
+                                      "[--history FILE] [--stale-after N] DIR\n",
+                                      0),
               0U)
         << result.stdoutText;
     EXPECT_EQ(console.invocations(), std::vector<QuorvexTest::Invocation>{});

@@ -4,20 +4,26 @@ machines in OUT/VPD and OUT/Trace, then writes their report into OUT/report
 with "quorvex-survey report --from OUT/VPD". Three machines are surveyed by
 the single-machine tool, once per machine; the fourth, whose one partition
 hangs, by "quorvex-survey -t 1 --summary OUT/run-summary.json --report
-OUT/run-report". Everything runs inside tools/sandbox.
+OUT/run-report". Everything runs inside tools/sandbox. Last, a history
+database of four runs of the files' console (history_seed.py) in
+OUT/history.sqlite, and the report that compares them in OUT/history-report
+("quorvex-survey report --history").
 
 The console's answers hold what operators meet: surveyed, inactive and every
 kind of failed partition, one stopped by the time limit, a host name made of
 markup, texts with & < " and a host name whose bytes are not UTF-8.
 
-Usage: make_survey.py --tool T --fleet Q --sandbox S --sim P --out OUT
+Usage: make_survey.py --tool T --fleet Q --sandbox S --sim P --source-root R --out OUT
 Exit status 77 when no sandbox can be made here (the reason on stderr).
 """
 import argparse
+import json
 import os
 import shutil
 import subprocess
 import sys
+
+import history_seed
 
 MACHINES = ["9119-MHE_21ABCDE", "8286-42A_10XYZ99", "1234-ABC_10ABCDE"]
 HANGING_MACHINE = "7063-CR2_06SLOW1"
@@ -85,6 +91,7 @@ def main():
     parser.add_argument("--fleet", required=True)
     parser.add_argument("--sandbox", required=True)
     parser.add_argument("--sim", required=True)
+    parser.add_argument("--source-root", required=True)
     parser.add_argument("--out", required=True)
     args = parser.parse_args()
 
@@ -114,13 +121,24 @@ def main():
     # The report's times in a zone of their own, half an hour off any whole
     # hour (POSIX form: no time zone files needed), so that a test can tell
     # them from UTC and from a reader's zone.
-    report = subprocess.run(
-        [args.fleet, "report", "--from", os.path.join(out, "VPD"), os.path.join(out, "report")],
-        env=dict(os.environ, TZ=RUN_ZONE), capture_output=True, check=False)
-    if report.returncode != 0:
-        sys.stderr.write(report.stderr.decode(errors="replace"))
+    if not write_report(args.fleet, out, "report"):
         return 1
-    return 0
+    with open(os.path.join(out, "report", "summary.json"), encoding="utf-8") as file:
+        history_seed.seed(os.path.join(out, "history.sqlite"), args.source_root, json.load(file))
+    return 0 if write_report(args.fleet, out, "history-report",
+                             ["--history", os.path.join(out, "history.sqlite")]) else 1
+
+
+def write_report(fleet, out, folder, options=()):
+    """The report of OUT/VPD in OUT/folder; False, with what it said, when it
+    fails or says anything on standard error."""
+    report = subprocess.run(
+        [fleet, "report", *options, "--from", os.path.join(out, "VPD"), os.path.join(out, folder)],
+        env=dict(os.environ, TZ=RUN_ZONE), capture_output=True, check=False)
+    if report.returncode != 0 or report.stderr:
+        sys.stderr.write(report.stderr.decode(errors="replace"))
+        return False
+    return True
 
 
 if __name__ == "__main__":

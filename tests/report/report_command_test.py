@@ -14,10 +14,11 @@ import sys
 import tempfile
 import unittest
 
+import report_test_runner
+
 FLEET = ""
 SOURCE_ROOT = ""
 NOTHING_TO_READ = 64
-SKIP = 77
 
 
 def report(vpd_folder, folder, prefix=()):
@@ -95,12 +96,7 @@ class ReportCommandTest(unittest.TestCase):
 def main():
     global FLEET, SOURCE_ROOT  # pylint: disable=global-statement
     FLEET, SOURCE_ROOT = sys.argv[1], sys.argv[2]
-    suite = unittest.defaultTestLoader.loadTestsFromName(sys.argv[3], sys.modules[__name__])
-    result = unittest.TextTestRunner(verbosity=2).run(suite)
-    if result.skipped and not result.failures and not result.errors:
-        print("skipped:", "; ".join(reason for _, reason in result.skipped))
-        return SKIP
-    return 0 if result.wasSuccessful() and result.testsRun > 0 else 1
+    return report_test_runner.run(sys.argv[3], sys.modules[__name__])
 
 
 if __name__ == "__main__":

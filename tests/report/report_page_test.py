@@ -19,7 +19,8 @@ import tempfile
 import unittest
 import urllib.parse
 
-SKIP = 77
+import report_test_runner
+
 MARKUP_HOST = "<img src=x onerror=alert(1)>"
 CSV_COLUMNS = ["machine", "machine_return_code", "partition_id", "host", "ip", "active_status",
                "outcome", "status_text", "return_code", "rc", "rc_cmd", "seconds", "document",
@@ -349,7 +350,22 @@ ONE_LINE = "#parts thead th, #parts tbody td:not(:has(details)), #parts summary,
            ".machines td.code, .machines td.number, .counts > span, .keys > span, .totals li b, " \
            "time, .options span, #reading dt"
 # Boxes whose content must not be cut off: headings and the cells.
-NOT_CUT = "h1, h2, th, td, #reading dt, .totals li"
+NOT_CUT = "h1, h2, h3, th, td, #reading dt, .totals li, .change-counts li"
+# The headings of a table that scrolls sideways, shown in part at its box's
+# right edge ("Docum"): each is wholly inside the box or wholly outside it.
+HEADINGS_CUT_BY_THEIR_BOX = """
+const found = [];
+for (const box of document.querySelectorAll('.table-scroll')) {
+    const edge = box.getBoundingClientRect().left + box.clientLeft + box.clientWidth;
+    for (const heading of box.querySelectorAll('thead th')) {
+        const place = heading.getBoundingClientRect();
+        if (place.left < edge - 0.5 && place.right > edge + 0.5) {
+            found.push(heading.textContent.trim() + ' cut at ' + edge);
+        }
+    }
+}
+return found;
+"""
 
 
 class LayoutTest(unittest.TestCase):
@@ -374,17 +390,18 @@ class LayoutTest(unittest.TestCase):
             cls.driver.quit()
             shutil.rmtree(cls.profile, ignore_errors=True)
 
-    def check_width(self, width):
+    def check_width(self, width, page=None, words=WORDS, one_line=ONE_LINE):
         self.driver.execute_cdp_cmd("Emulation.setDeviceMetricsOverride", {
             "width": width, "height": 1000, "deviceScaleFactor": 1, "mobile": False})
-        self.driver.get("file://" + os.path.join(REPORT, "index.html"))
+        self.driver.get("file://" + (page or os.path.join(REPORT, "index.html")))
         self.assertEqual(width, self.driver.execute_script("return window.innerWidth;"))
-        self.assertEqual([], self.driver.execute_script(BROKEN_TEXTS, WORDS, ONE_LINE))
+        self.assertEqual([], self.driver.execute_script(BROKEN_TEXTS, words, one_line))
         cut = self.driver.execute_script(
             "return Array.from(document.querySelectorAll(arguments[0]))"
             ".filter(e => e.scrollWidth > e.clientWidth).map(e => e.textContent.trim());",
             NOT_CUT)
         self.assertEqual([], cut)
+        self.assertEqual([], self.driver.execute_script(HEADINGS_CUT_BY_THEIR_BOX))
         self.assertLessEqual(self.driver.execute_script(
             "return document.documentElement.scrollWidth;"), width)
         # Opened, the reasons wrap between their words only.
@@ -403,6 +420,136 @@ class LayoutTest(unittest.TestCase):
 
     def test_no_word_broken_nor_heading_cut_at_2560_px(self):
         self.check_width(2560)
+
+
+# The history's parts of the page: its words whole, its counts, names,
+# outcomes and stale marks each on one line.
+HISTORY_WORDS = WORDS + ", #since-last-run h3, #since-last-run p, #since-last-run li"
+HISTORY_ONE_LINE = ONE_LINE + ", .change-counts li b, .change-list .machine-name, " \
+    ".change-list .outcome-name, .stale"
+
+
+def history_report():
+    return os.path.join(os.path.dirname(REPORT), "history-report")
+
+
+def csv_rows(folder):
+    with open(os.path.join(folder, "partitions.csv"), encoding="utf-8", newline="") as file:
+        return list(csv.reader(file))
+
+
+class HistoryTest(unittest.TestCase):
+    """The report of the files with a history of four runs
+    (make_survey.py, history_seed.py): what changed since the last run on
+    top, the partitions' history in the table and the CSV, stale partitions
+    marked in words and by a mark."""
+    driver = None
+    maxDiff = None
+
+    @classmethod
+    def setUpClass(cls):
+        reason = browser_missing()
+        if reason:
+            raise unittest.SkipTest(reason)
+        cls.profile = tempfile.mkdtemp(prefix="report-chromium-")
+        cls.driver = start_chromium(cls.profile)
+
+    @classmethod
+    def tearDownClass(cls):
+        if cls.driver is not None:
+            cls.driver.quit()
+            shutil.rmtree(cls.profile, ignore_errors=True)
+
+    def open_at(self, width):
+        self.driver.execute_cdp_cmd("Emulation.setDeviceMetricsOverride", {
+            "width": width, "height": 1000, "deviceScaleFactor": 1, "mobile": False})
+        self.driver.get("file://" + os.path.join(history_report(), "index.html"))
+
+    def script(self, code, *arguments):
+        return self.driver.execute_script(code, *arguments)
+
+    def check_section_on_top(self, width):
+        self.open_at(width)
+        self.assertEqual("since-last-run", self.script(
+            "return document.querySelector('main > section').id;"))
+        section, machines = self.script(
+            "return ['since-last-run', 'machines'].map(id =>"
+            " document.getElementById(id).getBoundingClientRect().toJSON());")
+        self.assertLessEqual(section["bottom"], machines["top"])
+        # Its heading and counts are on the first screen.
+        self.assertLess(self.script("return document.querySelector('.change-counts')"
+                                    ".getBoundingClientRect().bottom;"), 1000)
+
+    def test_section_is_on_top_at_900_px(self):
+        self.check_section_on_top(900)
+
+    def test_section_is_on_top_at_1600_px(self):
+        self.check_section_on_top(1600)
+
+    def test_counts_match_their_lists(self):
+        self.open_at(1600)
+        counts = self.script(
+            "return Array.from(document.querySelectorAll('.change-counts li')).map(li =>"
+            " [li.lastChild.textContent, Number(li.querySelector('b').textContent),"
+            "  (li.querySelector('a') || {}).hash || null]);")
+        self.assertEqual(9, len(counts))
+        for label, count, anchor in counts:
+            listed = self.script(
+                "const h = arguments[0] && document.querySelector(arguments[0]);"
+                "return h ? h.nextElementSibling.querySelectorAll('li').length : 0;", anchor)
+            self.assertEqual(count, listed, label)
+        self.assertEqual({"New failures": 1, "Recovered": 1, "Still failing": 6, "Inventory changes": 3,
+                          "Partitions disappeared": 1, "Machines disappeared": 1},
+                         {label: count for label, count, _ in counts if count})
+
+    def test_history_columns_follow_the_outcome_and_agree_with_the_csv(self):
+        self.open_at(1600)
+        headings = self.script("return Array.from(document.querySelectorAll('#parts thead th'))"
+                               ".map(th => th.textContent);")
+        outcome = headings.index("Outcome")
+        self.assertEqual(["Last surveyed", "Failing since"], headings[outcome + 1:outcome + 3])
+        cells = self.script(
+            "return Array.from(document.querySelectorAll('#parts tbody tr')).map(r =>"
+            " [r.cells[1].textContent, r.cells[2].textContent,"
+            "  r.cells[arguments[0] + 1].textContent, r.cells[arguments[0]].textContent]);",
+            outcome + 1)
+        rows = csv_rows(history_report())
+        self.assertEqual(CSV_COLUMNS + ["failing_since", "last_surveyed"], rows[0])
+
+        def short(iso):
+            return f"{iso[:10]} {iso[11:16]}" if iso else ""
+        expected = sorted((row[2], row[3], short(row[14]), short(row[15]) or "never")
+                          for row in rows[1:])
+        shown = sorted((i, h, since, surveyed.replace(" stale", ""))
+                       for i, h, since, surveyed in cells)
+        self.assertEqual(expected, shown)
+
+    def test_stale_partitions_are_marked_in_words_and_by_a_visible_mark(self):
+        self.open_at(1600)
+        marks = self.script(
+            "return Array.from(document.querySelectorAll('#parts .stale')).map(mark => {"
+            " const style = getComputedStyle(mark), before = getComputedStyle(mark, '::before');"
+            " const place = mark.getBoundingClientRect();"
+            " return [mark.textContent, style.borderTopStyle, style.color,"
+            "  before.backgroundImage !== 'none' && before.width === '10px',"
+            "  place.width > 0 && place.height > 0]; });")
+        # Failing since the second run, last surveyed in the first; and the
+        # inactive partitions, never surveyed in four runs.
+        failing = [p for _, p in all_partitions(load_summary()) if p["outcome"] in
+                   ("channel_failure", "client_failure", "fetch_failure", "timed_out")]
+        inactive = [p for _, p in all_partitions(load_summary()) if p["outcome"] == "inactive"]
+        self.assertEqual(len(failing) - 1 + len(inactive), len(marks))
+        body = self.script("return getComputedStyle(document.body).color;")
+        self.assertEqual({("stale", "dashed", body, True, True)},
+                         {tuple(mark) for mark in marks})
+
+    def test_history_page_is_readable_at_900_px(self):
+        LayoutTest.check_width(self, 900, os.path.join(history_report(), "index.html"),
+                               HISTORY_WORDS, HISTORY_ONE_LINE)
+
+    def test_history_page_is_readable_at_1600_px(self):
+        LayoutTest.check_width(self, 1600, os.path.join(history_report(), "index.html"),
+                               HISTORY_WORDS, HISTORY_ONE_LINE)
 
 
 def readable_time(iso):
@@ -513,13 +660,8 @@ def main():
     if not os.path.isfile(os.path.join(REPORT, "summary.json")):
         print(f"skipped: no report in {REPORT}: the survey could not be made here "
               "(see the test report.MakeSurveyAndReport)")
-        return SKIP
-    suite = unittest.defaultTestLoader.loadTestsFromName(sys.argv[2], sys.modules[__name__])
-    result = unittest.TextTestRunner(verbosity=2).run(suite)
-    if result.skipped and not result.failures and not result.errors:
-        print("skipped:", "; ".join(reason for _, reason in result.skipped))
-        return SKIP
-    return 0 if result.wasSuccessful() and result.testsRun > 0 else 1
+        return report_test_runner.SKIP
+    return report_test_runner.run(sys.argv[2], sys.modules[__name__])
 
 
 if __name__ == "__main__":

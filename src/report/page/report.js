@@ -244,6 +244,32 @@
             rowCount.textContent = "reading the partitions\u2026";
         }
         showMore.hidden = listed >= matched;
+        fitWholeColumns();
+    }
+
+    // A table wider than its box would show the column at the box's right
+    // edge cut through its heading ("Docum"): the box ends after the last
+    // column that fits whole, and the rest is scrolled to. Rows, an opened
+    // reason and the window's width change where the columns end.
+    var scrollBox = liveRows.parentNode;
+    function fitWholeColumns() {
+        scrollBox.style.width = "";
+        var room = scrollBox.clientWidth;
+        if (table.offsetWidth <= room) {
+            return;
+        }
+        var fits = 0;
+        var box = scrollBox.getBoundingClientRect();
+        var left = box.left + scrollBox.clientLeft - scrollBox.scrollLeft;
+        headers.forEach(function (header) {
+            var end = header.getBoundingClientRect().right - left;
+            if (end <= room) {
+                fits = Math.max(fits, end);
+            }
+        });
+        if (fits > 0) {
+            scrollBox.style.width = (fits + scrollBox.offsetWidth - scrollBox.clientWidth) + "px";
+        }
     }
 
     var pendingSearch = null;
@@ -293,6 +319,8 @@
             });
         });
     });
+    window.addEventListener("resize", fitWholeColumns);
+    table.addEventListener("toggle", fitWholeColumns, true);
     filterForm.hidden = false;
     render();
     setTimeout(readInBackground, 0);
