@@ -1,5 +1,7 @@
 #pragma once
 
+#include <sys/types.h>
+
 #include <string>
 
 namespace util {
@@ -13,6 +15,10 @@ namespace util {
 // ("write", path, errno of the failing call) when the file cannot be
 // written; the temporary file is removed then.
 void writeFileAtomically(std::string const& path, std::string const& text);
+
+// The same, the file getting mode whatever the umask: for files that other
+// users' programs read (a monitoring agent's textfile folder, say).
+void writeFileAtomically(std::string const& path, std::string const& text, mode_t mode);
 
 // Flushes folder's entries to the disk, so that a rename in it lasts.
 // Throws SystemError ("write", folder, errno) when it cannot; a file system
