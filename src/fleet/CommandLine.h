@@ -16,6 +16,10 @@ struct Options {
     std::string summaryFile;
     // --report DIR: the run's report is written there.
     std::string reportFolder;
+    // --metrics FILE: the run's figures for the node exporter's textfile
+    // collector; --junit FILE: the run as JUnit XML (src/monitoring).
+    std::string metricsFile;
+    std::string junitFile;
     bool quiet = false;
     // --recap (true) or --no-recap (false); nullopt: a recap when standard
     // error is a terminal and the run is not quiet.
