@@ -133,7 +133,9 @@ constexpr char gc_FrontendLockHeldOnInstall[] =
     "esac\n";
 
 constexpr char gc_Packages[] = "cmake g++ make libgtest-dev util-linux time proot python3 "
-                               "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev";
+                               "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev "
+                               "libpugixml-dev libsqlitecpp-dev prometheus "
+                               "python3-prometheus-client libxml2-utils";
 
 std::string _waitingLine(std::string const& lock, std::string const& seconds) {
     return "ensure-deps: another package manager holds apt's lock " + lock +
