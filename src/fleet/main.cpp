@@ -181,8 +181,8 @@ std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::Sur
     summary.exitStatus = finalExitStatus(run, failures, listing);
     writeOutput(
         options.summaryFile,
-        [&summary] { return report::summaryText(report::summaryDocument(summary)); },
-        std::nullopt, failures);
+        [&summary] { return report::summaryText(report::summaryDocument(summary)); }, std::nullopt,
+        failures);
     int const exitStatus = finalExitStatus(run, failures, listing);
     writeOutput(
         options.metricsFile, [&] { return metricsTextOf(summary, clock, exitStatus); },

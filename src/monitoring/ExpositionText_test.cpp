@@ -14,7 +14,10 @@ TEST(ExpositionText, LabelValueKeepsOtherMarkupAndUtf8AsTheyAre) {
 }
 
 TEST(ExpositionText, LabelValueReplacesBytesThatAreNotUtf8) {
-    EXPECT_EQ(monitoring::labelValue("a\xFF" "b"), "a\xEF\xBF\xBD" "b");
+    EXPECT_EQ(monitoring::labelValue("a\xFF"
+                                     "b"),
+              "a\xEF\xBF\xBD"
+              "b");
 }
 
 TEST(ExpositionText, HelpTextEscapesBackslashAndLineEndButNotQuotes) {

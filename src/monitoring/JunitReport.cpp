@@ -124,7 +124,8 @@ CaseCounts addMachine(pugi::xml_node suites, report::MachineSummary const& machi
         addEnding(testcase, partition, counts);
     }
     if (machine.listingFailure) {
-        addFailure(addCase(suite, machine.identity, gc_PartitionListing, 0), report::gc_ListingFailedName,
+        addFailure(addCase(suite, machine.identity, gc_PartitionListing, 0),
+                   report::gc_ListingFailedName,
                    report::listingFailureText(*machine.listingFailure));
         ++counts.tests;
         ++counts.failures;

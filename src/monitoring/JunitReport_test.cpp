@@ -44,32 +44,31 @@ TEST(JunitReport, EveryOutcomeHasItsCaseAndTheCountsAddUp) {
         machine("9119-MHE_21ABCDE", {partition("a", Outcome::Surveyed, 1.25), failed,
                                      partition("c", Outcome::Inactive, 0),
                                      partition("d", Outcome::Interrupted, 0.125), died, nameless})};
-    EXPECT_EQ(
-        monitoring::junitText(summary),
-        "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n"
-        "<testsuites name=\"quorvex-survey\" tests=\"6\" failures=\"2\" errors=\"0\" "
-        "skipped=\"2\" time=\"12.500\" timestamp=\"2026-11-24T13:32:10+00:00\">\n"
-        "  <testsuite name=\"9119-MHE_21ABCDE\" tests=\"6\" failures=\"2\" errors=\"0\" "
-        "skipped=\"2\" time=\"4.125\" hostname=\"hmc1\">\n"
-        "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"a\" time=\"1.250\" />\n"
-        "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"b\" time=\"0.500\">\n"
-        "      <failure message=\"runCmdOnPartition failed, Rc 1\" "
-        "type=\"channel_failure\">runCmdOnPartition failed, Rc 1</failure>\n"
-        "    </testcase>\n"
-        "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"c\" time=\"0.000\">\n"
-        "      <skipped message=\"inactive: VPD Survey - status\" />\n"
-        "    </testcase>\n"
-        "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"d\" time=\"0.125\">\n"
-        "      <skipped message=\"interrupted: VPD Survey - status\" />\n"
-        "    </testcase>\n"
-        "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"e\" time=\"2.000\">\n"
-        "      <failure message=\"VPD Survey - status\" type=\"worker_died\">VPD Survey - "
-        "status</failure>\n"
-        "    </testcase>\n"
-        "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"9119-MHE_21ABCDE-7\" "
-        "time=\"0.250\" />\n"
-        "  </testsuite>\n"
-        "</testsuites>\n");
+    EXPECT_EQ(monitoring::junitText(summary),
+              "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n"
+              "<testsuites name=\"quorvex-survey\" tests=\"6\" failures=\"2\" errors=\"0\" "
+              "skipped=\"2\" time=\"12.500\" timestamp=\"2026-11-24T13:32:10+00:00\">\n"
+              "  <testsuite name=\"9119-MHE_21ABCDE\" tests=\"6\" failures=\"2\" errors=\"0\" "
+              "skipped=\"2\" time=\"4.125\" hostname=\"hmc1\">\n"
+              "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"a\" time=\"1.250\" />\n"
+              "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"b\" time=\"0.500\">\n"
+              "      <failure message=\"runCmdOnPartition failed, Rc 1\" "
+              "type=\"channel_failure\">runCmdOnPartition failed, Rc 1</failure>\n"
+              "    </testcase>\n"
+              "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"c\" time=\"0.000\">\n"
+              "      <skipped message=\"inactive: VPD Survey - status\" />\n"
+              "    </testcase>\n"
+              "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"d\" time=\"0.125\">\n"
+              "      <skipped message=\"interrupted: VPD Survey - status\" />\n"
+              "    </testcase>\n"
+              "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"e\" time=\"2.000\">\n"
+              "      <failure message=\"VPD Survey - status\" type=\"worker_died\">VPD Survey - "
+              "status</failure>\n"
+              "    </testcase>\n"
+              "    <testcase classname=\"9119-MHE_21ABCDE\" name=\"9119-MHE_21ABCDE-7\" "
+              "time=\"0.250\" />\n"
+              "  </testsuite>\n"
+              "</testsuites>\n");
 }
 
 TEST(JunitReport, MachineWhoseListingFailedIsOneFailingCase) {
@@ -113,9 +112,9 @@ TEST(JunitReport, ConsoleWhoseMachineListingFailedIsOneFailingSuite) {
 
 TEST(JunitReport, HostListedAgainOnTheMachineIsNumbered) {
     report::RunSummary summary = emptyRun();
-    summary.machines = {machine("m", {partition("a", Outcome::Surveyed, 0),
-                                      partition("a", Outcome::Surveyed, 0),
-                                      partition("a", Outcome::Surveyed, 0)})};
+    summary.machines = {
+        machine("m", {partition("a", Outcome::Surveyed, 0), partition("a", Outcome::Surveyed, 0),
+                      partition("a", Outcome::Surveyed, 0)})};
     std::string const text = monitoring::junitText(summary);
     EXPECT_NE(text.find("name=\"a\" "), std::string::npos) << text;
     EXPECT_NE(text.find("name=\"a #2\" "), std::string::npos) << text;
@@ -140,12 +139,19 @@ TEST(JunitReport, MarkupInNamesAndReasonsIsEscaped) {
 TEST(JunitReport, BytesThatAreNotUtf8AndControlCharactersBecomeReplacementCharacters) {
     report::RunSummary summary = emptyRun();
     report::PartitionSummary failed = partition("h\xC3\xA9\xFF", Outcome::ClientFailure, 0);
-    failed.reason = std::string("a\x01" "b\x00" "c\td\x7f", 8);
+    failed.reason = std::string("a\x01"
+                                "b\x00"
+                                "c\td\x7f",
+                                8);
     summary.machines = {machine("m", {failed})};
     std::string const text = monitoring::junitText(summary);
     EXPECT_NE(text.find("name=\"h\xC3\xA9\xEF\xBF\xBD\" "), std::string::npos) << text;
-    EXPECT_NE(text.find("<failure message=\"a\xEF\xBF\xBD" "b\xEF\xBF\xBD" "c&#09;d\xEF\xBF\xBD\" "
-                        "type=\"client_failure\">a\xEF\xBF\xBD" "b\xEF\xBF\xBD" "c\td\xEF\xBF\xBD</failure>"),
+    EXPECT_NE(text.find("<failure message=\"a\xEF\xBF\xBD"
+                        "b\xEF\xBF\xBD"
+                        "c&#09;d\xEF\xBF\xBD\" "
+                        "type=\"client_failure\">a\xEF\xBF\xBD"
+                        "b\xEF\xBF\xBD"
+                        "c\td\xEF\xBF\xBD</failure>"),
               std::string::npos)
         << text;
 }

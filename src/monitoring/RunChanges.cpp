@@ -42,8 +42,8 @@ RunChanges countChanges(SQLite::Database& database, long long runId) {
     query.bind(1, static_cast<int64_t>(runId));
     RunChanges changes;
     while (query.executeStep()) {
-        if (long long* const count = countOf(changes, query.getColumn(0).getString(),
-                                             query.getColumn(1).getString())) {
+        if (long long* const count =
+                countOf(changes, query.getColumn(0).getString(), query.getColumn(1).getString())) {
             *count = query.getColumn(2).getInt64();
         }
     }

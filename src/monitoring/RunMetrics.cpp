@@ -4,7 +4,9 @@
 #include "report/Outcome.h"
 #include "report/SummaryTotals.h"
 
+#include <algorithm>
 #include <cstdio>
+#include <iterator>
 #include <utility>
 #include <vector>
 
@@ -96,19 +98,23 @@ std::vector<Sample> partitionSamples(std::vector<report::MachineSummary> const& 
     std::vector<Sample> samples;
     for (report::MachineSummary const& machine : machines) {
         report::OutcomeCounts const counts = report::countOutcomes(machine.partitions);
-        for (report::OutcomeText const& row : report::outcomeTable()) {
-            samples.push_back(
-                {{{"machine", machine.identity}, {"outcome", row.name}}, number(counts.of(row.outcome))});
-        }
+        auto const& outcomes = report::outcomeTable();
+        std::transform(outcomes.begin(), outcomes.end(), std::back_inserter(samples),
+                       [&](report::OutcomeText const& row) {
+                           return Sample{{{"machine", machine.identity}, {"outcome", row.name}},
+                                         number(counts.of(row.outcome))};
+                       });
     }
     return samples;
 }
 
 std::vector<Sample> listingSamples(std::vector<report::MachineSummary> const& machines) {
     std::vector<Sample> samples;
-    for (report::MachineSummary const& machine : machines) {
-        samples.push_back({{{"machine", machine.identity}}, machine.listingFailure ? "1" : "0"});
-    }
+    std::transform(
+        machines.begin(), machines.end(), std::back_inserter(samples),
+        [](report::MachineSummary const& machine) {
+            return Sample{{{"machine", machine.identity}}, machine.listingFailure ? "1" : "0"};
+        });
     return samples;
 }
 

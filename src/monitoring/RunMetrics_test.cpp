@@ -50,33 +50,42 @@ std::string runFamilies(std::string const& console, int exitStatus, bool recorde
     return "# HELP quorvex_survey_run_start_timestamp_seconds When the last run started, in "
            "seconds since the epoch.\n"
            "# TYPE quorvex_survey_run_start_timestamp_seconds gauge\n"
-           "quorvex_survey_run_start_timestamp_seconds" + labels + " 1795000000\n"
+           "quorvex_survey_run_start_timestamp_seconds" +
+           labels +
+           " 1795000000\n"
            "# HELP quorvex_survey_run_end_timestamp_seconds When the last run ended, in "
            "seconds since the epoch.\n"
            "# TYPE quorvex_survey_run_end_timestamp_seconds gauge\n"
-           "quorvex_survey_run_end_timestamp_seconds" + labels + " 1795000125\n"
+           "quorvex_survey_run_end_timestamp_seconds" +
+           labels +
+           " 1795000125\n"
            "# HELP quorvex_survey_run_duration_seconds How long the last run took, in seconds.\n"
            "# TYPE quorvex_survey_run_duration_seconds gauge\n"
-           "quorvex_survey_run_duration_seconds" + labels + " 125.250\n"
+           "quorvex_survey_run_duration_seconds" +
+           labels +
+           " 125.250\n"
            "# HELP quorvex_survey_run_exit_status The exit status of the last run (0 every "
            "partition surveyed).\n"
            "# TYPE quorvex_survey_run_exit_status gauge\n"
-           "quorvex_survey_run_exit_status" + labels + " " + std::to_string(exitStatus) + "\n"
+           "quorvex_survey_run_exit_status" +
+           labels + " " + std::to_string(exitStatus) +
+           "\n"
            "# HELP quorvex_survey_history_recorded 1 when the last run was recorded in the "
            "history database, else 0.\n"
            "# TYPE quorvex_survey_history_recorded gauge\n"
-           "quorvex_survey_history_recorded" + labels + (recorded ? " 1\n" : " 0\n");
+           "quorvex_survey_history_recorded" +
+           labels + (recorded ? " 1\n" : " 0\n");
 }
 
 std::string partitionLine(std::string const& machine, std::string const& outcome, int count) {
-    return "quorvex_survey_partitions{console=\"hmc1\",machine=\"" + machine + "\",outcome=\"" +
+    return R"(quorvex_survey_partitions{console="hmc1",machine=")" + machine + "\",outcome=\"" +
            outcome + "\"} " + std::to_string(count) + "\n";
 }
 
 std::string machineFamilies() {
     std::string text = "# HELP quorvex_survey_partitions Partitions of the last run, per machine "
                        "and outcome.\n# TYPE quorvex_survey_partitions gauge\n";
-    char const* const outcomes[] = {"surveyed",      "inactive",  "channel_failure",
+    char const* const outcomes[] = {"surveyed",       "inactive",      "channel_failure",
                                     "client_failure", "fetch_failure", "timed_out",
                                     "interrupted",    "worker_died"};
     int const first[] = {2, 1, 0, 1, 0, 0, 0, 0};
@@ -90,8 +99,10 @@ std::string machineFamilies() {
            "# HELP quorvex_survey_machine_listing_failed 1 when the console could not list the "
            "machine's partitions in the last run, else 0.\n"
            "# TYPE quorvex_survey_machine_listing_failed gauge\n"
-           "quorvex_survey_machine_listing_failed{console=\"hmc1\",machine=\"9119-MHE_21ABCDE\"} 0\n"
-           "quorvex_survey_machine_listing_failed{console=\"hmc1\",machine=\"8286-42A_10XYZ99\"} 1\n";
+           "quorvex_survey_machine_listing_failed{console=\"hmc1\",machine=\"9119-MHE_21ABCDE\"} "
+           "0\n"
+           "quorvex_survey_machine_listing_failed{console=\"hmc1\",machine=\"8286-42A_10XYZ99\"} "
+           "1\n";
 }
 
 TEST(RunMetrics, RunWithoutHistoryHasEveryMachineOutcomeAndNoChangeMetrics) {
@@ -109,11 +120,15 @@ TEST(RunMetrics, RecordedRunHasItsChangesPerKind) {
                   "# HELP quorvex_survey_new_failures Partitions failing in the last run that "
                   "were not failing in the run before it.\n"
                   "# TYPE quorvex_survey_new_failures gauge\n"
-                  "quorvex_survey_new_failures" + labels + " 2\n"
+                  "quorvex_survey_new_failures" +
+                  labels +
+                  " 2\n"
                   "# HELP quorvex_survey_recoveries Partitions surveyed in the last run that "
                   "were failing in the run before it.\n"
                   "# TYPE quorvex_survey_recoveries gauge\n"
-                  "quorvex_survey_recoveries" + labels + " 1\n"
+                  "quorvex_survey_recoveries" +
+                  labels +
+                  " 1\n"
                   "# HELP quorvex_survey_inventory_changes Component changes the last run found "
                   "against the run before it, per kind of change.\n"
                   "# TYPE quorvex_survey_inventory_changes gauge\n"
@@ -128,8 +143,7 @@ TEST(RunMetrics, RecordedRunHasItsChangesPerKind) {
 TEST(RunMetrics, HistoryRecordedWithChangesUnreadableSaysRecordedWithoutChangeMetrics) {
     monitoring::RunEnding recorded = ending(73);
     recorded.historyRecorded = true;
-    EXPECT_EQ(monitoring::metricsText(noMachines("hmc1"), recorded),
-              runFamilies("hmc1", 73, true));
+    EXPECT_EQ(monitoring::metricsText(noMachines("hmc1"), recorded), runFamilies("hmc1", 73, true));
 }
 
 TEST(RunMetrics, RunWithoutMachinesLeavesOutTheMachineFamilies) {

@@ -75,8 +75,8 @@ std::string outcomeLines(std::string const& machine, std::map<std::string, int> 
     std::string text;
     for (char const* outcome : outcomes) {
         auto const count = counts.find(outcome);
-        text += "quorvex_survey_partitions{console=\"" + Utility::get_HostName() +
-                "\",machine=\"" + machine + "\",outcome=\"" + outcome + "\"} " +
+        text += "quorvex_survey_partitions{console=\"" + Utility::get_HostName() + "\",machine=\"" +
+                machine + "\",outcome=\"" + outcome + "\"} " +
                 std::to_string(count == counts.end() ? 0 : count->second) + "\n";
     }
     return text;
@@ -137,11 +137,10 @@ std::string expectedSteadyMetrics() {
            "# TYPE quorvex_survey_history_recorded gauge\n"
            "quorvex_survey_history_recorded" +
            console + "} 0\nquorvex_survey_machine_listing_failed" + console + ",machine=\"" +
-           gc_Identity + "\"} 0\nquorvex_survey_machine_listing_failed" + console +
-           ",machine=\"" + gc_Unknown + "\"} 1\n" +
+           gc_Identity + "\"} 0\nquorvex_survey_machine_listing_failed" + console + ",machine=\"" +
+           gc_Unknown + "\"} 1\n" +
            outcomeLines(gc_Identity, {{"surveyed", 1}, {"inactive", 1}, {"client_failure", 1}}) +
-           outcomeLines(gc_Unknown, {}) + "quorvex_survey_run_exit_status" +
-           console + "} 4\n";
+           outcomeLines(gc_Unknown, {}) + "quorvex_survey_run_exit_status" + console + "} 4\n";
 }
 
 // The value of the one sample of metric in read-metrics.py's lines.
@@ -156,9 +155,9 @@ double sampleValue(std::string const& lines, std::string const& metric) {
 
 TEST_F(FleetSignals, MetricsOfAMixedRunPassPromtoolAndTheClientParserReadsTheirFigures) {
     SimulatedConsole const console(mixedConsole());
-    double const before = static_cast<double>(std::time(nullptr));
+    auto const before = static_cast<double>(std::time(nullptr));
     EXPECT_EQ(_run({"--metrics", _metrics(), gc_Identity, gc_Unknown}), 4) << _stderr();
-    double const after = static_cast<double>(std::time(nullptr));
+    auto const after = static_cast<double>(std::time(nullptr));
     QuorvexTest::CommandResult const lint =
         QuorvexTest::runShell(std::string(gc_Promtool) + " check metrics < " + _metrics());
     EXPECT_EQ(lint.exitStatus, 0) << lint.stdoutText << lint.stderrText;
@@ -167,7 +166,8 @@ TEST_F(FleetSignals, MetricsOfAMixedRunPassPromtoolAndTheClientParserReadsTheirF
         QuorvexTest::runCommand({gc_Python, gc_MetricsReader, _metrics()});
     ASSERT_EQ(read.exitStatus, 0) << read.stdoutText << read.stderrText;
     EXPECT_EQ(steadyMetrics(read.stdoutText), expectedSteadyMetrics());
-    double const started = sampleValue(read.stdoutText, "quorvex_survey_run_start_timestamp_seconds");
+    double const started =
+        sampleValue(read.stdoutText, "quorvex_survey_run_start_timestamp_seconds");
     double const ended = sampleValue(read.stdoutText, "quorvex_survey_run_end_timestamp_seconds");
     double const duration = sampleValue(read.stdoutText, "quorvex_survey_run_duration_seconds");
     EXPECT_LE(before, started);
@@ -183,17 +183,22 @@ std::string expectedJunitCases() {
     std::string const reason =
         "Partition not surveyed, reason: \\nPartition Failed.\\n\\n[     Rc] = 0\\n[  RcCmd] = "
         "3\\n[RetStr1] = " +
-        std::string(gc_HostileMessage) + "\\n[RetStr2] = \\n\\n\\n";
+        std::string(gc_HostileMessage) + R"(\n[RetStr2] = \n\n\n)";
     std::string const machine = std::string("    ") + gc_Identity + " | ";
     return "testsuites tests=4 failures=2 errors=0 skipped=1\n"
-           "  " + std::string(gc_Identity) + " tests=3 failures=1 errors=0 skipped=1\n" +
-           machine + gc_HostileHost + " | passed\n" + machine + gc_OtherHost +
+           "  " +
+           std::string(gc_Identity) + " tests=3 failures=1 errors=0 skipped=1\n" + machine +
+           gc_HostileHost + " | passed\n" + machine + gc_OtherHost +
            " | failure client_failure: " + reason + "\n" + machine +
            "idle | skipped: inactive: Failed - Active Status < 3\n"
-           "  " + gc_Unknown + " tests=1 failures=1 errors=0 skipped=0\n"
-           "    " + gc_Unknown + " | partition listing | failure listing_failed: "
-           "/opt/vtc/bin/lspartition -ix -c " + gc_Unknown +
-           " exited with status 1: lspartition: managed system not found\n";
+           "  " +
+           gc_Unknown +
+           " tests=1 failures=1 errors=0 skipped=0\n"
+           "    " +
+           gc_Unknown +
+           " | partition listing | failure listing_failed: "
+           "/opt/vtc/bin/lspartition -ix -c " +
+           gc_Unknown + " exited with status 1: lspartition: managed system not found\n";
 }
 
 TEST_F(FleetSignals, JunitOfAMixedRunIsValidAndReadsBackEveryNameAndReason) {
@@ -203,8 +208,9 @@ TEST_F(FleetSignals, JunitOfAMixedRunIsValidAndReadsBackEveryNameAndReason) {
         QuorvexTest::runCommand({gc_Python, gc_JunitReader, _junit()});
     ASSERT_EQ(read.exitStatus, 0) << read.stdoutText << read.stderrText;
     EXPECT_EQ(read.stdoutText, expectedJunitCases());
-    QuorvexTest::CommandResult const valid = QuorvexTest::runCommand(
-        {gc_Xmllint, "--noout", "--schema", QuorvexTest::sourceRoot() + "/docs/junit.xsd", _junit()});
+    QuorvexTest::CommandResult const valid =
+        QuorvexTest::runCommand({gc_Xmllint, "--noout", "--schema",
+                                 QuorvexTest::sourceRoot() + "/docs/junit.xsd", _junit()});
     EXPECT_EQ(valid.exitStatus, 0) << valid.stdoutText << valid.stderrText;
 }
 
@@ -232,8 +238,8 @@ TEST_F(FleetSignals, MetricsFolderThatCannotBeMadeEndsWith73BeforeAnyConsoleComm
     SimulatedConsole const console(mixedConsole());
     QuorvexTest::writeFile(_work.file("file"), "x");
     EXPECT_EQ(_run({"--metrics", _work.file("file/m/run.prom"), gc_Identity}), 73);
-    EXPECT_EQ(_stderr(), "quorvex-survey: cannot create " + _work.file("file/m") +
-                             ": Not a directory\n");
+    EXPECT_EQ(_stderr(),
+              "quorvex-survey: cannot create " + _work.file("file/m") + ": Not a directory\n");
     EXPECT_EQ(console.logText(), "") << "a console command ran";
 }
 

@@ -2,8 +2,9 @@
 """Reads a metrics file with the Prometheus client's own text parser:
 read-metrics.py FILE. Prints one line per sample, "name{label="value",...} value",
 labels sorted by name and values as the parser read them (unescaped), whole
-numbers without a fraction, samples sorted; the families' types first, "# TYPE name type". Exit status 0 when the
-file parses; otherwise the problem is printed and the status is 1."""
+numbers without a fraction, samples sorted; the families' types first,
+"# TYPE name type". Exit status 0 when the file parses; otherwise the
+problem is printed and the status is 1."""
 
 import sys
 
