@@ -16,11 +16,15 @@
 
 #include <sys/stat.h>
 
+#include <chrono>
+#include <csignal>
+
 #include <cstdio>
 #include <ctime>
 #include <filesystem>
 #include <map>
 #include <sstream>
+#include <thread>
 
 namespace {
 
@@ -82,6 +86,19 @@ std::string outcomeLines(std::string const& machine, std::map<std::string, int> 
     return text;
 }
 
+// The umask set while the run is started, which inherits it; the test's own
+// files do not depend on it.
+class UmaskForAMoment {
+public:
+    explicit UmaskForAMoment(mode_t mask) : _previous(::umask(mask)) {}
+    ~UmaskForAMoment() { ::umask(_previous); }
+    UmaskForAMoment(UmaskForAMoment const&) = delete;
+    UmaskForAMoment& operator=(UmaskForAMoment const&) = delete;
+
+private:
+    mode_t _previous;
+};
+
 class FleetSignals : public ::testing::Test {
 protected:
     void SetUp() override {
@@ -90,17 +107,20 @@ protected:
         QuorvexTest::clearFolder(QuorvexTest::gc_TraceFolder);
     }
 
-    // quorvex-survey with these arguments under umask, its exit status;
-    // its output goes to files in _work.
-    int _run(std::vector<std::string> const& arguments, mode_t umask = 022,
-             std::optional<rlim_t> fileSizeLimit = {}) {
+    // quorvex-survey with these arguments under umask, started; its output
+    // goes to files in _work.
+    SurveyProcess _start(std::vector<std::string> const& arguments, mode_t umask = 022,
+                         std::optional<rlim_t> fileSizeLimit = {}) const {
         std::vector<std::string> argv{FleetTest::consoleWideTool()};
         argv.insert(argv.end(), arguments.begin(), arguments.end());
-        // The run inherits the umask; the test's own files do not depend on it.
-        mode_t const previous = ::umask(umask);
-        SurveyProcess survey(argv, _work.file("stdout"), _work.file("stderr"), fileSizeLimit);
-        ::umask(previous);
-        return survey.waitForExit(gc_Bound);
+        UmaskForAMoment const mask(umask);
+        return SurveyProcess(argv, _work.file("stdout"), _work.file("stderr"), fileSizeLimit);
+    }
+
+    // The same run to its end: its exit status.
+    int _run(std::vector<std::string> const& arguments, mode_t umask = 022,
+             std::optional<rlim_t> fileSizeLimit = {}) const {
+        return _start(arguments, umask, fileSizeLimit).waitForExit(gc_Bound);
     }
 
     std::string _stderr() const { return QuorvexTest::readFile(_work.file("stderr")); }
@@ -272,6 +292,41 @@ TEST_F(FleetSignals, MetricsFileThatCannotBeWrittenIsNamedAfterTheBlockAndEndsWi
                              _metrics() + ": File too large\n");
     EXPECT_EQ(QuorvexTest::listFolder(_work.file("metrics")), std::vector<std::string>{});
     EXPECT_TRUE(QuorvexTest::fileExists(_junit()));
+}
+
+// Waits until the console has been asked to run the client somewhere.
+bool waitForAClientRun(SimulatedConsole const& console) {
+    double const until = FleetTest::monotonicSeconds() + gc_Bound;
+    while (FleetTest::monotonicSeconds() < until) {
+        if (console.logText().find("runCmdOnPartition") != std::string::npos) {
+            return true;
+        }
+        std::this_thread::sleep_for(std::chrono::milliseconds(50));
+    }
+    return false;
+}
+
+// A run stopped by SIGTERM while its one partition's client run hangs: the
+// partition is skipped as interrupted, and the metrics, written last, say
+// the run exited 143.
+TEST_F(FleetSignals, InterruptedRunHasItsPartitionSkippedAndItsSignalsExitStatus) {
+    SimulatedConsole const console(std::string("[lspartition ") + gc_Identity +
+                                   "]\nstdout 1,10.1.1.1,3,db1,Zeph,7.2;\n"
+                                   "[runCmdOnPartition *]\ndelay 3600\n");
+    SurveyProcess survey = _start({"--metrics", _metrics(), "--junit", _junit(), gc_Identity});
+    ASSERT_TRUE(waitForAClientRun(console)) << "the partition's survey never started";
+    survey.signal(SIGTERM);
+    EXPECT_EQ(survey.waitForExit(gc_Bound), 128 + SIGTERM) << _stderr();
+    QuorvexTest::CommandResult const metrics =
+        QuorvexTest::runCommand({gc_Python, gc_MetricsReader, _metrics()});
+    EXPECT_EQ(sampleValue(metrics.stdoutText, "quorvex_survey_run_exit_status"), 143.0)
+        << metrics.stdoutText;
+    QuorvexTest::CommandResult const junit =
+        QuorvexTest::runCommand({gc_Python, gc_JunitReader, _junit()});
+    EXPECT_EQ(junit.stdoutText,
+              std::string("testsuites tests=1 failures=0 errors=0 skipped=1\n  ") + gc_Identity +
+                  " tests=1 failures=0 errors=0 skipped=1\n    " + gc_Identity +
+                  " | db1 | skipped: interrupted: Interrupted - not surveyed\n");
 }
 
 } // namespace
