@@ -1,14 +1,15 @@
 #include "monitoring/JunitReport.h"
 
+#include "monitoring/SecondsText.h"
 #include "report/ListingFailure.h"
 #include "report/Outcome.h"
 #include "utility/TextSafety.h"
 
 #include <pugixml.hpp>
 
-#include <cstdio>
 #include <map>
 #include <sstream>
+#include <variant>
 
 namespace monitoring {
 
@@ -31,12 +32,6 @@ std::string xmlText(std::string const& text) {
         }
     }
     return result;
-}
-
-std::string seconds(double value) {
-    char text[32];
-    std::snprintf(text, sizeof text, "%.3f", value);
-    return text;
 }
 
 void setAttribute(pugi::xml_node node, char const* name, std::string const& value) {
@@ -64,7 +59,7 @@ void setCounts(pugi::xml_node node, CaseCounts const& counts) {
     // Every partition ends failed, skipped or passed: none is an error.
     setAttribute(node, "errors", "0");
     setAttribute(node, "skipped", std::to_string(counts.skipped));
-    setAttribute(node, "time", seconds(counts.seconds));
+    setAttribute(node, "time", secondsText(counts.seconds));
 }
 
 pugi::xml_node addCase(pugi::xml_node suite, std::string const& classname, std::string const& name,
@@ -72,7 +67,7 @@ pugi::xml_node addCase(pugi::xml_node suite, std::string const& classname, std::
     pugi::xml_node testcase = suite.append_child("testcase");
     setAttribute(testcase, "classname", classname);
     setAttribute(testcase, "name", name);
-    setAttribute(testcase, "time", seconds(time));
+    setAttribute(testcase, "time", secondsText(time));
     return testcase;
 }
 
@@ -170,7 +165,7 @@ std::string junitText(report::RunSummary const& summary) {
     }
     setCounts(suites, total);
     // The run's own time: partitions ran side by side.
-    suites.attribute("time").set_value(seconds(elapsedOf(summary)).c_str());
+    suites.attribute("time").set_value(secondsText(elapsedOf(summary)).c_str());
     setAttribute(suites, "timestamp", summary.started);
     std::ostringstream text;
     document.save(text, "  ", pugi::format_indent, pugi::encoding_utf8);

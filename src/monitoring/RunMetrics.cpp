@@ -1,11 +1,11 @@
 #include "monitoring/RunMetrics.h"
 
 #include "monitoring/ExpositionText.h"
+#include "monitoring/SecondsText.h"
 #include "report/Outcome.h"
 #include "report/SummaryTotals.h"
 
 #include <algorithm>
-#include <cstdio>
 #include <iterator>
 #include <utility>
 #include <vector>
@@ -87,13 +87,6 @@ std::string number(long long value) {
     return std::to_string(value);
 }
 
-// Milliseconds are the finest the run measures to any purpose.
-std::string seconds(double value) {
-    char text[32];
-    std::snprintf(text, sizeof text, "%.3f", value);
-    return text;
-}
-
 std::vector<Sample> partitionSamples(std::vector<report::MachineSummary> const& machines) {
     std::vector<Sample> samples;
     for (report::MachineSummary const& machine : machines) {
@@ -139,7 +132,7 @@ std::string metricsText(report::RunSummary const& summary, RunEnding const& endi
     }
     exposition.add(gc_Started, {{{}, number(ending.startedUnix)}});
     exposition.add(gc_Ended, {{{}, number(ending.endedUnix)}});
-    exposition.add(gc_Duration, {{{}, seconds(ending.durationSeconds)}});
+    exposition.add(gc_Duration, {{{}, secondsText(ending.durationSeconds)}});
     exposition.add(gc_ExitStatus, {{{}, number(ending.exitStatus)}});
     exposition.add(gc_HistoryRecorded, {{{}, ending.historyRecorded ? "1" : "0"}});
     return exposition.text();
