@@ -135,7 +135,8 @@ constexpr char gc_FrontendLockHeldOnInstall[] =
 
 constexpr char gc_Packages[] = "cmake g++ make libgtest-dev util-linux time proot python3 "
                                "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev "
-                               "systemd man-db libsqlite3-dev libsqlitecpp-dev";
+                               "systemd man-db libsqlite3-dev libsqlitecpp-dev libpugixml-dev "
+                               "prometheus python3-prometheus-client libxml2-utils";
 
 std::string _waitingLine(std::string const& lock, std::string const& seconds) {
     return "ensure-deps: another package manager holds apt's lock " + lock +

@@ -140,6 +140,18 @@ void addHistoryOptions(CLI::App& app, Options& options) {
     history->excludes(noHistory);
 }
 
+// The files monitoring and CI dashboards read.
+void addMonitoringOptions(CLI::App& app, Options& options) {
+    app.add_option("--metrics", options.metricsFile,
+                   "write the run's figures for the node exporter's textfile collector to FILE "
+                   "(*.prom)")
+        ->type_name("FILE")
+        ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    app.add_option("--junit", options.junitFile, "write the run as JUnit XML to FILE")
+        ->type_name("FILE")
+        ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+}
+
 // The survey's options; the report subcommand adds its own.
 void addSurveyOptions(CLI::App& app, Options& options) {
     addWholeNumber(app, gc_Jobs, options.jobs,
@@ -158,6 +170,7 @@ void addSurveyOptions(CLI::App& app, Options& options) {
     app.add_option("IDENTITY", options.identities, "a managed machine (type-model_serial)");
     report::addReportOption(app, options.reportFolder);
     report::addStaleAfterOption(app, options.staleAfterRuns);
+    addMonitoringOptions(app, options);
 }
 
 // The long options app knows, for guessing what a mistyped one meant.
@@ -314,10 +327,12 @@ struct OutputName {
     char const* what;
     std::string Options::*value;
 };
-constexpr std::array<OutputName, 3> gc_OutputNames{
+constexpr std::array<OutputName, 5> gc_OutputNames{
     {{"--summary", "a file name", &Options::summaryFile},
      {"--report", "a folder name", &Options::reportFolder},
-     {"--history", "a file name", &Options::historyFile}}};
+     {"--history", "a file name", &Options::historyFile},
+     {"--metrics", "a file name", &Options::metricsFile},
+     {"--junit", "a file name", &Options::junitFile}}};
 
 // An empty name would turn the output off without a word (an unset
 // variable in a timer's script, say). The parser takes the next word as the

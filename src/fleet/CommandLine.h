@@ -21,6 +21,10 @@ struct Options {
     // --stale-after N: the report marks partitions not surveyed for N runs
     // in a row stale.
     int staleAfterRuns = report::gc_DefaultStaleAfterRuns;
+    // --metrics FILE: the run's figures for the node exporter's textfile
+    // collector; --junit FILE: the run as JUnit XML (src/monitoring).
+    std::string metricsFile;
+    std::string junitFile;
     bool quiet = false;
     // --recap (true) or --no-recap (false); nullopt: a recap when standard
     // error is a terminal and the run is not quiet.

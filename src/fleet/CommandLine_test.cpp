@@ -57,6 +57,21 @@ TEST(CommandLine, EmptySummaryOrReportNameIsRefused) {
                   "--report needs a folder name, not an empty value");
 }
 
+TEST(CommandLine, EmptyMetricsOrJunitNameIsRefused) {
+    expectRefused({"--metrics", "", "9119-MHE_21ABCDE"},
+                  "--metrics needs a file name, not an empty value");
+    expectRefused({"--junit=", "--all"}, "--junit needs a file name, not an empty value");
+}
+
+TEST(CommandLine, MetricsAndJunitFilesAreReadAndOffUnlessGiven) {
+    EXPECT_EQ(parse({"--all"}).parsed.options.metricsFile, "");
+    EXPECT_EQ(parse({"--all"}).parsed.options.junitFile, "");
+    ParseRun const run =
+        parse({"--metrics", "a.prom", "--junit=j.xml", "--metrics", "b.prom", "--all"});
+    EXPECT_EQ(run.parsed.options.metricsFile, "b.prom");
+    EXPECT_EQ(run.parsed.options.junitFile, "j.xml");
+}
+
 TEST(CommandLine, DefaultsAreEightJobsAndHalfAnHour) {
     ParseRun const run = parse({"9119-MHE_21ABCDE"});
     EXPECT_FALSE(run.parsed.exitStatus.has_value());
@@ -180,6 +195,8 @@ TEST(CommandLine, OptionWithoutItsValueSaysWhatValueItNeeds) {
     expectRefused({"A_1", "--summary"}, "--summary needs a value (a file name)");
     expectRefused({"A_1", "--summary="}, "--summary needs a value (a file name)");
     expectRefused({"A_1", "--report"}, "--report needs a value (a folder name)");
+    expectRefused({"A_1", "--metrics"}, "--metrics needs a value (a file name)");
+    expectRefused({"A_1", "--junit"}, "--junit needs a value (a file name)");
     expectRefused({"A_1", "-j"}, "-j/--jobs needs a value (a whole number from 1 to 1024)");
     expectRefused({"A_1", "-qj"}, "-j/--jobs needs a value (a whole number from 1 to 1024)");
     expectRefused({"A_1", "--timeout"},
@@ -292,6 +309,9 @@ TEST(CommandLine, HelpGoesToStandardOutputInPlainWordsAndEndsWithZero) {
               "  --report DIR            after the run, write its report into DIR\n"
               "  --stale-after N         mark partitions not surveyed for N runs in a row "
               "stale (default 3)\n"
+              "  --metrics FILE          write the run's figures for the node exporter's "
+              "textfile collector to FILE (*.prom)\n"
+              "  --junit FILE            write the run as JUnit XML to FILE\n"
               "\n"
               "Subcommands:\n"
               "  report                  write into DIR the report of the files earlier runs "

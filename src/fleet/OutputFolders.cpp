@@ -42,9 +42,9 @@ void createFolder(std::string const& folder) {
     }
 }
 
-// The summary replaces its file by a rename, which a folder in its place
-// would refuse at the end of the run.
-void proveSummaryPath(std::string const& path) {
+// The summary, metrics and JUnit files replace their file by a rename,
+// which a folder in its place would refuse at the end of the run.
+void proveFilePath(std::string const& path) {
     createFolder(folderOf(path));
     proveWritable(folderOf(path));
     struct stat status {};
@@ -74,7 +74,12 @@ std::vector<std::string> unwritableOutputs(Options const& options) {
     check(failures, &proveWritable, folderOf(statusFilePath("")));
     check(failures, &proveWritable, folderOf(traceFilePath("")));
     if (!options.summaryFile.empty()) {
-        check(failures, &proveSummaryPath, options.summaryFile);
+        check(failures, &proveFilePath, options.summaryFile);
+    }
+    for (std::string const* file : {&options.metricsFile, &options.junitFile}) {
+        if (!file->empty()) {
+            check(failures, &proveFilePath, *file);
+        }
     }
     if (!options.reportFolder.empty()) {
         check(failures, &proveReportFolder, options.reportFolder);

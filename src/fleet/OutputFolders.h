@@ -13,8 +13,8 @@ namespace fleet {
 //
 // The result folders (/var/adm/quorvex/VPD and Trace) must exist: like the
 // single-machine tool, quorvex-survey never creates them (the package does).
-// The folders of --summary and --report are created when missing, both
-// alike. Each folder is proven by creating and removing a file in it, which
+// The folders of --summary, --report, --metrics and --junit are created
+// when missing, all alike. Each folder is proven by creating and removing a file in it, which
 // also holds for root and for read-only mounts.
 
 // Why each output cannot be written ("cannot create /x/y: Not a directory",

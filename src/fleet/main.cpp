@@ -11,6 +11,8 @@
 #include "fleet/Summary.h"
 #include "fleet/SurveyRun.h"
 #include "fleet/TerminalWidth.h"
+#include "monitoring/JunitReport.h"
+#include "monitoring/RunMetrics.h"
 #include "report/ReportCommand.h"
 #include "report/RunSummary.h"
 #include "utility/AtomicFile.h"
@@ -20,12 +22,14 @@
 
 #include <poll.h>
 #include <sys/prctl.h>
+#include <sys/types.h>
 #include <unistd.h>
 
 #include <chrono>
 #include <csignal>
 #include <ctime>
 #include <filesystem>
+#include <functional>
 #include <iostream>
 
 namespace {
@@ -123,9 +127,62 @@ report::RunSummary summaryOf(fleet::Options const& options, fleet::SurveyRun con
     return fleet::runSummary(facts, run.machines());
 }
 
+// The node exporter's textfile collector runs as another user: the metrics
+// file is readable by all whatever the run's umask.
+constexpr mode_t gc_MetricsFileMode = 0644;
+
+// Writes the text made by textOf to path when one was given, with mode, or
+// else the mode a new file gets; what could not be written joins failures.
+void writeOutput(std::string const& path, std::function<std::string()> const& textOf,
+                 std::optional<mode_t> mode, std::vector<std::string>& failures) {
+    if (path.empty()) {
+        return;
+    }
+    try {
+        if (mode) {
+            util::writeFileAtomically(path, textOf(), *mode);
+        } else {
+            util::writeFileAtomically(path, textOf());
+        }
+    } catch (util::SystemError const& failure) {
+        failures.emplace_back(failure.what());
+    }
+}
+
+// The run's figures, as they stand once every other file was written.
+// The run's changes as its history computed them, when it recorded the run
+// and they can be read back; else nothing, which the metrics leave out
+// rather than claim that nothing changed.
+std::optional<monitoring::RunChanges> changesOf(fleet::RunHistory const& history) {
+    std::optional<report::HistoryRecord> const& record = history.member();
+    if (!record || !record->runId) {
+        return std::nullopt;
+    }
+    try {
+        return monitoring::runChangesOf(record->file, *record->runId);
+    } catch (std::exception const&) {
+        return std::nullopt;
+    }
+}
+
+std::string metricsTextOf(report::RunSummary const& summary, RunClock const& clock,
+                          int exitStatus, fleet::RunHistory const& history) {
+    monitoring::RunEnding ending;
+    ending.startedUnix = clock.started;
+    ending.endedUnix = std::time(nullptr);
+    ending.durationSeconds =
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - clock.startedAt).count();
+    ending.exitStatus = exitStatus;
+    ending.historyRecorded = history.member() && history.member()->recorded;
+    ending.changes = changesOf(history);
+    return monitoring::metricsText(summary, ending);
+}
+
 // The history first (the status files and traces are written by now), then
-// the report, which shows the run's changes, then the summary, so that the
-// summary's exit status counts a report that could not be written. Returns
+// the report, which shows the run's changes, the JUnit file, then the
+// summary, so that the summary's exit status counts a report or JUnit file
+// that could not be written; the metrics last, so that they carry the run's
+// final exit status. Returns
 // what could not be written, "cannot write PATH: reason" each.
 std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::SurveyRun const& run,
                                        RunClock const& clock, fleet::MachineListing const& listing,
@@ -146,15 +203,18 @@ std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::Sur
             failures.push_back(*failure);
         }
     }
+    writeOutput(
+        options.junitFile, [&summary] { return monitoring::junitText(summary); }, std::nullopt,
+        failures);
     summary.exitStatus = finalExitStatus(run, failures, listing, history);
-    try {
-        if (!options.summaryFile.empty()) {
-            util::writeFileAtomically(options.summaryFile,
-                                      report::summaryText(report::summaryDocument(summary)));
-        }
-    } catch (util::SystemError const& failure) {
-        failures.emplace_back(failure.what());
-    }
+    writeOutput(
+        options.summaryFile,
+        [&summary] { return report::summaryText(report::summaryDocument(summary)); }, std::nullopt,
+        failures);
+    int const exitStatus = finalExitStatus(run, failures, listing, history);
+    writeOutput(
+        options.metricsFile, [&] { return metricsTextOf(summary, clock, exitStatus, history); },
+        gc_MetricsFileMode, failures);
     return failures;
 }
 
@@ -164,7 +224,8 @@ std::vector<std::string> writeRunFiles(fleet::Options const& options, fleet::Sur
 // runs through system(), which ignores SIGINT in its caller meanwhile, and a
 // signal then must still reach the run. Asked here when no child can be made.
 std::string consoleHostFor(fleet::Options const& options) {
-    if (options.summaryFile.empty() && options.reportFolder.empty() && !options.recordHistory) {
+    if (options.summaryFile.empty() && options.reportFolder.empty() && !options.recordHistory &&
+        options.metricsFile.empty() && options.junitFile.empty()) {
         return {};
     }
     fleet::ChildProcess child([] { return Utility::get_HostName(); });

@@ -52,6 +52,12 @@ void flushFolderToDisk(std::string const& folder) {
 }
 
 void writeFileAtomically(std::string const& path, std::string const& text) {
+    // The file gets the mode any file written in place would get, as the
+    // survey tool's files do.
+    writeFileAtomically(path, text, newFileMode());
+}
+
+void writeFileAtomically(std::string const& path, std::string const& text, mode_t mode) {
     std::string const pattern = folderOf(path) + "/." + baseNameOf(path) + ".XXXXXX";
     std::vector<char> temporary(pattern.begin(), pattern.end());
     temporary.push_back('\0');
@@ -59,9 +65,8 @@ void writeFileAtomically(std::string const& path, std::string const& text) {
     if (descriptor < 0) {
         throw SystemError(gc_Operation, path, errno);
     }
-    // mkstemp makes the file readable by its owner only; the file gets the
-    // mode any file written in place would get, as the survey tool's files do.
-    ::fchmod(descriptor, newFileMode());
+    // mkstemp makes the file readable by its owner only.
+    ::fchmod(descriptor, mode);
     bool const complete = writeAll(descriptor, text) && ::fsync(descriptor) == 0;
     int const error = errno;
     bool const closed = ::close(descriptor) == 0;

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <sys/types.h>
+
 #include <string>
 
 namespace util {
@@ -15,6 +17,10 @@ namespace util {
 // only the folder's flush fails, the new file is in place and the same
 // error is thrown: the rename may not outlast a crash.
 void writeFileAtomically(std::string const& path, std::string const& text);
+
+// The same, the file getting mode whatever the umask: for files that other
+// users' programs read (a monitoring agent's textfile folder, say).
+void writeFileAtomically(std::string const& path, std::string const& text, mode_t mode);
 
 // Flushes folder's entries to the disk, so that a rename in it lasts.
 // Throws SystemError ("write", folder, errno) when it cannot; a file system

@@ -42,11 +42,16 @@ TEST(AtomicFile, ReplacesAnExistingFile) {
 
 // The permissions, in octal, of a file made by the writer under umask, read
 // in a child process, since umask is the whole process's.
-std::string modeUnderUmask(mode_t mask) {
+// With a mode given, the file is written with it.
+std::string modeUnderUmask(mode_t mask, std::optional<mode_t> mode = std::nullopt) {
     QuorvexTest::TemporaryDirectory folder;
-    auto const result = QuorvexTest::runInChild([&folder, mask] {
+    auto const result = QuorvexTest::runInChild([&folder, mask, mode] {
         ::umask(mask);
-        util::writeFileAtomically(folder.file("out"), "x");
+        if (mode) {
+            util::writeFileAtomically(folder.file("out"), "x", *mode);
+        } else {
+            util::writeFileAtomically(folder.file("out"), "x");
+        }
         struct stat status {};
         if (::stat(folder.file("out").c_str(), &status) != 0) {
             return 1;
@@ -62,6 +67,11 @@ TEST(AtomicFile, FileHasTheModeOfAnyNewFileUnderTheUmask) {
     EXPECT_EQ("644", modeUnderUmask(022));
     EXPECT_EQ("640", modeUnderUmask(027));
     EXPECT_EQ("664", modeUnderUmask(002));
+}
+
+TEST(AtomicFile, FileGivenAModeHasItWhateverTheUmask) {
+    EXPECT_EQ("644", modeUnderUmask(077, 0644));
+    EXPECT_EQ("644", modeUnderUmask(0, 0644));
 }
 
 // What writeFileAtomically throws for path, if anything.

@@ -176,12 +176,7 @@ TEST(ScheduledSurvey, TimerRunsTheServiceDailyAtAFixedlyDelayedTimeAndCatchesUpM
 // theirs (bound to scratch folders).
 TEST(ScheduledSurvey, ServiceCommandLineSurveysTheConsoleIntoTheServicesFolders) {
     std::string const root = u_installedRoot();
-    EnvironmentFile options = u_shippedOptions(root);
-    // Options this build of quorvex-survey does not have yet.
-    for (char const* name :
-         {"QUORVEX_SURVEY_HISTORY", "QUORVEX_SURVEY_METRICS", "QUORVEX_SURVEY_JUNIT"}) {
-        options.set(name, "");
-    }
+    EnvironmentFile const options = u_shippedOptions(root);
     std::string const scratch = std::string(QUORVEX_UNITS_SCRATCH) + "/" + u_testName() + "-run";
     std::error_code ignored;
     fs::remove_all(scratch, ignored);
@@ -197,8 +192,10 @@ TEST(ScheduledSurvey, ServiceCommandLineSurveysTheConsoleIntoTheServicesFolders)
         u_command(root, options));
     EXPECT_EQ(run.exitStatus, 4) << run.stderrText;
     EXPECT_EQ(QuorvexTest::listFolder(scratch + "/state"),
-              (std::vector<std::string>{"report", "summary.json"}));
+              (std::vector<std::string>{"history.sqlite", "junit.xml", "report", "summary.json"}));
     EXPECT_TRUE(QuorvexTest::fileExists(scratch + "/state/report/index.html"));
+    EXPECT_EQ(QuorvexTest::listFolder(scratch + "/metrics"),
+              std::vector<std::string>{"quorvex-survey.prom"});
     EXPECT_EQ(QuorvexTest::listFolder(scratch + "/Trace").size(), 2U);
 }
 

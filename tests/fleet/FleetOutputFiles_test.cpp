@@ -40,10 +40,10 @@ constexpr char gc_Hang[] = "child-delay 3600\ndelay 3600\n";
 // A run that never ends within it was waiting for a hung console command.
 constexpr double gc_Bound = 30.0;
 constexpr char gc_BlockEnd[] = "\nquorvexPYLON_VPD_Survey_ClientPartition ReturnCode: \n";
-// The history database, in the sandbox's own state folder, is past a file
-// size limit of a few hundred bytes at its first page: named after the files
-// that could not be written, its exit status 74 outweighed by their 73.
-constexpr char gc_HistoryPastTheLimit[] =
+// The history database, in the sandbox's own state folder, cannot be written
+// either (past a file size limit at its first page, or not flushed): named
+// after the files that could not be written, its 74 outweighed by their 73.
+constexpr char gc_HistoryNotWritten[] =
     "quorvex-survey: cannot record the run in "
     "/var/lib/quorvex-survey/history.sqlite: disk I/O error\n";
 
@@ -144,7 +144,7 @@ TEST_F(FleetOutputFiles, StatusFileAndSummaryThatCannotBeWrittenAreNamedAndEndWi
     EXPECT_EQ(_stderr(), std::string(gc_BlockEnd) + "8\nquorvex-survey: cannot write " +
                              gc_StatusFile + ": File too large\nquorvex-survey: cannot write " +
                              gc_TraceFile + ": File too large\nquorvex-survey: cannot write " +
-                             summary + ": File too large\n" + gc_HistoryPastTheLimit);
+                             summary + ": File too large\n" + gc_HistoryNotWritten);
     EXPECT_EQ(QuorvexTest::listFolder(QuorvexTest::gc_VPD_Folder), std::vector<std::string>{})
         << "a cut status file or its temporary file was left";
     EXPECT_EQ(QuorvexTest::readFile(gc_TraceFile).size(), 1000U);
@@ -165,7 +165,7 @@ TEST_F(FleetOutputFiles, DefaultDocumentThatCannotBeWrittenIsNamedAndEndsWith73)
         "quorvexPYLON_VPD_Survey_ClientPartition_1234-ABC_10ABCDE-1.VPD.xml";
     EXPECT_EQ(_stderr(), std::string("8\n") + gc_BlockEnd + "8\nquorvex-survey: cannot write " +
                              document + ": File too large\nquorvex-survey: cannot write " +
-                             summary + ": File too large\n" + gc_HistoryPastTheLimit);
+                             summary + ": File too large\n" + gc_HistoryNotWritten);
     EXPECT_EQ(QuorvexTest::readFile(document).size(), 1200u)
         << "the survey code leaves its document cut short under its name, as the tool does";
 }
@@ -221,7 +221,8 @@ TEST_F(FleetOutputFiles, SurveyTracePieceThatCannotBeWrittenIsNamedAndEndsWith73
 
 // A disk whose flush fails (fsync and fdatasync fail with EIO in the run and
 // its workers, for root too): every file quorvex-survey writes under a
-// temporary name is named, its old version stays, and nothing else is left.
+// temporary name is named, its old version stays, and nothing else is left;
+// the history, which SQLite flushes too, is not recorded.
 TEST_F(FleetOutputFiles, FilesThatCannotBeFlushedToTheDiskAreNamedAndTheOldOnesStay) {
     SimulatedConsole const console(listing(gc_Identity, 1, true) + surveyedActions());
     std::string const summary = _work.file("summary.json");
@@ -239,7 +240,7 @@ TEST_F(FleetOutputFiles, FilesThatCannotBeFlushedToTheDiskAreNamedAndTheOldOnesS
                              ": Input/output error\nquorvex-survey: report: cannot write " +
                              _work.file("report/summary.json") +
                              ": Input/output error\nquorvex-survey: cannot write " + summary +
-                             ": Input/output error\n");
+                             ": Input/output error\n" + gc_HistoryNotWritten);
     EXPECT_EQ(QuorvexTest::readFile(gc_StatusFile), "old status\n");
     EXPECT_EQ(QuorvexTest::readFile(gc_TraceFile), "old trace\n");
     EXPECT_EQ(QuorvexTest::readFile(summary), "{}\n");
