@@ -114,7 +114,7 @@ TEST_F(FleetListingFailure, AnIdentityTheConsoleDoesNotKnowIsListingFailedWithTh
     std::string const csv = QuorvexTest::readFile(_work.file("report/partitions.csv"));
     EXPECT_NE(csv.find("9119-MHE_21ABCDX,8,,,,,listing_failed,,,,,,,/opt/vtc/bin/lspartition -ix "
                        "-c 9119-MHE_21ABCDX exited with status 1: lspartition: managed system "
-                       "not found\r\n"),
+                       "not found,,\r\n"),
               std::string::npos)
         << csv;
     EXPECT_NE(QuorvexTest::readFile(_work.file("report/index.html"))

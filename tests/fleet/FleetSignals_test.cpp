@@ -148,19 +148,29 @@ std::string steadyMetrics(std::string const& text) {
 // the run's times, which vary (read-metrics.py's form).
 std::string expectedSteadyMetrics() {
     std::string const console = "{console=\"" + Utility::get_HostName() + "\"";
+    std::string const host = Utility::get_HostName();
+    std::string changes;
+    for (char const* change : {"added", "property_changed", "removed", "replaced"}) {
+        changes += std::string("quorvex_survey_inventory_changes{change=\"") + change +
+                   "\",console=\"" + host + "\"} 0\n";
+    }
     return "# TYPE quorvex_survey_partitions gauge\n"
            "# TYPE quorvex_survey_machine_listing_failed gauge\n"
+           "# TYPE quorvex_survey_new_failures gauge\n"
+           "# TYPE quorvex_survey_recoveries gauge\n"
+           "# TYPE quorvex_survey_inventory_changes gauge\n"
            "# TYPE quorvex_survey_run_start_timestamp_seconds gauge\n"
            "# TYPE quorvex_survey_run_end_timestamp_seconds gauge\n"
            "# TYPE quorvex_survey_run_duration_seconds gauge\n"
            "# TYPE quorvex_survey_run_exit_status gauge\n"
            "# TYPE quorvex_survey_history_recorded gauge\n"
            "quorvex_survey_history_recorded" +
-           console + "} 0\nquorvex_survey_machine_listing_failed" + console + ",machine=\"" +
-           gc_Identity + "\"} 0\nquorvex_survey_machine_listing_failed" + console + ",machine=\"" +
-           gc_Unknown + "\"} 1\n" +
+           console + "} 1\n" + changes + "quorvex_survey_machine_listing_failed" + console +
+           ",machine=\"" + gc_Identity + "\"} 0\nquorvex_survey_machine_listing_failed" + console +
+           ",machine=\"" + gc_Unknown + "\"} 1\nquorvex_survey_new_failures" + console + "} 0\n" +
            outcomeLines(gc_Identity, {{"surveyed", 1}, {"inactive", 1}, {"client_failure", 1}}) +
-           outcomeLines(gc_Unknown, {}) + "quorvex_survey_run_exit_status" + console + "} 4\n";
+           outcomeLines(gc_Unknown, {}) + "quorvex_survey_recoveries" + console +
+           "} 0\nquorvex_survey_run_exit_status" + console + "} 4\n";
 }
 
 // The value of the one sample of metric in read-metrics.py's lines.
@@ -284,12 +294,14 @@ TEST_F(FleetSignals, MetricsCarryTheExitStatusOfAStatusFileThatCannotBeWritten) 
 }
 
 // One inactive partition under a limit of 1,500 bytes: every file but the
-// metrics (about 2,500 bytes) is written.
+// metrics (about 2,500 bytes) and the history database is written.
 TEST_F(FleetSignals, MetricsFileThatCannotBeWrittenIsNamedAfterTheBlockAndEndsWith73) {
     SimulatedConsole const console(inactiveConsole(1));
     EXPECT_EQ(_run({"--metrics", _metrics(), "--junit", _junit(), gc_Identity}, 022, 1500), 73);
     EXPECT_EQ(_stderr(), std::string(gc_BlockEnd) + "8\nquorvex-survey: cannot write " +
-                             _metrics() + ": File too large\n");
+                             _metrics() +
+                             ": File too large\nquorvex-survey: cannot record the run in "
+                             "/var/lib/quorvex-survey/history.sqlite: disk I/O error\n");
     EXPECT_EQ(QuorvexTest::listFolder(_work.file("metrics")), std::vector<std::string>{});
     EXPECT_TRUE(QuorvexTest::fileExists(_junit()));
 }
