@@ -281,18 +281,31 @@ ParsedCommandLine endingWith(std::string const& text) {
     return parsed;
 }
 
+// The subcommands, which survey nothing.
+struct Subcommands {
+    CLI::App const* report;
+    CLI::App const* estate;
+};
+
 // Reads what app was given; throws CLI::ParseError with the reason in plain
 // words when it is refused.
-void readCommandLine(CLI::App& app, CLI::App const& reportCommand, ParsedCommandLine& parsed,
+void readCommandLine(CLI::App& app, Subcommands const& subcommands, ParsedCommandLine& parsed,
                      int argc, char const* const* argv) {
     app.parse(argc, argv);
     refuseLeftOver(app);
-    if (reportCommand.parsed()) {
-        refuseLeftOver(reportCommand);
+    if (subcommands.report->parsed()) {
+        refuseLeftOver(*subcommands.report);
         report::checkReportRequest(*parsed.reportRequest);
+        parsed.estateRequest.reset();
         return;
     }
     parsed.reportRequest.reset();
+    if (subcommands.estate->parsed()) {
+        refuseLeftOver(*subcommands.estate);
+        estate::checkEstateRequest(*parsed.estateRequest);
+        return;
+    }
+    parsed.estateRequest.reset();
     refuseEmptyOutputNames(app, parsed.options, argc, argv);
     checkMachines(app, parsed.options);
     keepFirstOfEach(parsed);
@@ -314,9 +327,11 @@ ParsedCommandLine parseCommandLine(int argc, char const* const* argv) {
     app.set_version_flag("--version", versionText(), "print the version and exit");
     addSurveyOptions(app, parsed.options);
     parsed.reportRequest.emplace();
-    CLI::App const* const reportCommand = report::addReportSubcommand(app, *parsed.reportRequest);
+    parsed.estateRequest.emplace();
+    Subcommands const subcommands{report::addReportSubcommand(app, *parsed.reportRequest),
+                                  estate::addEstateSubcommand(app, *parsed.estateRequest)};
     try {
-        readCommandLine(app, *reportCommand, parsed, argc, argv);
+        readCommandLine(app, subcommands, parsed, argc, argv);
     } catch (CLI::CallForHelp const&) {
         return endingWith(app.help());
     } catch (CLI::CallForVersion const&) {

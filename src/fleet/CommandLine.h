@@ -1,5 +1,6 @@
 #pragma once
 
+#include "estate/EstateCommand.h"
 #include "report/ReportCommand.h"
 
 #include <optional>
@@ -40,6 +41,8 @@ struct ParsedCommandLine {
     std::vector<std::string> warnings;
     // Set for "report [--from VPD_FOLDER] DIR", which surveys nothing.
     std::optional<report::ReportRequest> reportRequest;
+    // Set for "estate --from COLLECT_DIR --report DIR", which surveys nothing.
+    std::optional<estate::EstateRequest> estateRequest;
 };
 
 constexpr int gc_ExitUsage = 64;

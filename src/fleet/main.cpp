@@ -251,6 +251,9 @@ int main(int argc, char** argv) {
     if (parsed.reportRequest) {
         return report::runReportSubcommand(*parsed.reportRequest, std::cout, std::cerr);
     }
+    if (parsed.estateRequest) {
+        return estate::runEstateSubcommand(*parsed.estateRequest, std::cout, std::cerr);
+    }
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;
     }

@@ -49,21 +49,11 @@ std::string fieldText(Json const& value) {
     return value.dump();
 }
 
-void appendRow(std::string& csv, std::vector<std::string> const& fields) {
-    for (std::size_t i = 0; i < fields.size(); ++i) {
-        if (i > 0) {
-            csv += ',';
-        }
-        csv += csvField(fields[i]);
-    }
-    csv += gc_RowEnd;
-}
-
 // The row of a machine whose partition listing failed, or of a run whose
 // machine listing failed (no machine, no code): no partition, the outcome
 // listing_failed, the failure as the reason.
-void appendListingFailure(std::string& csv, Json const& failure, std::string const& machine,
-                          std::string const& machineCode) {
+void addListingFailure(CsvRows& rows, Json const& failure, std::string const& machine,
+                       std::string const& machineCode) {
     if (failure.is_null()) {
         return;
     }
@@ -74,20 +64,33 @@ void appendListingFailure(std::string& csv, Json const& failure, std::string con
                               : column == "reason" ? validUtf8(listingFailureText(failure))
                                                    : std::string();
                    });
-    appendRow(csv, row);
+    rows.push_back(std::move(row));
 }
 
 } // namespace
 
-std::string partitionsCsv(Json const& summary) {
-    std::string csv;
+void appendCsvRow(std::string& csv, std::vector<std::string> const& fields) {
+    for (std::size_t i = 0; i < fields.size(); ++i) {
+        if (i > 0) {
+            csv += ',';
+        }
+        csv += csvField(fields[i]);
+    }
+    csv += gc_RowEnd;
+}
+
+std::vector<std::string> partitionsCsvHeader() {
     std::vector<std::string> header = {"machine", "machine_return_code", "partition_id"};
     header.insert(header.end(), partitionColumns().begin(), partitionColumns().end());
-    appendRow(csv, header);
+    return header;
+}
+
+CsvRows partitionsCsvRows(Json const& summary) {
+    CsvRows rows;
     for (Json const& machine : member(summary, "machines")) {
-        appendListingFailure(csv, member(machine, "listing_failure"),
-                             fieldText(member(machine, "identity")),
-                             fieldText(member(machine, "return_code")));
+        addListingFailure(rows, member(machine, "listing_failure"),
+                          fieldText(member(machine, "identity")),
+                          fieldText(member(machine, "return_code")));
         for (Json const& partition : member(machine, "partitions")) {
             std::vector<std::string> row = {fieldText(member(machine, "identity")),
                                             fieldText(member(machine, "return_code")),
@@ -96,11 +99,20 @@ std::string partitionsCsv(Json const& summary) {
                            std::back_inserter(row), [&](std::string const& column) {
                                return fieldText(member(partition, column.c_str()));
                            });
-            appendRow(csv, row);
+            rows.push_back(std::move(row));
         }
     }
     if (member(summary, "machines").empty()) {
-        appendListingFailure(csv, member(summary, "listing_failure"), "", "");
+        addListingFailure(rows, member(summary, "listing_failure"), "", "");
+    }
+    return rows;
+}
+
+std::string partitionsCsv(Json const& summary) {
+    std::string csv;
+    appendCsvRow(csv, partitionsCsvHeader());
+    for (std::vector<std::string> const& row : partitionsCsvRows(summary)) {
+        appendCsvRow(csv, row);
     }
     return csv;
 }

@@ -3,6 +3,7 @@
 #include <nlohmann/json.hpp>
 
 #include <string>
+#include <vector>
 
 namespace report {
 
@@ -18,5 +19,14 @@ namespace report {
 // listing_failed and the failure (command, exit status, the console's
 // message) as the reason, every partition field empty.
 std::string partitionsCsv(nlohmann::ordered_json const& summary);
+
+// The same table in parts, for a CSV that adds columns of its own (the
+// estate's console columns before these).
+using CsvRows = std::vector<std::vector<std::string>>;
+std::vector<std::string> partitionsCsvHeader();
+CsvRows partitionsCsvRows(nlohmann::ordered_json const& summary);
+// Appends one row of fields as partitionsCsv writes rows: quoted where
+// needed, ending with CRLF.
+void appendCsvRow(std::string& csv, std::vector<std::string> const& fields);
 
 } // namespace report

@@ -18,6 +18,7 @@
 //   FlushCountingBuffer.h a string buffer counting its flushes
 
 #include "ChildProcess.h"
+#include "CollectFolder.h"
 #include "DescriptorLimit.h"
 #include "ExpectedOutput.h"
 #include "FlushCountingBuffer.h"
