@@ -7,10 +7,13 @@ tests and benchmarks can have estates of any size.
 Partition p of a machine: one in ten fails (channel, client, fetch in turn),
 one in twenty is inactive, the rest are surveyed. With --not-collected the
 first four consoles are unreachable, timed out, stale (with its bundle) and a
-tool error, in that order; the rest are collected.
+tool error, in that order; the rest are collected. With --hostile-names the
+last console's name and the first partition's host of each of its machines
+carry markup, quotes and non-ASCII letters, as a careless inventory or
+console might give them.
 
 Usage: make_estate.py --out DIR [--consoles 5] [--machines 3] [--partitions 4]
-                      [--not-collected] [--documents]
+                      [--not-collected] [--documents] [--hostile-names]
 """
 import argparse
 import json
@@ -31,6 +34,8 @@ NOT_COLLECTED = (
     ("stale", "the newest run is older than 86400 s", 0, 266400),
     ("tool_error", "quorvex-survey exited with status 69: cannot list the managed machines", 69, None),
 )
+HOSTILE_CONSOLE = "console-\"<b>Zürich</b>\" & 'ñ'"
+HOSTILE_HOST = "<img src=x onerror=alert(1)>\"é\".example"
 OUTCOMES = ("surveyed", "inactive", "channel_failure", "client_failure", "fetch_failure",
             "timed_out", "interrupted", "worker_died")
 
@@ -87,7 +92,7 @@ def summary_of(console, host, machines, partitions, documents_folder):
 
 def write_json(path, value):
     with open(path, "w", encoding="utf-8") as file:
-        json.dump(value, file, indent=1)
+        json.dump(value, file, indent=1, ensure_ascii=False)
 
 
 def lay_down_bundle(out, index, name, arguments):
@@ -97,6 +102,9 @@ def lay_down_bundle(out, index, name, arguments):
     host = f"pylon-{index:02d}.example"
     summary = summary_of(index, host, arguments.machines, arguments.partitions,
                          vpd if arguments.documents else None)
+    if arguments.hostile_names and name == HOSTILE_CONSOLE:
+        for machine in summary["machines"]:
+            machine["partitions"][0]["host"] = HOSTILE_HOST
     write_json(os.path.join(folder, "summary.json"), summary)
     write_json(os.path.join(folder, "bundle.json"), {
         "schema_version": 1, "console": name, "console_host": host, "mode": "run",
@@ -105,8 +113,14 @@ def lay_down_bundle(out, index, name, arguments):
     return summary["exit_status"]
 
 
+def console_name(index, arguments):
+    if arguments.hostile_names and index == arguments.consoles - 1:
+        return HOSTILE_CONSOLE
+    return f"console-{index:02d}"
+
+
 def console_record(out, index, arguments):
-    name = f"console-{index:02d}"
+    name = console_name(index, arguments)
     record = {"console": name, "record": "collected", "message": None, "exit_status": None,
               "age_seconds": None, "bundle": f"consoles/{name}"}
     if arguments.not_collected and index < len(NOT_COLLECTED):
@@ -129,6 +143,7 @@ def main():
     parser.add_argument("--partitions", type=int, default=4)
     parser.add_argument("--not-collected", action="store_true")
     parser.add_argument("--documents", action="store_true")
+    parser.add_argument("--hostile-names", action="store_true")
     arguments = parser.parse_args()
     os.makedirs(arguments.out, exist_ok=True)
     records = [console_record(arguments.out, index, arguments)
