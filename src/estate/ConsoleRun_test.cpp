@@ -17,7 +17,8 @@ estate::ConsoleRecord recordOf(std::string const& console, estate::RecordKind ki
     return record;
 }
 
-std::string const gc_Summary = CollectFolder::summary({CollectFolder::partition("1", "h1", "surveyed")});
+std::string const gc_Summary =
+    CollectFolder::summary({CollectFolder::partition("1", "h1", "surveyed")});
 
 TEST(ConsoleRun, ACollectedConsoleReadsItsBundle) {
     CollectFolder const folder;
@@ -61,7 +62,8 @@ TEST(ConsoleRun, ABundleOfAnotherSchemaVersionMakesAToolError) {
     estate::ConsoleRun const run = estate::readConsoleRun(
         folder.path(), recordOf("a", estate::RecordKind::Stale, "consoles/a"));
     EXPECT_EQ(estate::RecordKind::ToolError, run.record.kind);
-    EXPECT_EQ("bundle unreadable: " + folder.path() + "/consoles/a/bundle.json: schema_version is not 1",
+    EXPECT_EQ("bundle unreadable: " + folder.path() +
+                  "/consoles/a/bundle.json: schema_version is not 1",
               run.record.message);
 }
 
@@ -71,15 +73,16 @@ TEST(ConsoleRun, ABundlePathOutsideTheCollectFolderIsNotRead) {
         estate::ConsoleRun const run = estate::readConsoleRun(
             folder.path(), recordOf("a", estate::RecordKind::Collected, bundle));
         EXPECT_EQ(estate::RecordKind::ToolError, run.record.kind) << bundle;
-        EXPECT_EQ("bundle unreadable: the bundle path " + bundle + " is not inside the collect folder",
+        EXPECT_EQ("bundle unreadable: the bundle path " + bundle +
+                      " is not inside the collect folder",
                   run.record.message);
     }
 }
 
 TEST(ConsoleRun, ACollectedConsoleWithoutBundleIsAToolError) {
     CollectFolder const folder;
-    estate::ConsoleRun const run =
-        estate::readConsoleRun(folder.path(), recordOf("a", estate::RecordKind::Collected, std::nullopt));
+    estate::ConsoleRun const run = estate::readConsoleRun(
+        folder.path(), recordOf("a", estate::RecordKind::Collected, std::nullopt));
     EXPECT_EQ(estate::RecordKind::ToolError, run.record.kind);
     EXPECT_EQ("bundle unreadable: records.json names no bundle for a collected console",
               run.record.message);

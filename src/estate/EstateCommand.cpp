@@ -45,8 +45,9 @@ void reportNotCollected(Estate const& estate, std::ostream& errors) {
 CLI::App* addEstateSubcommand(CLI::App& app, EstateRequest& request) {
     CLI::App* const command = app.add_subcommand(
         "estate", "merge the consoles' bundles in COLLECT_DIR into one estate report in DIR");
-    command->add_option("--from", request.collectFolder,
-                        "the collect folder: records.json and consoles/<name>/ bundles")
+    command
+        ->add_option("--from", request.collectFolder,
+                     "the collect folder: records.json and consoles/<name>/ bundles")
         ->type_name("COLLECT_DIR")
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
     command->add_option("--report", request.reportFolder, "folder to write the estate report into")
@@ -57,10 +58,12 @@ CLI::App* addEstateSubcommand(CLI::App& app, EstateRequest& request) {
 
 void checkEstateRequest(EstateRequest const& request) {
     if (request.collectFolder.empty()) {
-        throw CLI::ValidationError("no --from COLLECT_DIR given (the folder the collection filled)");
+        throw CLI::ValidationError(
+            "no --from COLLECT_DIR given (the folder the collection filled)");
     }
     if (request.reportFolder.empty()) {
-        throw CLI::ValidationError("no --report DIR given (the folder to write the estate report into)");
+        throw CLI::ValidationError(
+            "no --report DIR given (the folder to write the estate report into)");
     }
 }
 

@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include <sstream>
+#include <sys/stat.h>
 
 namespace {
 
@@ -26,7 +27,8 @@ Ending runEstate(std::string const& collectFolder, std::string const& reportFold
 }
 
 void layDownTwoConsoles(CollectFolder const& folder) {
-    folder.addBundle("up", CollectFolder::summary({CollectFolder::partition("1", "h1", "surveyed")}),
+    folder.addBundle("up",
+                     CollectFolder::summary({CollectFolder::partition("1", "h1", "surveyed")}),
                      {"h1.VPD.xml"});
     folder.writeRecords(CollectFolder::records(
         {CollectFolder::record("up", "collected", true, "null", "0"),
@@ -40,11 +42,27 @@ TEST(EstateCommand, WritesTheEstateAndNamesEachConsoleNotCollected) {
     Ending const ending = runEstate(folder.path(), report.file("estate"));
     EXPECT_EQ(0, ending.status);
     EXPECT_EQ(report.file("estate") + "/index.html\n", ending.out);
-    EXPECT_EQ("quorvex-survey: estate: console down: unreachable: Connection refused\n", ending.errors);
+    EXPECT_EQ("quorvex-survey: estate: console down: unreachable: Connection refused\n",
+              ending.errors);
     for (char const* name : {"index.html", "estate.csv", "estate.json", "consoles/up/index.html",
                              "consoles/up/documents/h1.VPD.xml"}) {
         EXPECT_TRUE(QuorvexTest::fileExists(report.file("estate") + "/" + name)) << name;
     }
+}
+
+// A copy of each document, flushed one by one, would cost the estate one disk
+// flush per partition.
+TEST(EstateCommand, ConsolesDocumentIsLinkedToTheBundlesOwn) {
+    CollectFolder const folder;
+    layDownTwoConsoles(folder);
+    QuorvexTest::TemporaryDirectory const report;
+    ASSERT_EQ(0, runEstate(folder.path(), report.path()).status);
+    struct stat bundled {};
+    struct stat shown {};
+    ASSERT_EQ(0, ::stat((folder.path() + "/consoles/up/VPD/h1.VPD.xml").c_str(), &bundled));
+    ASSERT_EQ(0, ::stat(report.file("consoles/up/documents/h1.VPD.xml").c_str(), &shown));
+    EXPECT_EQ(bundled.st_ino, shown.st_ino);
+    EXPECT_EQ("<doc/>", QuorvexTest::readFile(report.file("consoles/up/documents/h1.VPD.xml")));
 }
 
 TEST(EstateCommand, EstateJsonListsEveryConsoleOnceWithItsRecord) {
@@ -93,7 +111,8 @@ TEST(EstateCommand, AReportFolderThatCannotBeMadeIsExit73) {
     QuorvexTest::writeFile(report.file("file"), "");
     Ending const ending = runEstate(folder.path(), report.file("file/estate"));
     EXPECT_EQ(73, ending.status);
-    EXPECT_EQ("quorvex-survey: estate: cannot create " + report.file("file/estate") + ": Not a directory\n",
+    EXPECT_EQ("quorvex-survey: estate: cannot create " + report.file("file/estate") +
+                  ": Not a directory\n",
               ending.errors);
 }
 

@@ -2,6 +2,8 @@
 
 #include "report/PartitionsCsv.h"
 
+#include <utility>
+
 namespace estate {
 
 EstateCsv::EstateCsv() {
@@ -12,8 +14,10 @@ EstateCsv::EstateCsv() {
     report::appendCsvRow(_text, header);
 }
 
-void EstateCsv::add(ConsoleRun const& console, std::optional<nlohmann::ordered_json> const& summary) {
-    std::vector<std::string> const leading = {console.record.console, textOf(console.record.kind).name,
+void EstateCsv::add(ConsoleRun const& console,
+                    std::optional<nlohmann::ordered_json> const& summary) {
+    std::vector<std::string> const leading = {console.record.console,
+                                              textOf(console.record.kind).name,
                                               console.record.message, console.consoleHost};
     report::CsvRows const rows = summary ? report::partitionsCsvRows(*summary) : report::CsvRows();
     if (rows.empty()) {
@@ -31,6 +35,10 @@ void EstateCsv::add(ConsoleRun const& console, std::optional<nlohmann::ordered_j
 
 std::string const& EstateCsv::text() const {
     return _text;
+}
+
+std::string EstateCsv::takeText() && {
+    return std::move(_text);
 }
 
 } // namespace estate

@@ -22,6 +22,9 @@ public:
     void add(ConsoleRun const& console, std::optional<nlohmann::ordered_json> const& summary);
 
     std::string const& text() const;
+    // The text, leaving nothing behind: the estate writes it and needs the
+    // memory for the next output.
+    std::string takeText() &&;
 
 private:
     std::string _text;

@@ -8,7 +8,8 @@ namespace {
 
 using QuorvexTest::CollectFolder;
 
-estate::ConsoleRun consoleRun(std::string const& name, estate::RecordKind kind, std::string const& message) {
+estate::ConsoleRun consoleRun(std::string const& name, estate::RecordKind kind,
+                              std::string const& message) {
     estate::ConsoleRun run;
     run.record.console = name;
     run.record.kind = kind;
@@ -25,14 +26,16 @@ TEST(EstateCsv, EachConsolesRowsFollowTheConsolesColumnsAndAConsoleWithoutRowsHa
             nlohmann::ordered_json::parse(CollectFolder::summary(
                 {CollectFolder::partition("1", "h1", "surveyed"),
                  CollectFolder::partition("2", "h,2", "channel_failure", "line 1\nline 2")})));
-    EXPECT_EQ(
-        "console,record,record_message,console_host,machine,machine_return_code,partition_id,host,ip,"
-        "active_status,outcome,status_text,return_code,rc,rc_cmd,seconds,document,reason\r\n"
-        "down,unreachable,\"Connection refused, \"\"port 22\"\"\",,,,,,,,,,,,,,,\r\n"
-        "up,collected,,up.example,9119-MHE_21ABCDE,4,1,h1,10.0.0.1,3,surveyed,Ok,0,0,0,1.5,VPD/h1.VPD.xml,\r\n"
-        "up,collected,,up.example,9119-MHE_21ABCDE,4,2,\"h,2\",10.0.0.2,3,channel_failure,\"RELAY Failed, "
-        "rc = 1\",8,0,0,1.5,\"VPD/h,2.VPD.xml\",\"line 1\nline 2\"\r\n",
-        csv.text());
+    EXPECT_EQ("console,record,record_message,console_host,machine,machine_return_code,partition_id,"
+              "host,ip,"
+              "active_status,outcome,status_text,return_code,rc,rc_cmd,seconds,document,reason\r\n"
+              "down,unreachable,\"Connection refused, \"\"port 22\"\"\",,,,,,,,,,,,,,,\r\n"
+              "up,collected,,up.example,9119-MHE_21ABCDE,4,1,h1,10.0.0.1,3,surveyed,Ok,0,0,0,1.5,"
+              "VPD/h1.VPD.xml,\r\n"
+              "up,collected,,up.example,9119-MHE_21ABCDE,4,2,\"h,2\",10.0.0.2,3,channel_failure,"
+              "\"RELAY Failed, "
+              "rc = 1\",8,0,0,1.5,\"VPD/h,2.VPD.xml\",\"line 1\nline 2\"\r\n",
+              csv.text());
 }
 
 TEST(EstateCsv, ACollectedConsoleWithoutMachinesStillHasItsRow) {

@@ -2,6 +2,8 @@
 
 #include "estate/Estate.h"
 
+#include <utility>
+
 namespace estate {
 
 using Json = nlohmann::ordered_json;
@@ -35,19 +37,21 @@ void EstateDocument::add(ConsoleRun const& console, std::optional<Json> const& s
                      {"report", orNull(consoleReportPath(console))}};
     std::string text = jsonText(entry);
     text.pop_back();
-    _consoles += (_consoles.empty() ? "" : ",") + text + ",\"summary\":" +
-                 (summary ? jsonText(*summary) : std::string("null")) + "}";
+    _consoles += (_consoles.empty() ? "" : ",") + text +
+                 ",\"summary\":" + (summary ? jsonText(*summary) : std::string("null")) + "}";
 }
 
-std::string EstateDocument::text(std::string const& collected, Json const& totals) const {
+std::string EstateDocument::text(std::string const& collected, Json const& totals) && {
     Json const head{{"schema_version", gc_EstateSchemaVersion},
                     {"tool", "quorvex-survey estate"},
                     {"version", QUORVEX_VERSION},
                     {"collected", collected},
                     {"totals", totals}};
-    std::string document = jsonText(head);
-    document.pop_back();
-    return document + ",\"consoles\":[" + _consoles + "]}\n";
+    std::string start = jsonText(head);
+    start.pop_back();
+    _consoles.insert(0, start + ",\"consoles\":[");
+    _consoles += "]}\n";
+    return std::move(_consoles);
 }
 
 } // namespace estate

@@ -49,9 +49,10 @@ void appendNotCollected(std::string& page, Estate const& estate) {
             continue;
         }
         rows += "<tr><th scope=\"row\">" + consoleName(console) + "</th><td class=\"record\">" +
-                textOf(console.record.kind).label + "</td><td>" + escapeHtml(console.record.message) +
-                "</td><td class=\"number\">" + numberText(console.record.exitStatus) +
-                "</td><td class=\"number\">" + ageText(console.record.ageSeconds) + "</td></tr>\n";
+                textOf(console.record.kind).label + "</td><td>" +
+                escapeHtml(console.record.message) + "</td><td class=\"number\">" +
+                numberText(console.record.exitStatus) + "</td><td class=\"number\">" +
+                ageText(console.record.ageSeconds) + "</td></tr>\n";
     }
     if (rows.empty()) {
         page += "<p class=\"none\">Every console was collected.</p>";
@@ -80,7 +81,8 @@ void appendConsoleLinks(std::string& page, Estate const& estate) {
 
 void appendOutcomeOptions(std::string& page) {
     for (report::OutcomeText const& outcome : report::outcomeTable()) {
-        page += "<option value=\"" + std::string(outcome.name) + "\">" + outcome.label + "</option>";
+        page +=
+            "<option value=\"" + std::string(outcome.name) + "\">" + outcome.label + "</option>";
     }
     page += "<option value=\"listing_failed\">listing failed</option>";
 }
@@ -100,8 +102,10 @@ std::vector<Placeholder> headerPlaceholders(Estate const& estate, Json const& to
         textPlaceholder("collected", report::timeElement(collected)),
         textPlaceholder("machine-count", std::to_string(report::countOf(totals, "machines"))),
         textPlaceholder("partition-count", std::to_string(report::countOf(totals, "partitions"))),
-        {"record-totals", [&totals](std::string& page) { appendRecordTotals(page, totals["records"]); }},
-        {"outcome-totals", [&totals](std::string& page) { report::appendOutcomeTotals(page, totals["outcomes"]); }},
+        {"record-totals",
+         [&totals](std::string& page) { appendRecordTotals(page, totals["records"]); }},
+        {"outcome-totals",
+         [&totals](std::string& page) { report::appendOutcomeTotals(page, totals["outcomes"]); }},
         textPlaceholder("report-style", std::string(report::gc_PageStyle)),
         textPlaceholder("style", std::string(gc_EstateStyle)),
         textPlaceholder("tool", "quorvex-survey estate"),
@@ -118,24 +122,29 @@ void EstatePage::add(ConsoleRun const& console, std::optional<Json> const& summa
     auto const count = [&](char const* name) {
         return summary ? std::to_string(report::countOf(totals, name)) : std::string();
     };
-    _consoleRows += "<tr><th scope=\"row\">" + consoleName(console) + "</th><td>" +
-                    textOf(console.record.kind).label + "</td><td>" + escapeHtml(console.consoleHost) +
-                    "</td><td>" + report::timeElement(summary ? report::member(*summary, "started") : none) +
-                    "</td><td class=\"number\">" +
-                    report::htmlText(summary ? report::member(*summary, "exit_status") : none) +
-                    "</td><td class=\"number\">" + count("machines") + "</td><td class=\"number\">" +
-                    count("partitions") + "</td><td class=\"bar-cell\">" +
-                    (summary ? report::outcomeBar(totals) : "") + "</td></tr>\n";
+    _consoleRows +=
+        "<tr><th scope=\"row\">" + consoleName(console) + "</th><td>" +
+        textOf(console.record.kind).label + "</td><td>" + escapeHtml(console.consoleHost) +
+        "</td><td>" + report::timeElement(summary ? report::member(*summary, "started") : none) +
+        "</td><td class=\"number\">" +
+        report::htmlText(summary ? report::member(*summary, "exit_status") : none) +
+        "</td><td class=\"number\">" + count("machines") + "</td><td class=\"number\">" +
+        count("partitions") + "</td><td class=\"bar-cell\">" +
+        (summary ? report::outcomeBar(totals) : "") + "</td></tr>\n";
 }
 
-std::string EstatePage::text(Estate const& estate, Json const& totals, std::string const& rowData) const {
+std::string EstatePage::text(Estate const& estate, Json const& totals,
+                             std::string const& rowData) const {
     std::vector<Placeholder> placeholders = headerPlaceholders(estate, totals);
-    placeholders.push_back({"not-collected", [&estate](std::string& page) { appendNotCollected(page, estate); }});
+    placeholders.push_back(
+        {"not-collected", [&estate](std::string& page) { appendNotCollected(page, estate); }});
     placeholders.push_back(textPlaceholder("console-rows", _consoleRows));
     placeholders.push_back({"outcome-keys", report::appendOutcomeKeys});
-    placeholders.push_back({"console-links", [&estate](std::string& page) { appendConsoleLinks(page, estate); }});
+    placeholders.push_back(
+        {"console-links", [&estate](std::string& page) { appendConsoleLinks(page, estate); }});
     placeholders.push_back({"outcome-options", appendOutcomeOptions});
-    placeholders.push_back({"console-options", [&estate](std::string& page) { appendConsoleOptions(page, estate); }});
+    placeholders.push_back(
+        {"console-options", [&estate](std::string& page) { appendConsoleOptions(page, estate); }});
     placeholders.push_back({"row-data", [&rowData](std::string& page) { page += rowData; }});
     std::string page;
     page.reserve(rowData.size() + _consoleRows.size() + 64 * 1024);

@@ -1,8 +1,8 @@
 #include "estate/EstatePage.h"
 
+#include "QuorvexTest.h"
 #include "estate/EstateRows.h"
 #include "estate/EstateTotals.h"
-#include "QuorvexTest.h"
 
 #include <gtest/gtest.h>
 
@@ -10,7 +10,8 @@ namespace {
 
 using QuorvexTest::CollectFolder;
 
-estate::ConsoleRun consoleRun(std::string const& name, estate::RecordKind kind, std::string const& message) {
+estate::ConsoleRun consoleRun(std::string const& name, estate::RecordKind kind,
+                              std::string const& message) {
     estate::ConsoleRun run;
     run.record.console = name;
     run.record.kind = kind;
@@ -33,7 +34,8 @@ std::string pageOf(estate::Estate const& estate) {
 TEST(EstatePage, ConsolesNotCollectedAreListedBeforeTheConsolesWithTheirReason) {
     estate::Estate estate;
     estate.collected = "2026-11-24T18:00:00+00:00";
-    estate.consoles.push_back(consoleRun("down", estate::RecordKind::Unreachable, "Connection refused"));
+    estate.consoles.push_back(
+        consoleRun("down", estate::RecordKind::Unreachable, "Connection refused"));
     std::string const page = pageOf(estate);
     std::size_t const notCollected = page.find("<section id=\"not-collected\">");
     std::size_t const consoles = page.find("<section id=\"consoles\">");
@@ -63,8 +65,9 @@ TEST(EstateRows, DataHoldsNoLessThanSignSoNoTextEndsItsScriptElement) {
     estate::ConsoleRun console = consoleRun("c", estate::RecordKind::Collected, "");
     console.summaryFile = "summary.json";
     estate::EstateRows rows;
-    rows.add(console, nlohmann::ordered_json::parse(CollectFolder::summary(
-                          {CollectFolder::partition("1", "</script><b>", "channel_failure", "x < y")})));
+    rows.add(console,
+             nlohmann::ordered_json::parse(CollectFolder::summary(
+                 {CollectFolder::partition("1", "</script><b>", "channel_failure", "x < y")})));
     std::string const text = rows.scriptText();
     EXPECT_EQ(std::string::npos, text.find('<'));
     auto const data = nlohmann::json::parse(text);
@@ -76,15 +79,17 @@ TEST(EstateRows, DataHoldsNoLessThanSignSoNoTextEndsItsScriptElement) {
 TEST(EstateRows, EveryColumnHasOneEntryPerRowAndAListingFailureIsARow) {
     std::string summary = CollectFolder::summary({CollectFolder::partition("1", "h1", "surveyed")});
     auto document = nlohmann::ordered_json::parse(summary);
-    document["machines"].push_back({{"identity", "8286-42A_10XYZ99"},
-                                    {"return_code", "8"},
-                                    {"partitions", nlohmann::ordered_json::array()},
-                                    {"listing_failure",
-                                     {{"command", "lspartition"}, {"exit_status", 1}, {"message", "not found"}}}});
+    document["machines"].push_back(
+        {{"identity", "8286-42A_10XYZ99"},
+         {"return_code", "8"},
+         {"partitions", nlohmann::ordered_json::array()},
+         {"listing_failure",
+          {{"command", "lspartition"}, {"exit_status", 1}, {"message", "not found"}}}});
     estate::EstateRows rows;
     rows.add(consoleRun("c", estate::RecordKind::Collected, ""), document);
     auto const data = nlohmann::json::parse(rows.scriptText());
-    for (char const* column : {"machine", "id", "host", "ip", "outcome", "status", "reason", "seconds"}) {
+    for (char const* column :
+         {"machine", "id", "host", "ip", "outcome", "status", "reason", "seconds"}) {
         EXPECT_EQ(2U, data[column].size()) << column;
     }
     std::size_t const outcome = data["outcome"][1].get<std::size_t>();

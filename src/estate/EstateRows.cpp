@@ -40,27 +40,44 @@ Json outcomeTable() {
 
 } // namespace
 
-
 EstateRows::EstateRows() {
-    _data = Json{{"outcomes", outcomeTable()}, {"consoles", Json::array()}, {"machines", Json::array()},
-                 {"texts", Json::array()}};
-    for (char const* column : {"machine", "id", "host", "ip", "outcome", "status", "reason", "seconds"}) {
-        _data[column] = Json::array();
+    for (char const* member : {"consoles", "machines", "texts", "machine", "id", "host", "ip",
+                               "outcome", "status", "reason", "seconds"}) {
+        _members[member];
+    }
+    for (Json const& outcome : outcomeTable()) {
+        _append("outcomes", outcome);
+    }
+}
+
+void EstateRows::_append(std::string const& member, Json const& value) {
+    std::string& text = _members[member];
+    text += text.empty() ? "[" : ",";
+    std::string const valueText = value.dump(-1, ' ', false, Json::error_handler_t::replace);
+    for (char const character : valueText) {
+        if (character == '<') {
+            text += "\\u003c";
+        } else {
+            text += character;
+        }
     }
 }
 
 long long EstateRows::_textIndex(std::string const& text) {
-    auto const [place, added] = _textIndices.try_emplace(text, static_cast<long long>(_textIndices.size()));
+    auto const [place, added] =
+        _textIndices.try_emplace(text, static_cast<long long>(_textIndices.size()));
     if (added) {
-        _data["texts"].push_back(text);
+        _append("texts", text);
     }
     return place->second;
 }
 
-void EstateRows::add(ConsoleRun const& console, std::optional<nlohmann::ordered_json> const& summary) {
+void EstateRows::add(ConsoleRun const& console,
+                     std::optional<nlohmann::ordered_json> const& summary) {
     std::optional<std::string> const report = consoleReportPath(console);
-    _data["consoles"].push_back({{"name", console.record.console}, {"report", report ? Json(*report) : Json()}});
-    _console = _data["consoles"].size() - 1;
+    _append("consoles",
+            {{"name", console.record.console}, {"report", report ? Json(*report) : Json()}});
+    ++_consoleCount;
     for (nlohmann::ordered_json const& machine :
          summary ? member(*summary, "machines") : nlohmann::ordered_json()) {
         _addMachine(machine);
@@ -68,8 +85,9 @@ void EstateRows::add(ConsoleRun const& console, std::optional<nlohmann::ordered_
 }
 
 void EstateRows::_addMachine(nlohmann::ordered_json const& machine) {
-    _data["machines"].push_back({_console, textOf(member(machine, "identity")), textOf(member(machine, "return_code"))});
-    _machine = _data["machines"].size() - 1;
+    _append("machines", {_consoleCount - 1, textOf(member(machine, "identity")),
+                         textOf(member(machine, "return_code"))});
+    ++_machineCount;
     if (!member(machine, "listing_failure").is_null()) {
         _addListingFailure(member(machine, "listing_failure"));
     }
@@ -79,36 +97,40 @@ void EstateRows::_addMachine(nlohmann::ordered_json const& machine) {
 }
 
 void EstateRows::_addPartition(nlohmann::ordered_json const& partition) {
-    std::optional<report::Outcome> const outcome = report::outcomeNamed(textOf(member(partition, "outcome")));
+    std::optional<report::Outcome> const outcome =
+        report::outcomeNamed(textOf(member(partition, "outcome")));
     nlohmann::ordered_json const& reason = member(partition, "reason");
     nlohmann::ordered_json const& seconds = member(partition, "seconds");
-    _data["machine"].push_back(_machine);
-    _data["id"].push_back(textOf(member(partition, "id")));
-    _data["host"].push_back(textOf(member(partition, "host")));
-    _data["ip"].push_back(textOf(member(partition, "ip")));
-    _data["outcome"].push_back(outcome ? static_cast<std::size_t>(*outcome) : gc_ListingFailedOutcome);
-    _data["status"].push_back(_textIndex(textOf(member(partition, "status_text"))));
-    _data["reason"].push_back(reason.is_null() ? -1 : _textIndex(textOf(reason)));
-    _data["seconds"].push_back(seconds.is_number() ? Json(seconds.get<double>()) : Json());
+    _append("machine", _machineCount - 1);
+    _append("id", textOf(member(partition, "id")));
+    _append("host", textOf(member(partition, "host")));
+    _append("ip", textOf(member(partition, "ip")));
+    _append("outcome", outcome ? static_cast<std::size_t>(*outcome) : gc_ListingFailedOutcome);
+    _append("status", _textIndex(textOf(member(partition, "status_text"))));
+    _append("reason", reason.is_null() ? -1 : _textIndex(textOf(reason)));
+    _append("seconds", seconds.is_number() ? Json(seconds.get<double>()) : Json());
 }
 
 void EstateRows::_addListingFailure(nlohmann::ordered_json const& failure) {
-    _data["machine"].push_back(_machine);
+    _append("machine", _machineCount - 1);
     for (char const* column : {"id", "host", "ip"}) {
-        _data[column].push_back("");
+        _append(column, "");
     }
-    _data["outcome"].push_back(gc_ListingFailedOutcome);
-    _data["status"].push_back(_textIndex(report::gc_ListingFailedLabel));
-    _data["reason"].push_back(_textIndex(report::listingFailureText(failure)));
-    _data["seconds"].push_back(nullptr);
+    _append("outcome", gc_ListingFailedOutcome);
+    _append("status", _textIndex(report::gc_ListingFailedLabel));
+    _append("reason", _textIndex(report::listingFailureText(failure)));
+    _append("seconds", nullptr);
 }
 
+// The members in name order, as the page's data has always listed them.
 std::string EstateRows::scriptText() const {
-    std::string text = _data.dump(-1, ' ', false, Json::error_handler_t::replace);
-    for (std::size_t at = text.find('<'); at != std::string::npos; at = text.find('<', at)) {
-        text.replace(at, 1, "\\u003c");
+    std::string text = "{";
+    for (auto const& [name, values] : _members) {
+        text += (text.size() > 1 ? ",\"" : "\"") + name + "\":";
+        text += values.empty() ? "[" : values;
+        text += "]";
     }
-    return text;
+    return text + "}";
 }
 
 } // namespace estate

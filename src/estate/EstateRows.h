@@ -4,6 +4,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include <map>
 #include <optional>
 #include <string>
 #include <unordered_map>
@@ -18,9 +19,7 @@ namespace estate {
 class EstateRows {
 public:
     EstateRows();
-
     void add(ConsoleRun const& console, std::optional<nlohmann::ordered_json> const& summary);
-
     // The data as the page's <script type="application/json"> holds it:
     // every "<" written as \u003c, so that no text ends the element.
     std::string scriptText() const;
@@ -29,12 +28,16 @@ private:
     void _addMachine(nlohmann::ordered_json const& machine);
     void _addPartition(nlohmann::ordered_json const& partition);
     void _addListingFailure(nlohmann::ordered_json const& failure);
+    void _append(std::string const& member, nlohmann::json const& value);
     long long _textIndex(std::string const& text);
 
-    nlohmann::json _data;
+    // Each member's array as JSON text so far, without its closing
+    // bracket, by member name: 200,000 rows held as values of a JSON
+    // document would take several times the memory of their text.
+    std::map<std::string, std::string> _members;
     std::unordered_map<std::string, long long> _textIndices;
-    std::size_t _console = 0;
-    std::size_t _machine = 0;
+    std::size_t _consoleCount = 0;
+    std::size_t _machineCount = 0;
 };
 
 } // namespace estate

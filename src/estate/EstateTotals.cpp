@@ -33,12 +33,9 @@ Json EstateTotals::document() const {
         auto const count = _outcomes.find(row.name);
         outcomes[row.name] = count == _outcomes.end() ? 0 : count->second;
     }
-    return Json{{"consoles", _consoles},
-                {"records", std::move(records)},
-                {"machines", _machines},
-                {"machines_listing_failed", _machinesListingFailed},
-                {"partitions", _partitions},
-                {"outcomes", std::move(outcomes)}};
+    return Json{{"consoles", _consoles},     {"records", std::move(records)},
+                {"machines", _machines},     {"machines_listing_failed", _machinesListingFailed},
+                {"partitions", _partitions}, {"outcomes", std::move(outcomes)}};
 }
 
 } // namespace estate

@@ -11,6 +11,7 @@
 
 #include <filesystem>
 #include <system_error>
+#include <utility>
 
 namespace estate {
 
@@ -37,7 +38,8 @@ void addConsole(EstateOutputs& outputs, ConsoleRun const& console, std::string c
     std::optional<nlohmann::ordered_json> const summary = readSummary(console);
     if (summary) {
         report::writeReport(*summary, console.vpdFolder,
-                            folder + "/consoles/" + consoleFolderName(console.record.console));
+                            folder + "/consoles/" + consoleFolderName(console.record.console),
+                            report::DocumentPlacement::link);
     }
     outputs.totals.add(console, summary);
     outputs.document.add(console, summary);
@@ -55,8 +57,11 @@ void writeEstate(Estate const& estate, std::string const& folder) {
         addConsole(outputs, console, folder);
     }
     nlohmann::ordered_json const totals = outputs.totals.document();
-    util::writeFileAtomically(folder + "/estate.json", outputs.document.text(estate.collected, totals));
-    util::writeFileAtomically(folder + "/estate.csv", outputs.csv.text());
+    // Each text is taken out and dropped once written: at 200,000 partitions
+    // the outputs held together would double the estate's memory.
+    util::writeFileAtomically(folder + "/estate.json",
+                              std::move(outputs.document).text(estate.collected, totals));
+    util::writeFileAtomically(folder + "/estate.csv", std::move(outputs.csv).takeText());
     util::writeFileAtomically(folder + "/index.html",
                               outputs.page.text(estate, totals, outputs.rows.scriptText()));
 }

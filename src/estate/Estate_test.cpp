@@ -16,11 +16,13 @@ TEST(Estate, ConsolesNotCollectedComeFirstInTheRecordTablesOrderThenByName) {
     for (char const* console : {"b", "a", "s"}) {
         folder.addBundle(console, summary);
     }
-    folder.writeRecords(CollectFolder::records(
-        {CollectFolder::record("b", "collected", true), CollectFolder::record("s", "stale", true),
-         CollectFolder::record("z", "unreachable", false), CollectFolder::record("a", "collected", true),
-         CollectFolder::record("t", "timed_out", false), CollectFolder::record("e", "tool_error", false),
-         CollectFolder::record("u", "unreachable", false)}));
+    folder.writeRecords(CollectFolder::records({CollectFolder::record("b", "collected", true),
+                                                CollectFolder::record("s", "stale", true),
+                                                CollectFolder::record("z", "unreachable", false),
+                                                CollectFolder::record("a", "collected", true),
+                                                CollectFolder::record("t", "timed_out", false),
+                                                CollectFolder::record("e", "tool_error", false),
+                                                CollectFolder::record("u", "unreachable", false)}));
     estate::Estate const estate = estate::readEstate(folder.path());
     std::string order;
     for (estate::ConsoleRun const& console : estate.consoles) {

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "report/DocumentCopies.h"
+
 #include <nlohmann/json.hpp>
 
 #include <string>
@@ -11,7 +13,8 @@ namespace report {
 // name renamed when complete, and a copy of each document the summary names
 // from vpdFolder in folder/documents, where the page links to them: the
 // folder holds all the page needs wherever it is copied. Throws util::SystemError
-// when the folder cannot be made or a file cannot be written.
+// when the folder cannot be made or a file cannot be written. placement:
+// whether the documents are copied or linked (see DocumentPlacement).
 //
 // A folder that already holds a report keeps it: its index.html,
 // partitions.csv and summary.json are renamed first to index-<time>.html,
@@ -21,6 +24,6 @@ namespace report {
 // cannot be read), with "-2", "-3"... added when a report of that time is
 // already kept. Nothing is ever replaced; earlier reports stay until removed.
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
-                 std::string const& folder);
+                 std::string const& folder, DocumentPlacement placement = DocumentPlacement::copy);
 
 } // namespace report
