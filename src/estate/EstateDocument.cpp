@@ -35,9 +35,9 @@ void EstateDocument::add(ConsoleRun const& console, std::optional<Json> const& s
                      {"mode", textOrNull(console.mode)},
                      {"run_started", orNull(console.runStarted)},
                      {"report", orNull(consoleReportPath(console))}};
-    std::string text = jsonText(entry);
-    text.pop_back();
-    _consoles += (_consoles.empty() ? "" : ",") + text +
+    std::string entryText = jsonText(entry);
+    entryText.pop_back();
+    _consoles += (_consoles.empty() ? "" : ",") + entryText +
                  ",\"summary\":" + (summary ? jsonText(*summary) : std::string("null")) + "}";
 }
 
