@@ -357,32 +357,60 @@ ParsedCommandLine endingWith(std::string const& text) {
     return parsed;
 }
 
+// The subcommands, which survey nothing.
+struct Subcommands {
+    CLI::App const* report;
+    CLI::App const* history;
+    CLI::App const* estate;
+};
+
+// Checks the history subcommand's request. A word left over without an
+// action is the action mistyped, which the check names.
+void readHistoryRequest(CLI::App const& historyCommand, ParsedCommandLine& parsed) {
+    CLI::App const& action = refusingCommand(historyCommand);
+    if (&action != &historyCommand) {
+        refuseLeftOver(action);
+    }
+    history::checkHistoryRequest(historyCommand, *parsed.historyRequest);
+    refuseLeftOver(historyCommand);
+}
+
+// Checks the request of the subcommand given, if any, and keeps its request
+// alone; false when no subcommand was given.
+bool readSubcommand(Subcommands const& subcommands, ParsedCommandLine& parsed) {
+    bool const report = subcommands.report->parsed();
+    bool const history = subcommands.history->parsed();
+    bool const estate = subcommands.estate->parsed();
+    if (report) {
+        refuseLeftOver(*subcommands.report);
+        report::checkReportRequest(*parsed.reportRequest);
+    } else if (history) {
+        readHistoryRequest(*subcommands.history, parsed);
+    } else if (estate) {
+        refuseLeftOver(*subcommands.estate);
+        estate::checkEstateRequest(*parsed.estateRequest);
+    }
+    if (!report) {
+        parsed.reportRequest.reset();
+    }
+    if (!history) {
+        parsed.historyRequest.reset();
+    }
+    if (!estate) {
+        parsed.estateRequest.reset();
+    }
+    return report || history || estate;
+}
+
 // Reads what app was given; throws CLI::ParseError with the reason in plain
 // words when it is refused.
-void readCommandLine(CLI::App& app, CLI::App const& reportCommand, ParsedCommandLine& parsed,
+void readCommandLine(CLI::App& app, Subcommands const& subcommands, ParsedCommandLine& parsed,
                      int argc, char const* const* argv) {
-    CLI::App const& historyCommand = *app.get_subcommand("history");
     app.parse(argc, argv);
     refuseLeftOver(app);
-    if (reportCommand.parsed()) {
-        parsed.historyRequest.reset();
-        refuseLeftOver(reportCommand);
-        report::checkReportRequest(*parsed.reportRequest);
+    if (readSubcommand(subcommands, parsed)) {
         return;
     }
-    parsed.reportRequest.reset();
-    if (historyCommand.parsed()) {
-        // A word left over without an action is the action mistyped,
-        // which the check names.
-        CLI::App const& action = refusingCommand(historyCommand);
-        if (&action != &historyCommand) {
-            refuseLeftOver(action);
-        }
-        history::checkHistoryRequest(historyCommand, *parsed.historyRequest);
-        refuseLeftOver(historyCommand);
-        return;
-    }
-    parsed.historyRequest.reset();
     refuseEmptyOutputNames(app, parsed.options, argc, argv);
     checkMachines(app, parsed.options, argc, argv);
     keepFirstOfEach(parsed);
@@ -404,13 +432,15 @@ ParsedCommandLine parseCommandLine(int argc, char const* const* argv) {
     app.set_version_flag("--version", versionText(), "print the version and exit");
     addSurveyOptions(app, parsed.options);
     parsed.reportRequest.emplace();
-    CLI::App const* const reportCommand = report::addReportSubcommand(app, *parsed.reportRequest);
     parsed.historyRequest.emplace();
-    history::addHistorySubcommand(app, *parsed.historyRequest);
-    // Set after the subcommand is added, which would inherit it.
+    parsed.estateRequest.emplace();
+    Subcommands const subcommands{report::addReportSubcommand(app, *parsed.reportRequest),
+                                  history::addHistorySubcommand(app, *parsed.historyRequest),
+                                  estate::addEstateSubcommand(app, *parsed.estateRequest)};
+    // Set after the subcommands are added, which would inherit it.
     app.footer(gc_ExitStatusHelp);
     try {
-        readCommandLine(app, *reportCommand, parsed, argc, argv);
+        readCommandLine(app, subcommands, parsed, argc, argv);
     } catch (CLI::CallForHelp const&) {
         return endingWith(app.help());
     } catch (CLI::CallForVersion const&) {

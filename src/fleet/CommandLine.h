@@ -2,6 +2,7 @@
 
 #include "history/HistoryDatabase.h"
 #include "history/HistoryCommand.h"
+#include "estate/EstateCommand.h"
 #include "report/ReportCommand.h"
 
 #include <optional>
@@ -55,6 +56,8 @@ struct ParsedCommandLine {
     std::optional<report::ReportRequest> reportRequest;
     // Set for "history ACTION [options]", which surveys nothing.
     std::optional<history::HistoryRequest> historyRequest;
+    // Set for "estate --from COLLECT_DIR --report DIR", which surveys nothing.
+    std::optional<estate::EstateRequest> estateRequest;
 };
 
 constexpr int gc_ExitUsage = 64;

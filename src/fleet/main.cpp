@@ -333,6 +333,9 @@ int main(int argc, char** argv) {
         return history::runHistorySubcommand(*parsed.historyRequest, std::cout, std::cerr,
                                              fleet::terminalColumns(STDOUT_FILENO));
     }
+    if (parsed.estateRequest) {
+        return estate::runEstateSubcommand(*parsed.estateRequest, std::cout, std::cerr);
+    }
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;
     }

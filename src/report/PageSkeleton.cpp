@@ -65,4 +65,8 @@ void fillSkeleton(std::string& page, std::string_view skeleton,
     page.append(skeleton.substr(copied));
 }
 
+Placeholder textPlaceholder(std::string_view name, std::string text) {
+    return {name, [text = std::move(text)](std::string& page) { page += text; }};
+}
+
 } // namespace report

@@ -20,6 +20,9 @@ struct Placeholder {
 // The names of the skeleton's placeholders in order, repeated ones repeated.
 std::vector<std::string_view> placeholderNames(std::string_view skeleton);
 
+// A placeholder filled with a text that is ready as it is.
+Placeholder textPlaceholder(std::string_view name, std::string text);
+
 // Appends the skeleton to page with every placeholder replaced by what its
 // filler appends (a name used twice is filled twice). A placeholder without
 // a filler, or one left unclosed, is a std::invalid_argument naming it: the

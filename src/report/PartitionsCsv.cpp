@@ -36,21 +36,11 @@ std::string fieldText(Json const& value) {
     return value.dump();
 }
 
-void appendRow(std::string& csv, std::vector<std::string> const& fields) {
-    for (std::size_t i = 0; i < fields.size(); ++i) {
-        if (i > 0) {
-            csv += ',';
-        }
-        csv += csvField(fields[i]);
-    }
-    csv += gc_RowEnd;
-}
-
 // The row of a machine whose partition listing failed, or of a run whose
 // machine listing failed (no machine, no code): no partition, the outcome
 // listing_failed, the failure as the reason.
-void appendListingFailure(std::string& csv, Json const& failure, std::string const& machine,
-                          std::string const& machineCode, bool withHistory) {
+void addListingFailure(CsvRows& rows, Json const& failure, std::string const& machine,
+                       std::string const& machineCode, bool withHistory) {
     if (failure.is_null()) {
         return;
     }
@@ -64,7 +54,7 @@ void appendListingFailure(std::string& csv, Json const& failure, std::string con
     if (withHistory) {
         row.insert(row.end(), {"", ""});
     }
-    appendRow(csv, row);
+    rows.push_back(std::move(row));
 }
 
 bool hasHistory(std::optional<SinceLastRun> const& since) {
@@ -83,8 +73,7 @@ std::vector<std::string> historyFields(SinceLastRun const& since, std::string co
 }
 
 // A machine's partition rows; with the history, its fields at the end.
-void appendPartitions(std::string& csv, Json const& machine,
-                      std::optional<SinceLastRun> const& since) {
+void addPartitions(CsvRows& rows, Json const& machine, std::optional<SinceLastRun> const& since) {
     Json const& partitions = member(machine, "partitions");
     std::string const identity = historyMachineName(machine);
     std::vector<std::string> const names = historyPartitionNames(partitions);
@@ -101,7 +90,7 @@ void appendPartitions(std::string& csv, Json const& machine,
             std::vector<std::string> const fields = historyFields(*since, identity, names[index]);
             row.insert(row.end(), fields.begin(), fields.end());
         }
-        appendRow(csv, row);
+        rows.push_back(std::move(row));
         ++index;
     }
 }
@@ -122,22 +111,44 @@ std::string csvField(std::string const& text) {
     return quoted + "\"";
 }
 
-std::string partitionsCsv(Json const& summary, std::optional<SinceLastRun> const& since) {
-    std::string csv;
+void appendCsvRow(std::string& csv, std::vector<std::string> const& fields) {
+    for (std::size_t i = 0; i < fields.size(); ++i) {
+        if (i > 0) {
+            csv += ',';
+        }
+        csv += csvField(fields[i]);
+    }
+    csv += gc_RowEnd;
+}
+
+std::vector<std::string> partitionsCsvHeader(std::optional<SinceLastRun> const& since) {
     std::vector<std::string> header = {"machine", "machine_return_code", "partition_id"};
     header.insert(header.end(), partitionColumns().begin(), partitionColumns().end());
     if (hasHistory(since)) {
         header.insert(header.end(), {"failing_since", "last_surveyed"});
     }
-    appendRow(csv, header);
+    return header;
+}
+
+CsvRows partitionsCsvRows(Json const& summary, std::optional<SinceLastRun> const& since) {
+    CsvRows rows;
     for (Json const& machine : member(summary, "machines")) {
-        appendListingFailure(csv, member(machine, "listing_failure"),
-                             fieldText(member(machine, "identity")),
-                             fieldText(member(machine, "return_code")), hasHistory(since));
-        appendPartitions(csv, machine, since);
+        addListingFailure(rows, member(machine, "listing_failure"),
+                          fieldText(member(machine, "identity")),
+                          fieldText(member(machine, "return_code")), hasHistory(since));
+        addPartitions(rows, machine, since);
     }
     if (member(summary, "machines").empty()) {
-        appendListingFailure(csv, member(summary, "listing_failure"), "", "", hasHistory(since));
+        addListingFailure(rows, member(summary, "listing_failure"), "", "", hasHistory(since));
+    }
+    return rows;
+}
+
+std::string partitionsCsv(Json const& summary, std::optional<SinceLastRun> const& since) {
+    std::string csv;
+    appendCsvRow(csv, partitionsCsvHeader(since));
+    for (std::vector<std::string> const& row : partitionsCsvRows(summary, since)) {
+        appendCsvRow(csv, row);
     }
     return csv;
 }

@@ -5,8 +5,8 @@
 #include <nlohmann/json.hpp>
 
 #include <optional>
-
 #include <string>
+#include <vector>
 
 namespace report {
 
@@ -29,6 +29,16 @@ namespace report {
 // are those above alone.
 std::string partitionsCsv(nlohmann::ordered_json const& summary,
                           std::optional<SinceLastRun> const& since = std::nullopt);
+
+// The same table in parts, for a CSV that adds columns of its own (the
+// estate's console columns before these).
+using CsvRows = std::vector<std::vector<std::string>>;
+std::vector<std::string> partitionsCsvHeader(std::optional<SinceLastRun> const& since = std::nullopt);
+CsvRows partitionsCsvRows(nlohmann::ordered_json const& summary,
+                          std::optional<SinceLastRun> const& since = std::nullopt);
+// Appends one row of fields as partitionsCsv writes rows: quoted where
+// needed, ending with CRLF.
+void appendCsvRow(std::string& csv, std::vector<std::string> const& fields);
 
 // One field of an RFC 4180 row: as it is, or quoted with inner quotes
 // doubled when it holds a comma, a double quote, CR or LF.

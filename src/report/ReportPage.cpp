@@ -5,9 +5,10 @@
 #include "report/JsonMember.h"
 #include "report/ListingFailure.h"
 #include "report/Outcome.h"
+#include "report/OutcomeMarks.h"
 #include "report/PageAssets.h"
 #include "report/PageSkeleton.h"
-#include "report/ReadableTime.h"
+#include "report/PageText.h"
 #include "report/ReportCommand.h"
 #include "report/SinceLastRunSection.h"
 #include "utility/TextSafety.h"
@@ -44,17 +45,6 @@ RowOutcome rowOutcome(Json const& name) {
     return {textOf(*outcome).label, textOf(*outcome).pageClass};
 }
 
-// The text of a value as the page carries it, escaped for HTML; "" for null.
-std::string htmlText(Json const& value) {
-    if (value.is_null()) {
-        return "";
-    }
-    if (value.is_string()) {
-        return escapeHtml(value.get<std::string>());
-    }
-    return escapeHtml(value.dump());
-}
-
 // Seconds with one decimal, as the survey's stop lines give them; the CSV
 // and summary.json keep every digit.
 std::string secondsText(Json const& value) {
@@ -71,11 +61,6 @@ std::string secondsText(Json const& value) {
 std::string withoutTrailingBlanks(std::string text) {
     text.erase(text.find_last_not_of(" \n") + 1);
     return text;
-}
-
-long long countOf(Json const& counts, char const* name) {
-    Json const& value = member(counts, name);
-    return value.is_number_integer() ? value.get<long long>() : 0;
 }
 
 // Bytes outside the unreserved characters and "/" are percent-encoded, so a
@@ -96,22 +81,6 @@ std::string urlPath(std::string const& path) {
         }
     }
     return encoded;
-}
-
-// A summary's time as people read it; the text as it is when it is no time
-// the page knows how to read.
-std::string timeText(Json const& value) {
-    std::optional<std::string> const readable =
-        value.is_string() ? readableTime(value.get<std::string>()) : std::nullopt;
-    return readable ? *readable : htmlText(value);
-}
-
-// The time in an element that keeps the summary's text for programs.
-std::string timeElement(Json const& value) {
-    if (!value.is_string()) {
-        return htmlText(value);
-    }
-    return "<time datetime=\"" + htmlText(value) + "\">" + timeText(value) + "</time>";
 }
 
 // Each option with its value, and each identity, is kept whole on its line
@@ -152,40 +121,6 @@ std::string runNotesText(Json const& summary) {
            "</b>: " + escapeHtml(listingFailureText(failure));
 }
 
-// One item per outcome; the page's script finds them by data-outcome, and
-// their class gives them the outcome's colour.
-void appendOutcomeTotals(std::string& page, Json const& totals) {
-    for (OutcomeText const& outcome : outcomeTable()) {
-        page += "<li class=\"" + std::string(outcome.pageClass) + "\" data-outcome=\"" +
-                outcome.name + "\"><b>" + std::to_string(countOf(totals, outcome.name)) + "</b>" +
-                outcome.label + "</li>\n";
-    }
-}
-
-// A machine's counts under its bar: one item per outcome present, kept
-// whole on its line ("1 channel failure"), so the cell wraps between items.
-std::string barOf(Json const& counts) {
-    long long const partitions = countOf(counts, "partitions");
-    std::string bar = "<div class=\"bar\">";
-    std::string described;
-    for (OutcomeText const& outcome : outcomeTable()) {
-        long long const count = countOf(counts, outcome.name);
-        if (count <= 0 || partitions <= 0) {
-            continue;
-        }
-        char width[32] = {};
-        std::snprintf(width, sizeof width, "%.3f%%",
-                      100.0 * static_cast<double>(count) / static_cast<double>(partitions));
-        std::string const text = std::to_string(count) + " " + outcome.label;
-        bar += "<i class=\"" + std::string(outcome.pageClass) + "\" style=\"width:" + width +
-               "\" title=\"" + text + "\"></i>";
-        described += "<span><span class=\"key " + std::string(outcome.pageClass) + "\"></span>" +
-                     text + "</span> ";
-    }
-    return bar + "</div><p class=\"counts\">" +
-           (described.empty() ? "none listed" : described.substr(0, described.size() - 1)) + "</p>";
-}
-
 // A machine whose partitions the console could not list: the command, its
 // exit status and the console's message, in place of the counts.
 std::string listingFailure(Json const& failure) {
@@ -212,7 +147,7 @@ void appendMachineRow(std::string& page, Json const& machine, std::size_t index)
             std::to_string(countOf(member(machine, "counts"), "partitions")) +
             R"(<td class="bar-cell">)" +
             (listingFailed(machine) ? listingFailure(member(machine, "listing_failure"))
-                                    : barOf(member(machine, "counts"))) +
+                                    : outcomeBar(member(machine, "counts"))) +
             "\n";
 }
 
@@ -222,16 +157,6 @@ void appendMachineRows(std::string& page, Json const& machines) {
         appendMachineRow(page, machine, index);
         ++index;
     }
-}
-
-// The outcomes' keys, and the mark of a machine whose listing failed, each
-// key kept on the line of its name.
-void appendOutcomeKeys(std::string& page) {
-    for (OutcomeText const& outcome : outcomeTable()) {
-        page += "<span><span class=\"key " + std::string(outcome.pageClass) + "\"></span>" +
-                outcome.label + "</span> ";
-    }
-    page += R"(<span><span class="key listing-failed"></span>listing failed</span>)";
 }
 
 // The filter's boxes: the value is the class of the rows a box keeps.
@@ -335,11 +260,6 @@ std::size_t expectedSize(Json const& summary) {
     constexpr std::size_t headAndMachines = std::size_t{64} * 1024;
     return headAndMachines +
            bytesPerRow * static_cast<std::size_t>(countOf(member(summary, "totals"), "partitions"));
-}
-
-// A placeholder filled with a text that is ready as it is.
-Placeholder textPlaceholder(std::string_view name, std::string text) {
-    return {name, [text = std::move(text)](std::string& page) { page += text; }};
 }
 
 std::vector<Placeholder> runPlaceholders(Json const& summary) {

@@ -98,7 +98,8 @@ void keepPreviousReport(std::string const& base) {
 } // namespace
 
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
-                 std::string const& folder, std::optional<SinceLastRun> const& since) {
+                 std::string const& folder, std::optional<SinceLastRun> const& since,
+                 DocumentPlacement placement) {
     createFolder(folder);
     std::string const base = fs::path(folder).string() + "/";
     keepPreviousReport(base);
@@ -107,7 +108,7 @@ void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFo
     createFolder(base + gc_DocumentFolder);
     writeFileAtomically(base + "summary.json", summaryText(summary));
     writeFileAtomically(base + "partitions.csv", partitionsCsv(summary, since));
-    std::set<std::string> const copied = copyDocuments(summary, vpdFolder, folder);
+    std::set<std::string> const copied = copyDocuments(summary, vpdFolder, folder, placement);
     writeFileAtomically(base + "index.html", reportPage(summary, copied, since));
 }
 

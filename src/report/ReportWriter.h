@@ -1,11 +1,11 @@
 #pragma once
 
+#include "report/DocumentCopies.h"
 #include "report/SinceLastRun.h"
 
 #include <nlohmann/json.hpp>
 
 #include <optional>
-
 #include <string>
 
 namespace report {
@@ -15,7 +15,8 @@ namespace report {
 // name renamed when complete, and a copy of each document the summary names
 // from vpdFolder in folder/documents, where the page links to them: the
 // folder holds all the page needs wherever it is copied. Throws util::SystemError
-// when the folder cannot be made or a file cannot be written.
+// when the folder cannot be made or a file cannot be written. placement:
+// whether the documents are copied or linked (see DocumentPlacement).
 //
 // A folder that already holds a report keeps it: its index.html,
 // partitions.csv and summary.json are renamed first to index-<time>.html,
@@ -30,6 +31,7 @@ namespace report {
 // both are what they were before there was a history.
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
                  std::string const& folder,
-                 std::optional<SinceLastRun> const& since = std::nullopt);
+                 std::optional<SinceLastRun> const& since = std::nullopt,
+                 DocumentPlacement placement = DocumentPlacement::copy);
 
 } // namespace report

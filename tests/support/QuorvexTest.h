@@ -19,6 +19,7 @@
 //   FlushCountingBuffer.h a string buffer counting its flushes
 
 #include "ChildProcess.h"
+#include "CollectFolder.h"
 #include "DescriptorLimit.h"
 #include "ExpectedOutput.h"
 #include "FailingSystemCalls.h"

@@ -1,0 +1,69 @@
+#include "estate/EstateWriter.h"
+
+#include "estate/EstateCsv.h"
+#include "estate/EstateDocument.h"
+#include "estate/EstatePage.h"
+#include "estate/EstateRows.h"
+#include "estate/EstateTotals.h"
+#include "report/ReportWriter.h"
+#include "utility/AtomicFile.h"
+#include "utility/SystemError.h"
+
+#include <filesystem>
+#include <system_error>
+#include <utility>
+
+namespace estate {
+
+namespace {
+
+void makeFolder(std::string const& folder) {
+    std::error_code failure;
+    std::filesystem::create_directories(folder, failure);
+    if (failure) {
+        throw util::SystemError("create", folder, failure.value());
+    }
+}
+
+// Every output of the estate, gathered console by console.
+struct EstateOutputs {
+    EstateTotals totals;
+    EstateDocument document;
+    EstateCsv csv;
+    EstateRows rows;
+    EstatePage page;
+};
+
+void addConsole(EstateOutputs& outputs, ConsoleRun const& console, std::string const& folder) {
+    std::optional<nlohmann::ordered_json> const summary = readSummary(console);
+    if (summary) {
+        report::writeReport(*summary, console.vpdFolder,
+                            folder + "/consoles/" + consoleFolderName(console.record.console),
+                            std::nullopt, report::DocumentPlacement::link);
+    }
+    outputs.totals.add(console, summary);
+    outputs.document.add(console, summary);
+    outputs.csv.add(console, summary);
+    outputs.rows.add(console, summary);
+    outputs.page.add(console, summary);
+}
+
+} // namespace
+
+void writeEstate(Estate const& estate, std::string const& folder) {
+    makeFolder(folder);
+    EstateOutputs outputs;
+    for (ConsoleRun const& console : estate.consoles) {
+        addConsole(outputs, console, folder);
+    }
+    nlohmann::ordered_json const totals = outputs.totals.document();
+    // Each text is taken out and dropped once written: at 200,000 partitions
+    // the outputs held together would double the estate's memory.
+    util::writeFileAtomically(folder + "/estate.json",
+                              std::move(outputs.document).text(estate.collected, totals));
+    util::writeFileAtomically(folder + "/estate.csv", std::move(outputs.csv).takeText());
+    util::writeFileAtomically(folder + "/index.html",
+                              outputs.page.text(estate, totals, outputs.rows.scriptText()));
+}
+
+} // namespace estate
