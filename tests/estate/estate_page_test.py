@@ -16,7 +16,8 @@ import tempfile
 import unittest
 
 sys.path.insert(0, os.path.join(os.path.dirname(os.path.abspath(__file__)), "..", "report"))
-from report_page_test import SKIP, browser_missing, start_chromium  # noqa: E402 pylint: disable=wrong-import-position
+import report_test_runner  # noqa: E402 pylint: disable=wrong-import-position
+from report_page_test import browser_missing, start_chromium  # noqa: E402 pylint: disable=wrong-import-position
 
 REPORT = ""
 FAILING = ("channel_failure", "client_failure", "fetch_failure", "timed_out", "worker_died")
@@ -214,13 +215,8 @@ def main():
     REPORT = os.path.abspath(sys.argv[1])
     if not os.path.isfile(os.path.join(REPORT, "estate.json")):
         print(f"skipped: no estate report in {REPORT} (see the test estate.MakeEstateReport)")
-        return SKIP
-    suite = unittest.defaultTestLoader.loadTestsFromName(sys.argv[2], sys.modules[__name__])
-    result = unittest.TextTestRunner(verbosity=2).run(suite)
-    if result.skipped and not result.failures and not result.errors:
-        print("skipped:", "; ".join(reason for _, reason in result.skipped))
-        return SKIP
-    return 0 if result.wasSuccessful() and result.testsRun > 0 else 1
+        return report_test_runner.SKIP
+    return report_test_runner.run(sys.argv[2], sys.modules[__name__])
 
 
 if __name__ == "__main__":
