@@ -25,6 +25,7 @@ struct Script {
 
 std::vector<Script> const& _scripts() {
     static std::vector<Script> const scripts{
+        {"tools/check-ansible", "Usage: tools/check-ansible\n"},
         {"tools/check-css", "Usage: tools/check-css FILE...\n"},
         {"tools/check-static", "Usage: tools/check-static [--page]\n"},
         {"tools/coverage", "Usage: tools/coverage\n"},
@@ -133,7 +134,8 @@ constexpr char gc_FrontendLockHeldOnInstall[] =
     "esac\n";
 
 constexpr char gc_Packages[] = "cmake g++ make libgtest-dev util-linux time proot python3 "
-                               "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev";
+                               "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev ansible-core "
+                               "openssh-server openssh-client";
 
 std::string _waitingLine(std::string const& lock, std::string const& seconds) {
     return "ensure-deps: another package manager holds apt's lock " + lock +

@@ -1,4 +1,4 @@
-#!/usr/bin/python3
+#!/usr/bin/env python
 # Packs the outputs of one survey run on the console into one bundle:
 # bundle.json, summary.json, metrics.prom (when the run wrote one), and the
 # result folders VPD/ and Trace/ as the run left them (the run's lock and
