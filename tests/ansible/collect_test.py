@@ -53,10 +53,13 @@ CONSOLES = [
 ]
 UNREACHABLE = 'ssh-gone'
 DEADLINE_SECONDS = 6
+SURVEY_OPTIONS = ['-t', '2']
 STALE_AGE_SECONDS = 2 * 24 * 3600
 
 
 def scenario_path(name):
+    if os.path.isabs(name):
+        return name
     local = os.path.join(os.path.dirname(os.path.abspath(__file__)), 'scenarios', name)
     if os.path.exists(local):
         return local
@@ -185,8 +188,8 @@ class Console:
         return subprocess.run(argv, env=self.estate.environment, capture_output=True, text=True, timeout=120)
 
     def run_timer(self):
-        run = self.run_on_console([OPTIONS.survey, '--all', '--quiet', '-t', '2', '--summary',
-                                   '/var/lib/quorvex-survey/summary.json'])
+        run = self.run_on_console([OPTIONS.survey, '--all', '--quiet'] + SURVEY_OPTIONS
+                                  + ['--summary', '/var/lib/quorvex-survey/summary.json'])
         if run.returncode not in (0, 4, 8):
             raise AssertionError('timer run on %s: status %d: %s' % (self.name, run.returncode, run.stderr))
         if self.records[0] == 'stale' and self.estate.collection == 0:
@@ -204,7 +207,7 @@ class Console:
                 'quorvex_survey_work_dir': self.path('work')})
         else:
             variables.update({'ansible_host': self.address, 'ansible_port': self.estate.port,
-                              'ansible_user': 'root',
+                              'ansible_user': 'root', 'ansible_remote_tmp': self.path('tmp'),
                               'ansible_ssh_common_args': ' '.join(self.estate.ssh_options())})
         return variables
 
@@ -219,7 +222,8 @@ class Estate:
         self.environment = dict(os.environ)
         self.environment.update({
             MARKER_VARIABLE: self.marker, 'HOME': self.path('home'), 'ANSIBLE_NOCOLOR': '1',
-            'ANSIBLE_COLLECTIONS_PATH': self.path('collections'),
+            'ANSIBLE_HOME': self.path('home', '.ansible'), 'ANSIBLE_COLLECTIONS_PATH': self.path('collections'),
+            'ANSIBLE_REMOTE_TEMP': self.path('home', '.ansible', 'tmp'),
             'ANSIBLE_LOCAL_TEMP': self.path('home', 'tmp'), 'ANSIBLE_RETRY_FILES_ENABLED': 'false',
             'ANSIBLE_PYTHON_INTERPRETER': '/usr/bin/python3', 'ANSIBLE_SSH_RETRIES': '0'})
         os.makedirs(self.path('home'))
@@ -268,13 +272,13 @@ class Estate:
 
     def write_inventory(self):
         hosts = {console.name: console.host_variables() for console in self.consoles}
-        common = {'quorvex_survey_command': OPTIONS.survey, 'quorvex_survey_options': ['-t', '2'],
+        common = {'quorvex_survey_command': OPTIONS.survey, 'quorvex_survey_options': SURVEY_OPTIONS,
                   'quorvex_survey_metrics': False, 'quorvex_survey_deadline_seconds': DEADLINE_SECONDS,
                   'quorvex_survey_poll_seconds': 1}
         with open(self.path('inventory.json'), 'w') as inventory:
             json.dump({'all': {'vars': common, 'hosts': hosts}}, inventory, indent=1)
 
-    def collect(self):
+    def collect(self, forks=10):
         """One collection: the timers' runs, then the playbook."""
         for console in self.consoles:
             console.use_scenario(self.collection)
@@ -283,7 +287,7 @@ class Estate:
         folder = self.path('collect%d' % self.collection)
         started = time.monotonic()
         run = self.run(['ansible-playbook', 'quorvex.pylon.collect', '-i', self.path('inventory.json'),
-                        '-f', '10', '-e', 'quorvex_pylon_collect_dir=' + folder,
+                        '-f', str(forks), '-e', 'quorvex_pylon_collect_dir=' + folder,
                         '-e', '{"quorvex_records_estate": %s}' % json.dumps(has_estate_command())]
                        + estate_history(self.path('history.sqlite')))
         self.results.append({'folder': folder, 'seconds': time.monotonic() - started, 'output': run.stdout,
