@@ -133,9 +133,10 @@ constexpr char gc_FrontendLockHeldOnInstall[] =
     "  exit 100 ;;\n"
     "esac\n";
 
-constexpr char gc_Packages[] = "cmake g++ make libgtest-dev util-linux time proot python3 "
-                               "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev ansible-core "
-                               "openssh-server openssh-client";
+constexpr char gc_Packages[] =
+    "cmake g++ make libgtest-dev util-linux time proot python3 "
+    "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev ansible-core "
+    "openssh-server openssh-client";
 
 std::string _waitingLine(std::string const& lock, std::string const& seconds) {
     return "ensure-deps: another package manager holds apt's lock " + lock +
