@@ -27,6 +27,7 @@ import argparse
 import json
 import os
 import shutil
+import signal
 import socket
 import subprocess
 import sys
@@ -96,18 +97,43 @@ def tree_files(folder):
     return found
 
 
-def marked_processes(marker):
-    found = []
+def mount_namespace(pid):
+    return os.readlink('/proc/%s/ns/mnt' % pid)
+
+
+def is_test_process(pid, marker, folder, namespaces):
+    """Whether a process belongs to the test: the marker in its environment,
+    the test's folder in its command line, or its place in the mount
+    namespace of one of the test's sshds. ssh and sshd write their process
+    title over their environment, so a connection master ("ssh: ... [mux]")
+    or an sshd session ("sshd: root@notty") shows no marker."""
+    try:
+        with open('/proc/%s/environ' % pid, 'rb') as environ:
+            if (MARKER_VARIABLE + '=' + marker).encode() in environ.read().split(b'\0'):
+                return True
+        with open('/proc/%s/cmdline' % pid, 'rb') as cmdline:
+            if folder.encode() in cmdline.read():
+                return True
+        return mount_namespace(pid) in namespaces
+    except OSError:
+        return False
+
+
+def marked_processes(marker, folder, namespaces):
+    return [int(pid) for pid in os.listdir('/proc')
+            if pid.isdigit() and int(pid) != os.getpid() and is_test_process(pid, marker, folder, namespaces)]
+
+
+def sshd_listener(config):
+    """The pid of the sshd that reads the configuration file config."""
     for pid in os.listdir('/proc'):
-        if not pid.isdigit() or int(pid) == os.getpid():
-            continue
         try:
-            with open('/proc/%s/environ' % pid, 'rb') as environ:
-                if (MARKER_VARIABLE + '=' + marker).encode() in environ.read().split(b'\0'):
-                    found.append(int(pid))
+            with open('/proc/%s/comm' % pid) as comm, open('/proc/%s/cmdline' % pid, 'rb') as cmdline:
+                if comm.read().strip() == 'sshd' and config.encode() in cmdline.read():
+                    return int(pid)
         except OSError:
             continue
-    return found
+    raise AssertionError('no sshd reads ' + config)
 
 
 class Console:
@@ -168,6 +194,9 @@ class Console:
             stdout=log, stderr=subprocess.STDOUT, env=self.estate.environment)
         log.close()
         wait_for_listener(self.address, port, self.sshd)
+        namespace = mount_namespace(sshd_listener(self.path('sshd_config')))
+        if namespace != mount_namespace('self'):
+            self.estate.namespaces.add(namespace)
         with open(self.path('host_key.pub')) as key:
             host_key = ' '.join(key.read().split()[:2])
         with open(self.estate.path('known_hosts'), 'a') as known_hosts:
@@ -226,12 +255,14 @@ class Estate:
             'ANSIBLE_REMOTE_TEMP': self.path('home', '.ansible', 'tmp'),
             'ANSIBLE_LOCAL_TEMP': self.path('home', 'tmp'), 'ANSIBLE_RETRY_FILES_ENABLED': 'false',
             'ANSIBLE_PYTHON_INTERPRETER': '/usr/bin/python3', 'ANSIBLE_SSH_RETRIES': '0',
+            'ANSIBLE_SSH_CONTROL_PATH_DIR': self.path('control'),
             # One shell on the console per task rather than four: each enters a sandbox.
             'ANSIBLE_PIPELINING': '1'})
         os.makedirs(self.path('home'))
         self.port = free_port('127.0.0.2')
         self.consoles = [Console(self, spec) for spec in CONSOLES]
         self.results = []
+        self.namespaces = set()
 
     def path(self, *names):
         return os.path.join(self.work, *names)
@@ -254,16 +285,38 @@ class Estate:
         self.write_inventory()
 
     def stop(self):
+        self.close_connections()
         for console in self.consoles:
             console.stop_sshd()
+
+    def close_connections(self):
+        """Ends the connections Ansible keeps open to reuse (ControlPersist):
+        their masters, and the sshd sessions serving them, would outlive the
+        test by a minute."""
+        if not os.path.isdir(self.path('control')):
+            return
+        for name in os.listdir(self.path('control')):
+            subprocess.run(['ssh', '-o', 'ControlPath=' + self.path('control', name), '-O', 'exit', 'console'],
+                           env=self.environment, capture_output=True, timeout=30)
 
     def left_processes(self):
         """The processes of the test still running once the sshds are
         stopped, after a grace of a few seconds for those ending."""
         deadline = time.monotonic() + 5
-        while marked_processes(self.marker) and time.monotonic() < deadline:
+        while self.running_processes() and time.monotonic() < deadline:
             time.sleep(0.2)
-        return marked_processes(self.marker)
+        return self.running_processes()
+
+    def kill(self, pids):
+        """Ends what was left running, so that a failing test leaves nothing either."""
+        for pid in pids:
+            try:
+                os.kill(pid, signal.SIGKILL)
+            except ProcessLookupError:
+                continue
+
+    def running_processes(self):
+        return marked_processes(self.marker, self.work, self.namespaces)
 
     def run(self, argv, timeout=300):
         run = subprocess.run(argv, env=self.environment, cwd=self.work, capture_output=True, text=True,
@@ -346,6 +399,7 @@ class Collection(unittest.TestCase):
         finally:
             cls.estate.stop()
             cls.left_processes = cls.estate.left_processes()
+            cls.estate.kill(cls.left_processes)
             if sys.exc_info()[0] is not None:
                 shutil.rmtree(cls.estate.work)
 
