@@ -25,6 +25,7 @@ struct Script {
 
 std::vector<Script> const& _scripts() {
     static std::vector<Script> const scripts{
+        {"tools/check-ansible", "Usage: tools/check-ansible\n"},
         {"tools/check-css", "Usage: tools/check-css FILE...\n"},
         {"tools/check-static", "Usage: tools/check-static [--page]\n"},
         {"tools/check-units", "Usage: tools/check-units BUILD_DIR\n"},
@@ -136,7 +137,8 @@ constexpr char gc_FrontendLockHeldOnInstall[] =
 constexpr char gc_Packages[] = "cmake g++ make libgtest-dev util-linux time proot python3 "
                                "libcli11-dev nlohmann-json3-dev python3-jsonschema libexpat1-dev "
                                "systemd man-db libsqlite3-dev libsqlitecpp-dev libpugixml-dev "
-                               "prometheus python3-prometheus-client libxml2-utils";
+                               "prometheus python3-prometheus-client libxml2-utils ansible-core "
+                               "openssh-server openssh-client";
 
 std::string _waitingLine(std::string const& lock, std::string const& seconds) {
     return "ensure-deps: another package manager holds apt's lock " + lock +
