@@ -67,7 +67,8 @@
     }
 
     function spacer(height) {
-        return "<tr class=\"spacer\"><td colspan=\"9\" style=\"height:" + height + "px\"></td></tr>";
+        return "<tr class=\"spacer\"><td colspan=\"9\" style=\"height:" + height +
+            "px\"></td></tr>";
     }
 
     function draw() {
@@ -102,7 +103,9 @@
     // Ranks of a table of texts in sorted order, so that rows sort by number.
     function ranksOf(texts) {
         const order = texts.map(function (text, index) { return index; });
-        order.sort(function (a, b) { return texts[a] < texts[b] ? -1 : texts[a] > texts[b] ? 1 : 0; });
+        order.sort(function (left, right) {
+            return texts[left] < texts[right] ? -1 : texts[left] > texts[right] ? 1 : 0;
+        });
         const ranks = new Int32Array(texts.length);
         order.forEach(function (index, rank) { ranks[index] = rank; });
         return ranks;
@@ -124,7 +127,8 @@
     function keysFor(column) {
         const keys = new Float64Array(total);
         const texts = column === "status" || column === "reason" ? ranksOf(data.texts) : null;
-        const machines = column === "machine" ? ranksOf(data.machines.map(function (m) { return m[1]; })) : null;
+        const machines = column === "machine" ?
+            ranksOf(data.machines.map(function (machine) { return machine[1]; })) : null;
         for (let row = 0; row < total; row += 1) {
             keys[row] = keyOf(column, row, texts, machines);
         }
@@ -149,22 +153,26 @@
         const order = identityOrder();
         const direction = descending ? -1 : 1;
         if (column === "host") {
-            order.sort(function (a, b) {
-                const x = data.host[a];
-                const y = data.host[b];
-                return direction * (x < y ? -1 : x > y ? 1 : a - b);
+            order.sort(function (left, right) {
+                const leftHost = data.host[left];
+                const rightHost = data.host[right];
+                return direction * (leftHost < rightHost ? -1 : leftHost > rightHost ? 1 :
+                    left - right);
             });
         } else {
             const keys = keysFor(column);
-            order.sort(function (a, b) { return direction * (keys[a] - keys[b] || a - b); });
+            order.sort(function (left, right) {
+                return direction * (keys[left] - keys[right] || left - right);
+            });
         }
         return order;
     }
 
     function rowText(row) {
         const reason = data.reason[row] < 0 ? "" : data.texts[data.reason[row]];
-        return [data.consoles[consoleOf(row)].name, data.machines[data.machine[row]][1], data.id[row],
-            data.host[row], data.ip[row], data.texts[data.status[row]], reason].join("\n").toLowerCase();
+        return [data.consoles[consoleOf(row)].name, data.machines[data.machine[row]][1],
+            data.id[row], data.host[row], data.ip[row], data.texts[data.status[row]],
+            reason].join("\n").toLowerCase();
     }
 
     function matchesOutcome(row, choice) {
@@ -202,7 +210,9 @@
         }
         const started = performance.now();
         const descending = heading.getAttribute("aria-sort") === "ascending";
-        document.querySelectorAll(".estate-rows th").forEach(function (th) { th.removeAttribute("aria-sort"); });
+        document.querySelectorAll(".estate-rows th").forEach(function (other) {
+            other.removeAttribute("aria-sort");
+        });
         heading.setAttribute("aria-sort", descending ? "descending" : "ascending");
         sorted = sortBy(heading.dataset.column, descending);
         applyFilters();
