@@ -14,13 +14,13 @@ inventory of ten simulated consoles on this one machine:
 - one unreachable (127.0.0.4, where nothing listens).
 
 Among them: a survey run now, timer runs collected (one of them stale), a
-console whose machine listing fails (tool error, exit 69), one whose
-survey hangs past the deadline, one without Python and one whose variable
-fails the role's check (tool errors with Ansible's message). Two
-collections, the scenarios changed in between, the second naming its folder
-relative to the current one. Everything lives in a folder of the build tree, removed at the end;
-every process started carries a marker in its environment, and none may be
-left.
+console whose machine listing fails (tool error, exit 69), one whose survey
+hangs past the deadline, one without Python and one whose variable fails
+the role's check (tool errors with Ansible's message). Two collections, the
+scenarios changed in between, the second naming its folder relative to the
+current one. Everything lives in a folder of the build tree, removed at the
+end; every process started carries a marker in its environment, and none
+may be left.
 
 Usage: collect_test.py --source-root DIR --work-root DIR --survey FILE
                        --simulator FILE --collection FILE
