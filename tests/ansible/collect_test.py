@@ -1,8 +1,8 @@
 #!/usr/bin/env python3
 """The collection quorvex.pylon through the real ansible-playbook, against an
-inventory of eight simulated consoles on this one machine:
+inventory of ten simulated consoles on this one machine:
 
-- five reached with the local connection, each entering a sandbox of its own
+- seven reached with the local connection, each entering a sandbox of its own
   (tools/sandbox) with its own simulated console and result folders: the
   inventory gives each a shell (ansible_shell_executable) that is a small
   script running /bin/sh inside that console's sandbox, so every module the
@@ -14,11 +14,13 @@ inventory of eight simulated consoles on this one machine:
 - one unreachable (127.0.0.4, where nothing listens).
 
 Among them: a survey run now, timer runs collected (one of them stale), a
-console whose machine listing fails (tool error, exit 69) and one whose
-survey hangs past the deadline. Two collections, the scenarios changed in
-between. Everything lives in a folder of the build tree, removed at the end;
-every process started carries a marker in its environment, and none may be
-left.
+console whose machine listing fails (tool error, exit 69), one whose survey
+hangs past the deadline, one without Python and one whose variable fails
+the role's check (tool errors with Ansible's message). Two collections, the
+scenarios changed in between, the second naming its folder relative to the
+current one. Everything lives in a folder of the build tree, removed at the
+end; every process started carries a marker in its environment, and none
+may be left.
 
 Usage: collect_test.py --source-root DIR --work-root DIR --survey FILE
                        --simulator FILE --collection FILE
@@ -51,7 +53,18 @@ CONSOLES = [
     ('ssh-run', '127.0.0.2', 'run', 'several-machines.scn', 'console.scn', ('collected', 'collected')),
     ('ssh-timer', '127.0.0.3', 'collect', 'console.scn', 'several-machines.scn', ('collected', 'collected')),
     ('ssh-gone', '127.0.0.4', 'run', 'console.scn', 'console.scn', ('unreachable', 'unreachable')),
+    ('local-no-python', 'local', 'run', 'console.scn', 'console.scn', ('tool_error', 'tool_error')),
+    ('local-bad-variable', 'local', 'run', 'console.scn', 'console.scn', ('tool_error', 'tool_error')),
 ]
+# What sets those two apart: a Python that is not there, a variable that
+# fails the survey role's check.
+BROKEN_VARIABLES = {
+    'local-no-python': {'ansible_python_interpreter': '/nonexistent/python3'},
+    'local-bad-variable': {'quorvex_survey_poll_seconds': 'often'},
+}
+# The console whose run writes its metrics file; a wrapper around
+# quorvex-survey keeps a copy of it to compare with the bundle's.
+METRICS_CONSOLE = 'local-run'
 UNREACHABLE = 'ssh-gone'
 DEADLINE_SECONDS = 6
 SURVEY_OPTIONS = ['-t', '2']
@@ -180,6 +193,15 @@ class Console:
             shell.write("PYLON_SIM_SCENARIO='%s' exec %s /bin/sh \"$@\"\n" % (self.path('scenario.scn'), words))
         os.chmod(self.path('shell'), 0o755)
 
+    def write_metrics_keeper(self):
+        """quorvex-survey, keeping a copy of the metrics file each run writes."""
+        with open(self.path('survey-keeping-metrics'), 'w') as keeper:
+            keeper.write('#!/bin/sh\n\'%s\' "$@"\nstatus=$?\n' % OPTIONS.survey)
+            keeper.write('while [ $# -gt 1 ]; do\n')
+            keeper.write('    if [ "$1" = --metrics ]; then cp "$2" \'%s\'; fi\n' % self.path('metrics.prom'))
+            keeper.write('    shift\ndone\nexit $status\n')
+        os.chmod(self.path('survey-keeping-metrics'), 0o755)
+
     def start_sshd(self, port):
         subprocess.run(['ssh-keygen', '-q', '-t', 'ed25519', '-N', '', '-f', self.path('host_key')], check=True)
         config = [
@@ -243,11 +265,15 @@ class Console:
             variables.update({'ansible_host': self.address, 'ansible_port': self.estate.port,
                               'ansible_user': 'root', 'ansible_remote_tmp': self.path('tmp'),
                               'ansible_ssh_common_args': ' '.join(self.estate.ssh_options())})
+        if self.name == METRICS_CONSOLE:
+            variables.update({'quorvex_survey_metrics': True,
+                              'quorvex_survey_command': self.path('survey-keeping-metrics')})
+        variables.update(BROKEN_VARIABLES.get(self.name, {}))
         return variables
 
 
 class Estate:
-    """The eight consoles, the controller's home and the collections."""
+    """The consoles, the controller's home and the collections."""
 
     def __init__(self):
         self.work = tempfile.mkdtemp(prefix='collect.', dir=OPTIONS.work_root)
@@ -287,6 +313,8 @@ class Estate:
                 console.write_shell()
             elif console.name != UNREACHABLE:
                 console.start_sshd(self.port)
+            if console.name == METRICS_CONSOLE:
+                console.write_metrics_keeper()
         self.write_inventory()
 
     def stop(self):
@@ -334,7 +362,7 @@ class Estate:
         hosts = {console.name: console.host_variables() for console in self.consoles}
         common = {'quorvex_survey_command': OPTIONS.survey, 'quorvex_survey_options': SURVEY_OPTIONS,
                   'quorvex_survey_metrics': False, 'quorvex_survey_deadline_seconds': DEADLINE_SECONDS,
-                  'quorvex_survey_poll_seconds': 1}
+                  'quorvex_survey_poll_seconds': 1, 'quorvex_survey_transfer_throttle': 2}
         with open(self.path('inventory.json'), 'w') as inventory:
             json.dump({'all': {'vars': common, 'hosts': hosts}}, inventory, indent=1)
 
@@ -345,9 +373,12 @@ class Estate:
             if console.mode == 'collect':
                 console.run_timer()
         folder = self.path('collect%d' % self.collection)
+        # The second names its folder relative to the one ansible-playbook
+        # starts in, as an operator may.
+        given = folder if self.collection == 0 else os.path.relpath(folder, self.work)
         started = time.monotonic()
         run = self.run(['ansible-playbook', 'quorvex.pylon.collect', '-i', self.path('inventory.json'),
-                        '-f', str(forks), '-e', 'quorvex_pylon_collect_dir=' + folder,
+                        '-f', str(forks), '-e', 'quorvex_pylon_collect_dir=' + given,
                         '-e', json.dumps(estate_variables(self.path('history.sqlite')))], timeout)
         self.results.append({'folder': folder, 'seconds': time.monotonic() - started, 'output': run.stdout,
                              'consoles': {console.name: snapshot(console) for console in self.consoles}})
@@ -375,6 +406,11 @@ def snapshot(console):
     if console.mode == 'collect' and os.path.exists(summary):
         with open(summary, 'rb') as content:
             files['summary.json'] = content.read()
+    kept = console.path('metrics.prom')
+    if os.path.exists(kept):
+        with open(kept, 'rb') as content:
+            files['metrics.prom'] = content.read()
+        os.remove(kept)
     return files
 
 
@@ -480,6 +516,35 @@ class Collection(unittest.TestCase):
                 with open(os.path.join(bundle, 'summary.json')) as summary:
                     machines.append(sorted(m['identity'] for m in json.load(summary)['machines']))
             self.assertNotEqual(machines[0], machines[1], name)
+
+    def test_console_without_python_is_a_tool_error_with_ansibles_message(self):
+        for collection in (0, 1):
+            record = self.record(collection, 'local-no-python')
+            self.assertTrue(record['message'].startswith(
+                'Reach the console: The module failed to execute correctly, you probably need to set the '
+                'interpreter.'), record['message'])
+            self.assertIn('/nonexistent/python3: not found', record['message'])
+            self.assertEqual((None, None), (record['bundle'], record['exit_status']))
+
+    def test_variable_failing_the_roles_check_is_a_tool_error_naming_it(self):
+        record = self.record(0, 'local-bad-variable')
+        self.assertIn('Validation of arguments failed', record['message'])
+        self.assertIn("argument 'quorvex_survey_poll_seconds'", record['message'])
+        self.assertEqual((None, None), (record['bundle'], record['exit_status']))
+
+    def test_metrics_in_the_bundle_are_what_the_survey_wrote(self):
+        for collection, result in enumerate(self.estate.results):
+            written = result['consoles'][METRICS_CONSOLE]
+            self.assertIn('metrics.prom', written, collection)
+            bundle = os.path.join(result['folder'], self.record(collection, METRICS_CONSOLE)['bundle'])
+            with open(os.path.join(bundle, 'metrics.prom'), 'rb') as metrics:
+                self.assertEqual(written['metrics.prom'], metrics.read(), collection)
+
+    def test_relative_collect_dir_is_taken_from_the_current_folder(self):
+        folder = self.estate.results[1]['folder']
+        self.assertTrue(os.path.isfile(os.path.join(folder, 'bundles', METRICS_CONSOLE + '.tar.gz')))
+        playbooks = self.estate.path('collections', 'ansible_collections', 'quorvex', 'pylon', 'playbooks')
+        self.assertEqual(['collect.yml'], os.listdir(playbooks))
 
     def test_nothing_is_left_running(self):
         self.assertEqual([], self.left_processes)
