@@ -25,8 +25,7 @@ template <typename Value> Value valueOf(Json const& object, char const* name) {
     try {
         return member.get<Value>();
     } catch (Json::exception const&) {
-        throw MalformedInput(std::string("the summary's member ") + name +
-                             " is not of its type");
+        throw MalformedInput(std::string("the summary's member ") + name + " is not of its type");
     }
 }
 

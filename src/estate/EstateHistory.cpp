@@ -38,8 +38,8 @@ std::optional<long long> recordedRun(history::HistoryDatabase& database,
 // recorded now, as a run's own summary does (the console's own record stays
 // in its bundle).
 Json keptSummary(Json summary, std::string const& file) {
-    summary["history"] = Json{{"file", file}, {"run_id", nullptr}, {"recorded", true},
-                              {"error", nullptr}};
+    summary["history"] =
+        Json{{"file", file}, {"run_id", nullptr}, {"recorded", true}, {"error", nullptr}};
     return summary;
 }
 
@@ -70,7 +70,8 @@ std::vector<std::string> const& EstateHistory::failures() const {
 }
 
 long long EstateHistory::_recordOnce(ConsoleRun const& console, Json const& summary) const {
-    report::RunSummary const run = bundledRun(summary);
+    report::RunSummary run = bundledRun(summary);
+    run.consoleHost = console.record.console;
     history::HistoryDatabase database(_file);
     if (std::optional<long long> const recorded = recordedRun(database, run)) {
         return *recorded;

@@ -14,10 +14,12 @@ namespace estate {
 // The estate's runs in the history database (--history, docs/history.md),
 // so that what changed since a console's last run works across the estate.
 // Each collected or stale console's run is recorded as the console's own run
-// records itself: one transaction, the console known by its summary's
-// console_host, its VPD documents read from the bundle. A run already
-// recorded (the same console and start: a stale console collected again, an
-// estate merged twice) is not recorded a second time.
+// records itself: one transaction, its VPD documents read from the bundle.
+// The console is known by its inventory name, as everywhere in the estate:
+// unlike the host name a console reports of itself, the inventory never
+// names two consoles alike. A run already recorded (the same console and
+// start: a stale console collected again, an estate merged twice) is not
+// recorded a second time.
 class EstateHistory {
 public:
     // file: the history database; empty for none (--no-history).

@@ -23,8 +23,8 @@ Ending runEstate(std::string const& collectFolder, std::string const& reportFold
                  std::string const& historyFile) {
     std::ostringstream out;
     std::ostringstream errors;
-    int const status = estate::runEstateSubcommand({collectFolder, reportFolder, historyFile},
-                                                   out, errors);
+    int const status =
+        estate::runEstateSubcommand({collectFolder, reportFolder, historyFile}, out, errors);
     std::string const document = QuorvexTest::readFile(reportFolder + "/estate.json");
     return {status, errors.str(), nlohmann::json::parse(document, nullptr, false)};
 }
@@ -43,10 +43,10 @@ std::string summaryOf(std::string const& host, std::string const& minute,
 // outcome.
 void layDownEstate(CollectFolder const& folder, std::string const& minute,
                    std::string const& outcome) {
-    folder.addBundle("a",
-                     summaryOf("a.example", minute,
-                               {CollectFolder::partition("1", "h1", outcome, "no answer")}),
-                     {"h1.VPD.xml"});
+    folder.addBundle(
+        "a",
+        summaryOf("a.example", minute, {CollectFolder::partition("1", "h1", outcome, "no answer")}),
+        {"h1.VPD.xml"});
     folder.addBundle(
         "b", summaryOf("b.example", minute, {CollectFolder::partition("1", "h2", "surveyed")}),
         {"h2.VPD.xml"});
@@ -76,14 +76,13 @@ nlohmann::json const& consoleEntry(nlohmann::json const& estate, std::string con
     throw std::runtime_error("no console " + name + " in estate.json");
 }
 
-TEST(EstateHistory, EachCollectedConsolesRunIsRecordedOnceByItsHost) {
+TEST(EstateHistory, EachCollectedConsolesRunIsRecordedOnceByItsInventoryName) {
     CollectFolder const folder;
     layDownEstate(folder, "55", "surveyed");
     QuorvexTest::TemporaryDirectory const work;
     Ending const ending = runEstate(folder.path(), work.file("report"), work.file("h.sqlite"));
     EXPECT_EQ(0, ending.status) << ending.errors;
-    EXPECT_EQ((std::vector<std::string>{"a.example", "b.example"}),
-              recordedConsoles(work.file("h.sqlite")));
+    EXPECT_EQ((std::vector<std::string>{"a", "b"}), recordedConsoles(work.file("h.sqlite")));
     nlohmann::json const& a = consoleEntry(ending.estate, "a")["since_last_run"];
     EXPECT_EQ(1, a["run_id"]);
     EXPECT_TRUE(a["previous_run_id"].is_null());
@@ -128,8 +127,8 @@ TEST(EstateHistory, ASecondCollectionShowsEachConsolesChangesSinceItsOwnLastRun)
 
 TEST(EstateHistory, AStaleConsoleIsRecordedAndAToolErrorIsNot) {
     CollectFolder const folder;
-    folder.addBundle("old", summaryOf("old.example", "10",
-                                      {CollectFolder::partition("1", "h1", "surveyed")}));
+    folder.addBundle(
+        "old", summaryOf("old.example", "10", {CollectFolder::partition("1", "h1", "surveyed")}));
     folder.addBundle("failed", summaryOf("failed.example", "10",
                                          {CollectFolder::partition("1", "h1", "surveyed")}));
     folder.writeRecords(CollectFolder::records(
@@ -138,7 +137,7 @@ TEST(EstateHistory, AStaleConsoleIsRecordedAndAToolErrorIsNot) {
     QuorvexTest::TemporaryDirectory const work;
     Ending const ending = runEstate(folder.path(), work.file("report"), work.file("h.sqlite"));
     EXPECT_EQ(0, ending.status) << ending.errors;
-    EXPECT_EQ(std::vector<std::string>{"old.example"}, recordedConsoles(work.file("h.sqlite")));
+    EXPECT_EQ(std::vector<std::string>{"old"}, recordedConsoles(work.file("h.sqlite")));
     EXPECT_TRUE(consoleEntry(ending.estate, "failed")["since_last_run"].is_null());
 }
 
@@ -157,8 +156,7 @@ TEST(EstateHistory, AHistoryThatCannotBeWrittenIsExit74WithEveryOutputWritten) {
     layDownEstate(folder, "55", "surveyed");
     QuorvexTest::TemporaryDirectory const work;
     QuorvexTest::writeFile(work.file("file"), "");
-    Ending const ending =
-        runEstate(folder.path(), work.file("report"), work.file("file/h.sqlite"));
+    Ending const ending = runEstate(folder.path(), work.file("report"), work.file("file/h.sqlite"));
     EXPECT_EQ(estate::gc_ExitHistoryNotRecorded, ending.status);
     std::string const cause = "cannot create " + work.file("file") + ": Not a directory\n";
     EXPECT_EQ("quorvex-survey: estate: console down: unreachable: Connection refused\n"
@@ -175,8 +173,8 @@ TEST(EstateHistory, AHistoryThatCannotBeWrittenIsExit74WithEveryOutputWritten) {
 
 TEST(EstateHistory, ASummaryTheHistoryCannotTakeIsThatConsolesFailure) {
     CollectFolder const folder;
-    folder.addBundle("odd", summaryOf("odd.example", "10",
-                                      {CollectFolder::partition("1", "h1", "vanished")}));
+    folder.addBundle(
+        "odd", summaryOf("odd.example", "10", {CollectFolder::partition("1", "h1", "vanished")}));
     folder.writeRecords(
         CollectFolder::records({CollectFolder::record("odd", "collected", true, "null", "0")}));
     QuorvexTest::TemporaryDirectory const work;
@@ -185,6 +183,22 @@ TEST(EstateHistory, ASummaryTheHistoryCannotTakeIsThatConsolesFailure) {
     EXPECT_EQ("quorvex-survey: estate: cannot record console odd's run in " +
                   work.file("h.sqlite") + ": the summary names an unknown outcome vanished\n",
               ending.errors);
+}
+
+// Consoles simulated on one machine, or a host name reused, report one
+// console_host: each is still a console of its own.
+TEST(EstateHistory, TwoConsolesReportingOneHostNameAreTwoConsoles) {
+    CollectFolder const folder;
+    for (char const* name : {"a", "b"}) {
+        folder.addBundle(name, summaryOf("same.example", "10",
+                                         {CollectFolder::partition("1", "h1", "surveyed")}));
+    }
+    folder.writeRecords(
+        CollectFolder::records({CollectFolder::record("a", "collected", true, "null", "0"),
+                                CollectFolder::record("b", "collected", true, "null", "0")}));
+    QuorvexTest::TemporaryDirectory const work;
+    ASSERT_EQ(0, runEstate(folder.path(), work.file("report"), work.file("h.sqlite")).status);
+    EXPECT_EQ((std::vector<std::string>{"a", "b"}), recordedConsoles(work.file("h.sqlite")));
 }
 
 } // namespace

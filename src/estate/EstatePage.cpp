@@ -143,16 +143,16 @@ void EstatePage::add(ConsoleRun const& console, std::optional<Json> const& summa
     auto const count = [&](char const* name) {
         return summary ? std::to_string(report::countOf(totals, name)) : std::string();
     };
-    _consoleRows +=
-        "<tr><th scope=\"row\">" + consoleName(console) + "</th><td>" +
-        textOf(console.record.kind).label + "</td><td>" + escapeHtml(console.consoleHost) +
-        "</td><td>" + report::timeElement(summary ? report::member(*summary, "started") : none) +
-        "</td><td class=\"number\">" +
-        report::htmlText(summary ? report::member(*summary, "exit_status") : none) +
-        "</td><td class=\"number\">" + count("machines") + "</td><td class=\"number\">" +
-        count("partitions") + "</td><td class=\"bar-cell\">" +
-        (summary ? report::outcomeBar(totals) : "") + "</td><td>" + changesText(console.changes) +
-        "</td></tr>\n";
+    _consoleRows += "<tr><th scope=\"row\">" + consoleName(console) + "</th><td>" +
+                    textOf(console.record.kind).label + "</td><td>" +
+                    escapeHtml(console.consoleHost) + "</td><td>" +
+                    report::timeElement(summary ? report::member(*summary, "started") : none) +
+                    "</td><td class=\"number\">" +
+                    report::htmlText(summary ? report::member(*summary, "exit_status") : none) +
+                    "</td><td class=\"number\">" + count("machines") +
+                    "</td><td class=\"number\">" + count("partitions") +
+                    "</td><td class=\"bar-cell\">" + (summary ? report::outcomeBar(totals) : "") +
+                    "</td><td>" + changesText(console.changes) + "</td></tr>\n";
 }
 
 std::string EstatePage::text(Estate const& estate, Json const& totals,
