@@ -54,7 +54,7 @@ report::PartitionSummary partitionOf(Json const& entry) {
     partition.host = valueOf<std::string>(entry, "host");
     partition.ip = valueOf<std::string>(entry, "ip");
     partition.activeStatus = optionalOf<std::string>(entry, "active_status");
-    std::string const outcome = valueOf<std::string>(entry, "outcome");
+    auto const outcome = valueOf<std::string>(entry, "outcome");
     std::optional<report::Outcome> const known = report::outcomeNamed(outcome);
     if (!known) {
         throw MalformedInput("the summary names an unknown outcome " + outcome);
