@@ -1,5 +1,6 @@
 #pragma once
 
+#include "estate/ConsoleChanges.h"
 #include "estate/ConsoleRecord.h"
 
 #include <nlohmann/json.hpp>
@@ -24,6 +25,10 @@ struct ConsoleRun {
     // The bundle's folder of status files and VPD documents; empty without
     // a bundle.
     std::string vpdFolder;
+    // What the history says of the run, set while the estate is written;
+    // nullopt when the run is not recorded (--no-history, or a console
+    // neither collected nor stale).
+    std::optional<ConsoleChanges> changes;
 
     bool hasSummary() const { return !summaryFile.empty(); }
 };

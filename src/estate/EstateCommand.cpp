@@ -2,6 +2,7 @@
 
 #include "estate/CollectRecords.h"
 #include "estate/EstateWriter.h"
+#include "history/HistoryDatabase.h"
 #include "report/ReportCommand.h"
 #include "utility/SystemError.h"
 
@@ -40,6 +41,22 @@ void reportNotCollected(Estate const& estate, std::ostream& errors) {
     }
 }
 
+// Where the consoles' runs are recorded: the run's database unless told.
+void addHistoryOptions(CLI::App& command, EstateRequest& request) {
+    request.historyFile = history::gc_DefaultHistoryFile;
+    CLI::Option* const history =
+        command
+            .add_option("--history", request.historyFile,
+                        "record each console's run in the history database FILE")
+            ->type_name("FILE")
+            ->default_str(request.historyFile)
+            ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    CLI::Option* const noHistory = command.add_flag_callback(
+        "--no-history", [&request] { request.historyFile.clear(); },
+        "record nothing in the history database");
+    history->excludes(noHistory);
+}
+
 } // namespace
 
 CLI::App* addEstateSubcommand(CLI::App& app, EstateRequest& request) {
@@ -53,6 +70,7 @@ CLI::App* addEstateSubcommand(CLI::App& app, EstateRequest& request) {
     command->add_option("--report", request.reportFolder, "folder to write the estate report into")
         ->type_name("DIR")
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    addHistoryOptions(*command, request);
     return command;
 }
 
@@ -73,15 +91,19 @@ int runEstateSubcommand(EstateRequest const& request, std::ostream& out, std::os
     if (!estate) {
         return status;
     }
+    EstateHistory history(request.historyFile);
     try {
-        writeEstate(*estate, request.reportFolder);
+        writeEstate(*estate, request.reportFolder, history);
     } catch (util::SystemError const& failure) {
         errors << gc_Prefix << failure.what() << "\n";
         return report::gc_ExitCannotCreate;
     }
     out << request.reportFolder << "/index.html\n";
     reportNotCollected(*estate, errors);
-    return 0;
+    for (std::string const& failure : history.failures()) {
+        errors << gc_Prefix << failure << "\n";
+    }
+    return history.failures().empty() ? 0 : gc_ExitHistoryNotRecorded;
 }
 
 } // namespace estate

@@ -22,7 +22,7 @@ struct Ending {
 Ending runEstate(std::string const& collectFolder, std::string const& reportFolder) {
     std::ostringstream out;
     std::ostringstream errors;
-    int const status = estate::runEstateSubcommand({collectFolder, reportFolder}, out, errors);
+    int const status = estate::runEstateSubcommand({collectFolder, reportFolder, ""}, out, errors);
     return {status, out.str(), errors.str()};
 }
 

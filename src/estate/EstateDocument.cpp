@@ -18,6 +18,19 @@ Json textOrNull(std::string const& text) {
     return text.empty() ? Json() : Json(text);
 }
 
+// The console's "since_last_run": null when its run is not recorded.
+Json changesDocument(std::optional<ConsoleChanges> const& changes) {
+    if (!changes) {
+        return Json();
+    }
+    return Json{{"run_id", orNull(changes->runId)},
+                {"previous_run_id", orNull(changes->previousRunId)},
+                {"new_failures", changes->newFailures},
+                {"recoveries", changes->recoveries},
+                {"inventory_changes", changes->inventoryChanges},
+                {"error", orNull(changes->unavailable)}};
+}
+
 std::string jsonText(Json const& value) {
     return value.dump(-1, ' ', false, Json::error_handler_t::replace);
 }
@@ -34,7 +47,8 @@ void EstateDocument::add(ConsoleRun const& console, std::optional<Json> const& s
                      {"console_host", textOrNull(console.consoleHost)},
                      {"mode", textOrNull(console.mode)},
                      {"run_started", orNull(console.runStarted)},
-                     {"report", orNull(consoleReportPath(console))}};
+                     {"report", orNull(consoleReportPath(console))},
+                     {"since_last_run", changesDocument(console.changes)}};
     std::string entryText = jsonText(entry);
     entryText.pop_back();
     _consoles += (_consoles.empty() ? "" : ",") + entryText +

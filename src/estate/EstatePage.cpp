@@ -42,6 +42,27 @@ std::string ageText(std::optional<long long> const& seconds) {
                       : std::to_string(hours / 24) + " d " + std::to_string(hours % 24) + " h";
 }
 
+std::string countText(std::size_t count, char const* one, char const* many) {
+    return std::to_string(count) + " " + (count == 1 ? one : many);
+}
+
+// "2 new failures, 1 recovery, 0 inventory changes"; what the history says
+// instead when there is nothing to compare; empty for a run not recorded.
+std::string changesText(std::optional<ConsoleChanges> const& changes) {
+    if (!changes) {
+        return "";
+    }
+    if (changes->unavailable) {
+        return "not recorded: " + escapeHtml(*changes->unavailable);
+    }
+    if (!changes->previousRunId) {
+        return "first recorded run";
+    }
+    return countText(changes->newFailures, "new failure", "new failures") + ", " +
+           countText(changes->recoveries, "recovery", "recoveries") + ", " +
+           countText(changes->inventoryChanges, "inventory change", "inventory changes");
+}
+
 void appendNotCollected(std::string& page, Estate const& estate) {
     std::string rows;
     for (ConsoleRun const& console : estate.consoles) {
@@ -122,15 +143,16 @@ void EstatePage::add(ConsoleRun const& console, std::optional<Json> const& summa
     auto const count = [&](char const* name) {
         return summary ? std::to_string(report::countOf(totals, name)) : std::string();
     };
-    _consoleRows +=
-        "<tr><th scope=\"row\">" + consoleName(console) + "</th><td>" +
-        textOf(console.record.kind).label + "</td><td>" + escapeHtml(console.consoleHost) +
-        "</td><td>" + report::timeElement(summary ? report::member(*summary, "started") : none) +
-        "</td><td class=\"number\">" +
-        report::htmlText(summary ? report::member(*summary, "exit_status") : none) +
-        "</td><td class=\"number\">" + count("machines") + "</td><td class=\"number\">" +
-        count("partitions") + "</td><td class=\"bar-cell\">" +
-        (summary ? report::outcomeBar(totals) : "") + "</td></tr>\n";
+    _consoleRows += "<tr><th scope=\"row\">" + consoleName(console) + "</th><td>" +
+                    textOf(console.record.kind).label + "</td><td>" +
+                    escapeHtml(console.consoleHost) + "</td><td>" +
+                    report::timeElement(summary ? report::member(*summary, "started") : none) +
+                    "</td><td class=\"number\">" +
+                    report::htmlText(summary ? report::member(*summary, "exit_status") : none) +
+                    "</td><td class=\"number\">" + count("machines") +
+                    "</td><td class=\"number\">" + count("partitions") +
+                    "</td><td class=\"bar-cell\">" + (summary ? report::outcomeBar(totals) : "") +
+                    "</td><td>" + changesText(console.changes) + "</td></tr>\n";
 }
 
 std::string EstatePage::text(Estate const& estate, Json const& totals,
@@ -147,7 +169,7 @@ std::string EstatePage::text(Estate const& estate, Json const& totals,
         {"console-options", [&estate](std::string& page) { appendConsoleOptions(page, estate); }});
     placeholders.push_back({"row-data", [&rowData](std::string& page) { page += rowData; }});
     std::string page;
-    page.reserve(rowData.size() + _consoleRows.size() + 64 * 1024);
+    page.reserve(rowData.size() + _consoleRows.size() + std::size_t{64} * 1024);
     report::fillSkeleton(page, gc_EstatePageSkeleton, placeholders);
     return page;
 }

@@ -34,12 +34,17 @@ struct EstateOutputs {
     EstatePage page;
 };
 
-void addConsole(EstateOutputs& outputs, ConsoleRun const& console, std::string const& folder) {
+void addConsole(EstateOutputs& outputs, ConsoleRun console, std::string const& folder,
+                EstateHistory& history) {
     std::optional<nlohmann::ordered_json> const summary = readSummary(console);
     if (summary) {
+        std::optional<report::SinceLastRun> const since = history.record(console, *summary);
+        if (since) {
+            console.changes = changesOf(*since);
+        }
         report::writeReport(*summary, console.vpdFolder,
                             folder + "/consoles/" + consoleFolderName(console.record.console),
-                            std::nullopt, report::DocumentPlacement::link);
+                            since, report::DocumentPlacement::link);
     }
     outputs.totals.add(console, summary);
     outputs.document.add(console, summary);
@@ -50,11 +55,11 @@ void addConsole(EstateOutputs& outputs, ConsoleRun const& console, std::string c
 
 } // namespace
 
-void writeEstate(Estate const& estate, std::string const& folder) {
+void writeEstate(Estate const& estate, std::string const& folder, EstateHistory& history) {
     makeFolder(folder);
     EstateOutputs outputs;
     for (ConsoleRun const& console : estate.consoles) {
-        addConsole(outputs, console, folder);
+        addConsole(outputs, console, folder, history);
     }
     nlohmann::ordered_json const totals = outputs.totals.document();
     // Each text is taken out and dropped once written: at 200,000 partitions

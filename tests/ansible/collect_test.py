@@ -26,6 +26,7 @@ Usage: collect_test.py --source-root DIR --work-root DIR --survey FILE
                        --simulator FILE --collection FILE
 """
 import argparse
+import csv
 import json
 import os
 import shutil
@@ -70,10 +71,11 @@ DEADLINE_SECONDS = 6
 SURVEY_OPTIONS = ['-t', '2']
 STALE_AGE_SECONDS = 2 * 24 * 3600
 # Whether each collection ends with the records role's estate merge
-# (quorvex-survey estate, its default): off until quorvex-survey has the
-# estate command; switching it on here also switches it on in
-# bench/ansible-collect.
-ESTATE_MERGE = False
+# (quorvex-survey estate, its default) into the test's own history database;
+# switching it off here also switches it off in bench/ansible-collect.
+ESTATE_MERGE = True
+# The records whose runs the estate records in the history.
+RECORDED = ('collected', 'stale')
 
 
 def scenario_path(name):
@@ -391,7 +393,8 @@ def estate_variables(database):
     test's own history database."""
     if not ESTATE_MERGE:
         return {'quorvex_records_estate': False}
-    return {'quorvex_records_estate': True, 'quorvex_records_history_file': database}
+    return {'quorvex_records_estate': True, 'quorvex_records_estate_command': OPTIONS.survey,
+            'quorvex_records_history_file': database}
 
 
 def snapshot(console):
@@ -545,6 +548,53 @@ class Collection(unittest.TestCase):
         self.assertTrue(os.path.isfile(os.path.join(folder, 'bundles', METRICS_CONSOLE + '.tar.gz')))
         playbooks = self.estate.path('collections', 'ansible_collections', 'quorvex', 'pylon', 'playbooks')
         self.assertEqual(['collect.yml'], os.listdir(playbooks))
+    def estate_file(self, collection, name):
+        return os.path.join(self.estate.results[collection]['folder'], 'report', name)
+
+    def history(self, *words):
+        run = self.estate.run([OPTIONS.survey, 'history'] + list(words)
+                              + ['--history', self.estate.path('history.sqlite'), '--json'])
+        return json.loads(run.stdout)
+
+    def test_estate_json_has_every_console_once_with_its_record_and_reason(self):
+        for collection in (0, 1):
+            with open(self.estate_file(collection, 'estate.json')) as estate:
+                consoles = json.load(estate)['consoles']
+            self.assertEqual(sorted(spec[0] for spec in CONSOLES), sorted(c['console'] for c in consoles))
+            for entry in consoles:
+                record = self.record(collection, entry['console'])
+                self.assertEqual((record['record'], record['message']), (entry['record'], entry['message']))
+                self.assertEqual(record['record'] in RECORDED, entry['since_last_run'] is not None,
+                                 entry['console'])
+
+    def test_estate_csv_has_every_console_with_its_record(self):
+        for collection in (0, 1):
+            with open(self.estate_file(collection, 'estate.csv'), newline='') as table:
+                rows = list(csv.reader(table))[1:]
+            records = {}
+            for row in rows:
+                records.setdefault(row[0], set()).add((row[1], row[2]))
+            expected = {entry['console']: {(entry['record'], entry['message'] or '')}
+                        for entry in self.records(collection)['consoles']}
+            self.assertEqual(expected, records)
+
+    def test_history_has_each_recorded_console_once_per_collection(self):
+        consoles = [run['console'] for run in sorted(self.history('runs')['runs'], key=lambda run: run['id'])]
+        for collection in (0, 1):
+            expected = sorted(spec[0] for spec in CONSOLES if spec[5][collection] in RECORDED)
+            # Recorded in the estate's order: stale consoles before collected ones.
+            recorded, consoles = consoles[:len(expected)], consoles[len(expected):]
+            self.assertEqual(expected, sorted(recorded))
+        self.assertEqual([], consoles)
+
+    def test_second_collection_reports_the_changed_consoles_changes(self):
+        changes = self.history('changes', '--console', 'local-run')
+        self.assertIsNotNone(changes['run']['previous_run'])
+        self.assertNotEqual([], changes['appeared'] + changes['disappeared'])
+        with open(self.estate_file(1, 'estate.json')) as estate:
+            entry = [c for c in json.load(estate)['consoles'] if c['console'] == 'local-run'][0]
+        self.assertEqual(changes['run']['id'], entry['since_last_run']['run_id'])
+        self.assertEqual(changes['run']['previous_run'], entry['since_last_run']['previous_run_id'])
 
     def test_nothing_is_left_running(self):
         self.assertEqual([], self.left_processes)

@@ -26,8 +26,10 @@ def main():
     subprocess.run([sys.executable, MAKE_ESTATE, "--out", collect, "--consoles", "8",
                     "--machines", "3", "--partitions", "40", "--not-collected", "--documents",
                     "--hostile-names"], check=True)
+    # The history in the build tree: the default is the host's own.
     run = subprocess.run([arguments.fleet, "estate", "--from", collect, "--report",
-                          os.path.join(arguments.out, "report")],
+                          os.path.join(arguments.out, "report"), "--history",
+                          os.path.join(arguments.out, "history.sqlite")],
                          capture_output=True, text=True, check=False)
     sys.stderr.write(run.stderr)
     if run.returncode != 0:
