@@ -175,7 +175,8 @@ std::string partitionEvents() {
            columns +
            "NULL AS since, NULL AS count, 'appeared' AS kind,"
            "  0 AS rank FROM pairs WHERE NOT known AND NOT listing_failed_before"
-           " UNION ALL SELECT " + columns +
+           " UNION ALL SELECT " +
+           columns +
            "failing_since_run, runs_failing, 'newly_failing', 1"
            "  FROM pairs WHERE outcome IN " +
            failingOutcomes() +

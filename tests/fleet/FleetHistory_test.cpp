@@ -401,8 +401,7 @@ TEST_F(FleetHistory, RunOfOneMachineBetweenRunsOfAllLeavesTheOtherMachineAlone) 
                      "SELECT partition, outcome, failing_since_run, runs_failing,"
                      " last_surveyed_run FROM partition_results WHERE run_id = 3"
                      " AND machine = '9119-MHE_21ABCDE' ORDER BY partition"),
-              (std::vector<std::string>{"aurora surveyed - - 3",
-                                        "boreas channel_failure 1 2 -"}));
+              (std::vector<std::string>{"aurora surveyed - - 3", "boreas channel_failure 1 2 -"}));
     EXPECT_EQ(consistencyProblems(gc_DefaultHistory), "");
 }
 
