@@ -386,11 +386,16 @@ std::string twoMachinesOneFailing() {
 // A run of one machine named by hand between two runs of all of them brings
 // no event for the other machine, and its failing partition's streak goes
 // on: nothing disappeared in the second run, nothing appeared in the third.
+// (Every run ends with 4: hydra is not active.)
 TEST_F(FleetHistory, RunOfOneMachineBetweenRunsOfAllLeavesTheOtherMachineAlone) {
     SimulatedConsole const console(twoMachinesOneFailing());
     EXPECT_EQ(_run({"--all"}), 4) << _stderr();
     EXPECT_EQ(_run({"8286-42A_10XYZ99"}), 4) << _stderr();
     EXPECT_EQ(_run({"--all"}), 4) << _stderr();
+    EXPECT_EQ(rowsOf(gc_DefaultHistory, "SELECT machine, partition, outcome FROM"
+                                        " partition_results WHERE run_id = 2 ORDER BY partition"),
+              (std::vector<std::string>{"8286-42A_10XYZ99 gemini surveyed",
+                                        "8286-42A_10XYZ99 hydra inactive"}));
     EXPECT_EQ(rowsOf(gc_DefaultHistory, "SELECT id, all_machines FROM runs ORDER BY id"),
               (std::vector<std::string>{"1 1", "2 0", "3 1"}));
     EXPECT_EQ(rowsOf(gc_DefaultHistory,
