@@ -19,8 +19,7 @@ struct RunPair {
     std::string console;
 };
 
-// Binds the run (":run"), the previous run (":previous", null for a
-// console's first run) and the console (":console") to those of the three
+// Binds the run (":run") and the console (":console") to those of the two
 // parameters the statement uses.
 void bindRuns(SQLite::Statement& statement, RunPair const& runs);
 
