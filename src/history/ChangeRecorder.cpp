@@ -47,13 +47,16 @@ std::string baseName(std::string const& path) {
     return slash == std::string::npos ? path : path.substr(slash + 1);
 }
 
-// The contents of the console's previous run: the documents that may not
-// have changed. A content held for other runs only is read again, and its
-// row is kept as it is.
+// The contents of the machines' previous records: the documents that may
+// not have changed. A content held for other runs only is read again, and
+// its row is kept as it is.
 std::unordered_set<std::string> knownHashes(SQLite::Database& db, RunPair const& runs) {
     std::unordered_set<std::string> hashes;
-    SQLite::Statement select(db, "SELECT DISTINCT document_hash FROM partition_results"
-                                 " WHERE run_id = :previous AND document_hash IS NOT NULL");
+    SQLite::Statement select(db, "WITH " + previousRecords() +
+                                     "SELECT DISTINCT p.document_hash FROM previous AS m"
+                                     " JOIN partition_results AS p"
+                                     "  ON p.run_id = m.run_id AND p.machine = m.machine"
+                                     " WHERE m.listed AND p.document_hash IS NOT NULL");
     bindRuns(select, runs);
     while (select.executeStep()) {
         hashes.insert(select.getColumn(0).getString());

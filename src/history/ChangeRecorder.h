@@ -9,7 +9,7 @@
 namespace history {
 
 // Completes a run's record in the history with what its documents hold and
-// what changed since the console's previous run (docs/history.md,
+// what changed since each machine's previous record (docs/history.md,
 // "Inventory" and "Changes"). The run's rows in runs, machine_results and
 // partition_results are in place; record() runs inside the transaction that
 // wrote them, so the run is recorded whole or not at all.

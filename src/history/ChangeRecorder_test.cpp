@@ -91,15 +91,12 @@ protected:
     long long record(std::vector<Partition> const& partitions,
                      std::vector<std::string> const& failedListings = {},
                      std::string const& console = "console-a", long long startedUnix = 1000) {
-        SQLite::Transaction transaction(_db);
-        long long const run = _insertRun(console, startedUnix);
-        _insertMachines(run, partitions, failedListings);
-        for (Partition const& partition : partitions) {
-            _insertPartition(run, partition);
-        }
-        history::ChangeRecorder(_folder.file("VPD")).record(_db, run);
-        transaction.commit();
-        return run;
+        return _record(partitions, failedListings, console, startedUnix, true);
+    }
+
+    // A run of the machines named by hand, not of every machine (--all).
+    long long recordNamed(std::vector<Partition> const& partitions) {
+        return _record(partitions, {}, "console-a", 1000, false);
     }
 
     // The run's events, one line each: scope, kind, machine, partition and
@@ -139,14 +136,29 @@ protected:
     }
 
 private:
-    long long _insertRun(std::string const& console, long long startedUnix) {
+    long long _record(std::vector<Partition> const& partitions,
+                      std::vector<std::string> const& failedListings, std::string const& console,
+                      long long startedUnix, bool allMachines) {
+        SQLite::Transaction transaction(_db);
+        long long const run = _insertRun(console, startedUnix, allMachines);
+        _insertMachines(run, partitions, failedListings);
+        for (Partition const& partition : partitions) {
+            _insertPartition(run, partition);
+        }
+        history::ChangeRecorder(_folder.file("VPD")).record(_db, run);
+        transaction.commit();
+        return run;
+    }
+
+    long long _insertRun(std::string const& console, long long startedUnix, bool allMachines) {
         SQLite::Statement insert(
             _db, "INSERT INTO runs (console, tool, started, ended, started_unix, recorded_unix,"
-                 " exit_status, return_code, partitions, surveyed, failed, summary)"
-                 " VALUES (?, 'quorvex-survey', 's', 'e', ?, ?, 0, '0', 0, 0, 0, '{}')");
+                 " exit_status, return_code, partitions, surveyed, failed, summary, all_machines)"
+                 " VALUES (?, 'quorvex-survey', 's', 'e', ?, ?, 0, '0', 0, 0, 0, '{}', ?)");
         insert.bind(1, console);
         insert.bind(2, static_cast<std::int64_t>(startedUnix));
         insert.bind(3, static_cast<std::int64_t>(startedUnix));
+        insert.bind(4, allMachines ? 1 : 0);
         insert.exec();
         return _db.getLastInsertRowid();
     }
@@ -209,6 +221,12 @@ Partition interrupted(std::string const& name) {
 
 Partition inactive(std::string const& name) {
     return {"M", name, "inactive", std::nullopt};
+}
+
+// A partition of the second machine, N.
+Partition onOtherMachine(Partition partition) {
+    partition.machine = "N";
+    return partition;
 }
 
 using Lines = std::vector<std::string>;
@@ -277,6 +295,78 @@ TEST_F(HistoryChangeRecorder, PartitionsAndMachinesAppearAndDisappear) {
               events(record({surveyed("a"), other})));
     EXPECT_EQ((Lines{"machine disappeared N", "partition disappeared N c"}),
               events(record({surveyed("a")})));
+}
+
+TEST_F(HistoryChangeRecorder, RunOfOneMachineLeavesTheOthersAlone) {
+    Partition const other = onOtherMachine(surveyed("c"));
+    record({surveyed("a"), failing("b"), other});
+    long long const named = recordNamed({other});
+    EXPECT_EQ(Lines{}, events(named));
+    long long const all = record({surveyed("a"), failing("b"), other});
+    EXPECT_EQ((Lines{"partition still_failing M b 1 2"}), events(all));
+    EXPECT_EQ("3", column(all, "a", "last_surveyed_run"));
+}
+
+TEST_F(HistoryChangeRecorder, StreakGoesOnAcrossARunOfAnotherMachine) {
+    Partition const other = onOtherMachine(surveyed("c"));
+    record({surveyed("a"), other});
+    EXPECT_EQ((Lines{"partition newly_failing M a 2 1"}), events(record({failing("a"), other})));
+    long long const named = recordNamed({other});
+    EXPECT_EQ("3", column(named, "c", "last_surveyed_run"));
+    long long const all = record({failing("a"), other});
+    EXPECT_EQ((Lines{"partition still_failing M a 2 2"}), events(all));
+    EXPECT_EQ("1", column(all, "a", "last_surveyed_run"));
+    EXPECT_EQ((Lines{"partition recovered M a"}), events(recordNamed({surveyed("a")})));
+}
+
+TEST_F(HistoryChangeRecorder, MachineDisappearsOnlyFromARunOfAllMachines) {
+    record({surveyed("a"), onOtherMachine(surveyed("c"))});
+    EXPECT_EQ(Lines{}, events(recordNamed({surveyed("a")})));
+    EXPECT_EQ((Lines{"machine disappeared N", "partition disappeared N c"}),
+              events(record({surveyed("a")})));
+    EXPECT_EQ(Lines{}, events(record({surveyed("a")})));
+}
+
+TEST_F(HistoryChangeRecorder, MachineAppearsOnlyWhenNoEarlierRunListedIt) {
+    Partition const other = onOtherMachine(surveyed("c"));
+    record({surveyed("a")});
+    EXPECT_EQ((Lines{"machine appeared N", "partition appeared N c"}),
+              events(recordNamed({other})));
+    EXPECT_EQ(Lines{}, events(record({surveyed("a"), other})));
+}
+
+TEST_F(HistoryChangeRecorder, MachineNamedByHandAndNotListedByTheNextRunOfAllDisappears) {
+    record({surveyed("a")});
+    recordNamed({onOtherMachine(surveyed("c"))});
+    EXPECT_EQ((Lines{"machine disappeared N", "partition disappeared N c"}),
+              events(record({surveyed("a")})));
+}
+
+TEST_F(HistoryChangeRecorder, ListingOfAMachineRecoversAcrossARunOfAnother) {
+    Partition const other = onOtherMachine(surveyed("c"));
+    record({surveyed("a"), other});
+    EXPECT_EQ((Lines{"machine listing_failed N"}), events(record({surveyed("a")}, {"N"})));
+    EXPECT_EQ(Lines{}, events(recordNamed({surveyed("a")})));
+    EXPECT_EQ((Lines{"machine listing_recovered N"}), events(record({surveyed("a"), other})));
+}
+
+TEST_F(HistoryChangeRecorder, ComponentsCompareWithTheMachinesPreviousRecord) {
+    Partition const other = onOtherMachine(surveyed("c"));
+    record({surveyed("a"), other});
+    recordNamed({other});
+    EXPECT_EQ((Lines{"component property_changed M a M-a CL FW1 FW2"}),
+              events(record({surveyed("a", "FW2"), other})));
+}
+
+// A document the machine's previous record holds is taken from its row,
+// though the console's latest run did not list the machine.
+TEST_F(HistoryChangeRecorder, DocumentOfTheMachinesPreviousRecordIsNotReadAgain) {
+    Partition const other = onOtherMachine(surveyed("c"));
+    record({surveyed("a"), other});
+    recordNamed({other});
+    _db.exec("UPDATE documents SET problem = 'kept'");
+    long long const run = record({surveyed("a"), other});
+    EXPECT_EQ("kept", column(run, "a", "inventory_problem"));
 }
 
 TEST_F(HistoryChangeRecorder, FailingPartitionThatAppearsIsNewlyFailing) {

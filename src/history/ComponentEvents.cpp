@@ -13,11 +13,11 @@ namespace history {
 
 namespace {
 
-// The inventory read whole before: in the previous run when it was read
-// there, else the latest earlier one (a partition whose survey failed in
-// between compares with its last inventory).
+// The inventory read whole before: in the machine's previous record when it
+// was read there, else the latest earlier one (a partition whose survey
+// failed in between compares with its last inventory).
 std::string changedDocuments() {
-    return std::string() +
+    return "WITH " + previousRecords() +
            "SELECT machine, partition, before, after FROM (SELECT c.machine, c.partition,"
            "  c.document_hash AS after,"
            "  CASE WHEN p.inventory = '" +
@@ -29,8 +29,9 @@ std::string changedDocuments() {
            gc_InventoryRead +
            "' AND r.console = :console"
            "    ORDER BY x.run_id DESC LIMIT 1) END AS before"
-           " FROM partition_results AS c LEFT JOIN partition_results AS p"
-           "  ON p.run_id = :previous AND p.machine = c.machine AND p.partition = c.partition"
+           " FROM partition_results AS c JOIN previous AS m ON m.machine = c.machine AND m.listed"
+           " LEFT JOIN partition_results AS p"
+           "  ON p.run_id = m.run_id AND p.machine = c.machine AND p.partition = c.partition"
            " WHERE c.run_id = :run AND c.inventory = '" +
            gc_InventoryRead +
            "')"

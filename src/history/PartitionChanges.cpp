@@ -58,8 +58,10 @@ std::string freshStates() {
            " WHERE run_id = :run";
 }
 
+// The partition's row in its machine's previous record.
 std::string carriedStates() {
-    return "UPDATE partition_results AS c SET"
+    return "WITH " + previousRecords() +
+           "UPDATE partition_results AS c SET"
            " failing_since_run = CASE WHEN c.outcome IN " +
            failingOutcomes() +
            "   THEN coalesce(p.failing_since_run, :run)"
@@ -75,22 +77,25 @@ std::string carriedStates() {
            " last_surveyed_run = CASE WHEN c.outcome = " +
            surveyed() +
            "   THEN :run ELSE p.last_surveyed_run END"
-           " FROM partition_results AS p"
-           " WHERE c.run_id = :run AND p.run_id = :previous"
-           "   AND p.machine = c.machine AND p.partition = c.partition";
+           " FROM previous AS m JOIN partition_results AS p"
+           "  ON p.run_id = m.run_id AND p.machine = m.machine"
+           " WHERE c.run_id = :run AND m.listed AND c.machine = m.machine"
+           "   AND p.partition = c.partition";
 }
 
-// A partition missing from the previous run (it disappeared, or its
-// machine could not be listed) may have been surveyed before that.
+// A partition missing from its machine's previous record (it disappeared,
+// or its machine could not be listed) may have been surveyed before that.
 std::string earlierSurveys() {
-    return "UPDATE partition_results AS c SET last_surveyed_run ="
+    return "WITH " + previousRecords() +
+           "UPDATE partition_results AS c SET last_surveyed_run ="
            " (SELECT max(x.last_surveyed_run) FROM partition_results AS x"
            "   JOIN runs AS r ON r.id = x.run_id"
            "   WHERE x.machine = c.machine AND x.partition = c.partition"
            "     AND x.run_id < :run AND r.console = :console)"
            " WHERE c.run_id = :run AND c.last_surveyed_run IS NULL"
-           "   AND NOT EXISTS (SELECT 1 FROM partition_results AS p WHERE p.run_id = :previous"
-           "     AND p.machine = c.machine AND p.partition = c.partition)";
+           "   AND NOT EXISTS (SELECT 1 FROM previous AS m JOIN partition_results AS p"
+           "     ON p.run_id = m.run_id AND p.machine = m.machine"
+           "     WHERE m.machine = c.machine AND p.partition = c.partition)";
 }
 
 } // namespace
@@ -107,34 +112,38 @@ void insertMachineEvents(SQLite::Database& db, RunPair const& runs) {
     }
     executeForRuns(
         db,
-        "INSERT INTO events (run_id, scope, kind, machine)"
-        " SELECT :run, 'machine', kind, machine FROM ("
-        "  SELECT c.machine, 'appeared' AS kind, 0 AS rank FROM machine_results AS c"
-        "   WHERE c.run_id = :run AND NOT EXISTS (SELECT 1 FROM machine_results AS p"
-        "     WHERE p.run_id = :previous AND p.machine = c.machine)"
-        "  UNION ALL SELECT p.machine, 'disappeared', 1 FROM machine_results AS p"
-        "   WHERE p.run_id = :previous AND NOT EXISTS (SELECT 1 FROM machine_results AS c"
-        "     WHERE c.run_id = :run AND c.machine = p.machine)"
-        "  UNION ALL SELECT c.machine, 'listing_failed', 2 FROM machine_results AS c"
-        "   LEFT JOIN machine_results AS p ON p.run_id = :previous AND p.machine = c.machine"
-        "   WHERE c.run_id = :run AND c.listing_failure IS NOT NULL AND p.listing_failure IS NULL"
-        "  UNION ALL SELECT c.machine, 'listing_recovered', 3 FROM machine_results AS c"
-        "   JOIN machine_results AS p ON p.run_id = :previous AND p.machine = c.machine"
-        "   WHERE c.run_id = :run AND c.listing_failure IS NULL"
-        "     AND p.listing_failure IS NOT NULL"
-        " ) ORDER BY machine, rank",
+        "WITH " + previousRecords() +
+            "INSERT INTO events (run_id, scope, kind, machine)"
+            " SELECT :run, 'machine', kind, machine FROM ("
+            "  SELECT machine, 'appeared' AS kind, 0 AS rank FROM previous"
+            "   WHERE listed AND run_id IS NULL"
+            "  UNION ALL SELECT machine, 'disappeared', 1 FROM previous WHERE NOT listed"
+            "  UNION ALL SELECT c.machine, 'listing_failed', 2 FROM machine_results AS c"
+            "   JOIN previous AS m ON m.machine = c.machine AND m.listed"
+            "   LEFT JOIN machine_results AS p ON p.run_id = m.run_id AND p.machine = c.machine"
+            "   WHERE c.run_id = :run AND c.listing_failure IS NOT NULL"
+            "     AND p.listing_failure IS NULL"
+            "  UNION ALL SELECT c.machine, 'listing_recovered', 3 FROM machine_results AS c"
+            "   JOIN previous AS m ON m.machine = c.machine AND m.listed"
+            "   JOIN machine_results AS p ON p.run_id = m.run_id AND p.machine = c.machine"
+            "   WHERE c.run_id = :run AND c.listing_failure IS NULL"
+            "     AND p.listing_failure IS NOT NULL"
+            " ) ORDER BY machine, rank",
         runs);
 }
 
 namespace {
 
-// Each partition of the run with its record in the previous run: whether it
-// had one, whether it was failing there (an interrupted record carries the
-// state before it), and its outcome there, or the last one before that run
-// when it was interrupted.
+// Each partition of the run with its record in its machine's previous
+// record: whether it had one, whether the machine's listing failed there,
+// whether it was failing there (an interrupted record carries the state
+// before it), and its outcome there, or the last one before that run when it
+// was interrupted.
 std::string partitionPairs() {
-    return "WITH pairs AS (SELECT c.machine, c.partition, c.outcome, c.reason,"
+    return "WITH " + previousRecords() +
+           ", pairs AS (SELECT c.machine, c.partition, c.outcome, c.reason,"
            "  c.failing_since_run, c.runs_failing, p.partition IS NOT NULL AS known,"
+           "  pm.listing_failure IS NOT NULL AS listing_failed_before,"
            "  p.failing_since_run AS was_failing_since,"
            "  CASE WHEN p.outcome = " +
            interrupted() +
@@ -144,15 +153,17 @@ std::string partitionPairs() {
            "      AND r.console = :console AND x.outcome <> " +
            interrupted() +
            "    ORDER BY x.run_id DESC LIMIT 1) ELSE p.outcome END AS was_outcome"
-           " FROM partition_results AS c LEFT JOIN partition_results AS p"
-           "  ON p.run_id = :previous AND p.machine = c.machine AND p.partition = c.partition"
+           " FROM partition_results AS c JOIN previous AS m ON m.machine = c.machine AND m.listed"
+           " LEFT JOIN machine_results AS pm ON pm.run_id = m.run_id AND pm.machine = c.machine"
+           " LEFT JOIN partition_results AS p"
+           "  ON p.run_id = m.run_id AND p.machine = c.machine AND p.partition = c.partition"
            " WHERE c.run_id = :run) ";
 }
 
-// Partitions of a machine whose listing failed are neither gone nor new:
+// Partitions of a machine whose listing failed in this run are not gone:
 // the console did not say which partitions it has.
-std::string listingFailedIn(char const* run) {
-    return std::string("(SELECT machine FROM machine_results WHERE run_id = ") + run +
+std::string listingFailedInThisRun() {
+    return "(SELECT machine FROM machine_results WHERE run_id = :run"
            " AND listing_failure IS NOT NULL)";
 }
 
@@ -163,8 +174,9 @@ std::string partitionEvents() {
            " FROM (SELECT " +
            columns +
            "NULL AS since, NULL AS count, 'appeared' AS kind,"
-           "  0 AS rank FROM pairs WHERE NOT known AND machine NOT IN " +
-           listingFailedIn(":previous") + " UNION ALL SELECT " + columns +
+           "  0 AS rank FROM pairs WHERE NOT known AND NOT listing_failed_before"
+           " UNION ALL SELECT " +
+           columns +
            "failing_since_run, runs_failing, 'newly_failing', 1"
            "  FROM pairs WHERE outcome IN " +
            failingOutcomes() +
@@ -187,11 +199,12 @@ std::string partitionEvents() {
            "  FROM pairs WHERE outcome = " +
            inactive() + " AND was_outcome IS NOT " + inactive() +
            " UNION ALL SELECT p.machine, p.partition, NULL, NULL, NULL, NULL, 'disappeared', 5"
-           "  FROM partition_results AS p WHERE p.run_id = :previous"
-           "   AND NOT EXISTS (SELECT 1 FROM partition_results AS c WHERE c.run_id = :run"
+           "  FROM previous AS m JOIN partition_results AS p"
+           "   ON p.run_id = m.run_id AND p.machine = m.machine"
+           "  WHERE NOT EXISTS (SELECT 1 FROM partition_results AS c WHERE c.run_id = :run"
            "     AND c.machine = p.machine AND c.partition = p.partition)"
            "   AND p.machine NOT IN " +
-           listingFailedIn(":run") + ") ORDER BY machine, partition, rank";
+           listingFailedInThisRun() + ") ORDER BY machine, partition, rank";
 }
 
 } // namespace

@@ -29,8 +29,8 @@ constexpr char gc_RunAmendment[] =
 
 constexpr char gc_RunInsert[] =
     "INSERT INTO runs (id, console, tool, started, ended, started_unix, recorded_unix, "
-    "exit_status, return_code, interrupted, partitions, surveyed, failed, summary) "
-    "VALUES (?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?)";
+    "exit_status, return_code, interrupted, partitions, surveyed, failed, summary, "
+    "all_machines) VALUES (?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?)";
 
 // A value the summary may lack binds as NULL.
 template <typename T>
@@ -65,6 +65,12 @@ std::string keptText(nlohmann::ordered_json summaryDocument, long long runId) {
         (*history)["run_id"] = runId;
     }
     return compactText(summaryDocument);
+}
+
+// Only a run that listed every machine of the console can tell that one is
+// gone (docs/history.md, "Changes").
+bool listedAllMachines(report::RunSummary const& summary) {
+    return summary.options.all && !summary.listingFailure;
 }
 
 // SQLite's integers are 64 bits; long long is not the wrapper's int64_t.
@@ -127,6 +133,7 @@ void RunRecorder::_insertRun(long long runId, report::RunSummary const& summary,
     bindInteger(insert, 12, counts.of(report::Outcome::Surveyed));
     bindInteger(insert, 13, failingCount(counts));
     insert.bindNoCopy(14, summaryText);
+    insert.bind(15, listedAllMachines(summary) ? 1 : 0);
     insert.exec();
 }
 

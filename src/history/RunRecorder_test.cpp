@@ -154,6 +154,25 @@ TEST_F(RunRecorderTest, IdsFollowRecordingOrderAndAreNeverGivenAgainAfterAPrune)
         << "the pruned run's partitions went with it";
 }
 
+TEST_F(RunRecorderTest, RunOfAllMachinesSaysSo) {
+    report::RunSummary all = twoMachines();
+    all.options.all = true;
+    _record(all);
+    _record(twoMachines());
+    EXPECT_EQ(_rows("SELECT all_machines FROM runs ORDER BY id"),
+              (std::vector<std::string>{"1", "0"}));
+}
+
+// With no machine listing, the run cannot tell which machines are gone.
+TEST_F(RunRecorderTest, RunOfAllMachinesWhoseListingFailedListedNone) {
+    report::RunSummary summary;
+    summary.tool = "quorvex-survey";
+    summary.options.all = true;
+    summary.listingFailure = report::ListingFailure{"lsvtc -t0", 5, "busy"};
+    _record(summary);
+    EXPECT_EQ(_rows("SELECT all_machines FROM runs"), std::vector<std::string>{"0"});
+}
+
 TEST_F(RunRecorderTest, RunWithoutMachines) {
     report::RunSummary summary;
     summary.tool = "quorvex-survey";

@@ -118,13 +118,16 @@ void readEvents(SQLite::Database& db, SinceLastRun& since) {
     }
 }
 
-// Runs not surveyed in a row: the console's runs after the latest that
-// surveyed the partition or, when none did, from its first record on.
+// Runs not surveyed in a row: the console's runs that listed the
+// partition's machine after the latest that surveyed the partition or, when
+// none did, from its first record on. A run of other machines says nothing
+// of this one.
 constexpr char gc_PartitionsQuery[] =
     "SELECT p.machine, p.partition,"
     " (SELECT started FROM runs WHERE id = p.failing_since_run),"
     " (SELECT started FROM runs WHERE id = p.last_surveyed_run),"
-    " (SELECT count(*) FROM runs r WHERE r.console = ?1 AND r.id <= p.run_id AND r.id >"
+    " (SELECT count(*) FROM runs r JOIN machine_results m ON m.run_id = r.id"
+    "  AND m.machine = p.machine WHERE r.console = ?1 AND r.id <= p.run_id AND r.id >"
     "  coalesce(p.last_surveyed_run, (SELECT min(q.run_id) - 1 FROM partition_results q"
     "   JOIN runs qr ON qr.id = q.run_id AND qr.console = ?1"
     "   WHERE q.machine = p.machine AND q.partition = p.partition)))"

@@ -144,6 +144,7 @@ TEST_F(SinceLastRunReader, FailingSinceAndLastSurveyedAreTheStartsOfTheirRuns) {
     long long const first = _seed.addRun("console", gc_First);
     long long const second = _seed.addRun("console", gc_Second);
     long long const third = _seed.addRun("console", gc_Third);
+    _seed.addMachine(second, gc_Machine);
     _seed.addPartition(third, {gc_Machine, "a", "channel_failure", second, 2, first});
     SinceLastRun::PartitionState const state = read(third).partitions.at({gc_Machine, "a"});
     EXPECT_EQ(gc_Second, state.failingSince.value_or("none"));
@@ -153,9 +154,9 @@ TEST_F(SinceLastRunReader, FailingSinceAndLastSurveyedAreTheStartsOfTheirRuns) {
 
 TEST_F(SinceLastRunReader, PartitionNotSurveyedForStaleAfterRunsInARowIsStale) {
     long long const first = _seed.addRun("console", gc_First);
-    _seed.addRun("other console", gc_First);
-    _seed.addRun("console", gc_Second);
-    _seed.addRun("console", gc_Third);
+    _seed.addMachine(_seed.addRun("other console", gc_First), gc_Machine);
+    _seed.addMachine(_seed.addRun("console", gc_Second), gc_Machine);
+    _seed.addMachine(_seed.addRun("console", gc_Third), gc_Machine);
     long long const fourth = _seed.addRun("console", gc_Fourth);
     _seed.addPartition(fourth, {gc_Machine, "a", "timed_out", first + 2, 3, first});
     _seed.addPartition(fourth, {gc_Machine, "b", "surveyed", {}, {}, fourth});
@@ -164,6 +165,23 @@ TEST_F(SinceLastRunReader, PartitionNotSurveyedForStaleAfterRunsInARowIsStale) {
     EXPECT_TRUE(atThree.partitions.at({gc_Machine, "a"}).isStale);
     EXPECT_FALSE(atThree.partitions.at({gc_Machine, "b"}).isStale);
     EXPECT_FALSE(read(fourth, 4).partitions.at({gc_Machine, "a"}).isStale);
+}
+
+// A run of other machines (named by hand) did not leave the partition
+// unsurveyed: it says nothing of the partition's machine.
+TEST_F(SinceLastRunReader, StaleCountLeavesOutRunsThatDidNotListTheMachine) {
+    long long const first = _seed.addRun("console", gc_First);
+    _seed.addPartition(first, {gc_Machine, "a", "surveyed", {}, {}, first});
+    long long const second = _seed.addRun("console", gc_Second);
+    _seed.addPartition(second, {gc_Machine, "a", "timed_out", second, 1, first});
+    _seed.addMachine(_seed.addRun("console", gc_Third), "8286-42A_10XYZ99");
+    long long const fourth = _seed.addRun("console", gc_Fourth);
+    _seed.addPartition(fourth, {gc_Machine, "a", "timed_out", second, 2, first});
+    SinceLastRun::PartitionState const state = read(fourth, 3).partitions.at({gc_Machine, "a"});
+    EXPECT_EQ(2, state.runsNotSurveyed);
+    EXPECT_FALSE(state.isStale);
+    EXPECT_EQ(gc_First, state.lastSurveyed.value_or("none"));
+    EXPECT_TRUE(read(fourth, 2).partitions.at({gc_Machine, "a"}).isStale);
 }
 
 // A partition no run has surveyed counts from the run that first listed it,

@@ -360,6 +360,56 @@ TEST_F(FleetHistory, ClockSetBackBetweenRunsKeepsTheRecordingOrder) {
     EXPECT_EQ(consistencyProblems(gc_DefaultHistory), "");
 }
 
+// The rows of a query, each row's columns joined by " " (NULL as "-").
+std::vector<std::string> rowsOf(std::string const& path, std::string const& query) {
+    SQLite::Database database(path, SQLite::OPEN_READONLY);
+    SQLite::Statement statement(database, query);
+    std::vector<std::string> rows;
+    while (statement.executeStep()) {
+        std::string row;
+        for (int column = 0; column < statement.getColumnCount(); ++column) {
+            SQLite::Column const value = statement.getColumn(column);
+            row += (column == 0 ? "" : " ") + (value.isNull() ? "-" : value.getString());
+        }
+        rows.push_back(row);
+    }
+    return rows;
+}
+
+// A console of two machines whose partition boreas (id 2, on
+// 9119-MHE_21ABCDE) fails every time.
+std::string twoMachinesOneFailing() {
+    return "[runCmdOnPartition 2]\nstdout Rc::1::RcCmd::0::RetStr1::failed::RetStr2::\nexit 1\n" +
+           QuorvexTest::readFile(QuorvexTest::sourceRoot() + "/sim/scenarios/several-machines.scn");
+}
+
+// A run of one machine named by hand between two runs of all of them brings
+// no event for the other machine, and its failing partition's streak goes
+// on: nothing disappeared in the second run, nothing appeared in the third.
+// (Every run ends with 4: hydra is not active.)
+TEST_F(FleetHistory, RunOfOneMachineBetweenRunsOfAllLeavesTheOtherMachineAlone) {
+    SimulatedConsole const console(twoMachinesOneFailing());
+    EXPECT_EQ(_run({"--all"}), 4) << _stderr();
+    EXPECT_EQ(_run({"8286-42A_10XYZ99"}), 4) << _stderr();
+    EXPECT_EQ(_run({"--all"}), 4) << _stderr();
+    EXPECT_EQ(rowsOf(gc_DefaultHistory, "SELECT machine, partition, outcome FROM"
+                                        " partition_results WHERE run_id = 2 ORDER BY partition"),
+              (std::vector<std::string>{"8286-42A_10XYZ99 gemini surveyed",
+                                        "8286-42A_10XYZ99 hydra inactive"}));
+    EXPECT_EQ(rowsOf(gc_DefaultHistory, "SELECT id, all_machines FROM runs ORDER BY id"),
+              (std::vector<std::string>{"1 1", "2 0", "3 1"}));
+    EXPECT_EQ(rowsOf(gc_DefaultHistory,
+                     "SELECT run_id, scope, kind, machine, partition, failing_since_run,"
+                     " runs_failing FROM events ORDER BY id"),
+              std::vector<std::string>{"3 partition still_failing 9119-MHE_21ABCDE boreas 1 2"});
+    EXPECT_EQ(rowsOf(gc_DefaultHistory,
+                     "SELECT partition, outcome, failing_since_run, runs_failing,"
+                     " last_surveyed_run FROM partition_results WHERE run_id = 3"
+                     " AND machine = '9119-MHE_21ABCDE' ORDER BY partition"),
+              (std::vector<std::string>{"aurora surveyed - - 3", "boreas channel_failure 1 2 -"}));
+    EXPECT_EQ(consistencyProblems(gc_DefaultHistory), "");
+}
+
 // Whether the database's write lock is held by another connection now.
 bool isWriteLocked(SQLite::Database& probe) {
     try {

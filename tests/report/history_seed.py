@@ -51,6 +51,14 @@ def add_runs(database, console, newest_start):
     return runs
 
 
+def add_machines(database, runs, machines):
+    """Every run listed every machine of the summary."""
+    for run in runs:
+        for machine in machines:
+            database.execute("INSERT INTO machine_results (run_id, machine, return_code)"
+                             " VALUES (?, ?, '0')", (run, machine["identity"]))
+
+
 def add_partition(database, run, machine, name, outcome, streak, last_surveyed):
     database.execute(
         "INSERT INTO partition_results (run_id, machine, partition, ip, outcome, status_text,"
@@ -105,6 +113,7 @@ def seed(path, source_root, summary):
     """Writes the database at path for the summary's console and partitions."""
     database = create(path, source_root)
     runs = add_runs(database, summary["console_host"], summary["started"])
+    add_machines(database, runs, summary["machines"])
     first_failure, surveyed = True, None
     for machine in summary["machines"]:
         for name, partition in partition_names(machine):

@@ -64,6 +64,12 @@ void HistoryFixture::addPartition(long long run, std::string const& machine,
                                   std::string const& partition, std::string const& outcome,
                                   Text reason, Number failingSinceRun, Number runsFailing,
                                   std::string const& inventory) {
+    // The run listed the partition's machine.
+    SQLite::Statement machineRow(_database, "INSERT OR IGNORE INTO machine_results (run_id,"
+                                            " machine, return_code) VALUES (?, ?, '0')");
+    machineRow.bind(1, static_cast<std::int64_t>(run));
+    machineRow.bind(2, machine);
+    machineRow.exec();
     SQLite::Statement insert(
         _database, "INSERT INTO partition_results (run_id, machine, partition, ip, outcome,"
                    " status_text, reason, inventory, failing_since_run, runs_failing)"

@@ -27,6 +27,7 @@ public:
     long long addRun(std::string const& console, std::string const& started,
                      std::string const& ended, int partitions, int surveyed, int failed,
                      Number exitStatus = 0, Text interrupted = {});
+    // Adds the partition's result, and its machine's when the run has none.
     void addPartition(long long run, std::string const& machine, std::string const& partition,
                       std::string const& outcome = "surveyed", Text reason = {},
                       Number failingSinceRun = {}, Number runsFailing = {},

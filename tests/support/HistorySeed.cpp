@@ -67,7 +67,17 @@ long long HistorySeed::addRun(std::string const& console, std::string const& sta
     return db.getLastInsertRowid();
 }
 
+void HistorySeed::addMachine(long long run, std::string const& machine) const {
+    SQLite::Database db(_path, SQLite::OPEN_READWRITE);
+    SQLite::Statement insert(db, "INSERT OR IGNORE INTO machine_results (run_id, machine,"
+                                 " return_code) VALUES (?, ?, '0')");
+    insert.bind(1, static_cast<int64_t>(run));
+    insert.bind(2, machine);
+    insert.exec();
+}
+
 void HistorySeed::addPartition(long long run, PartitionRow const& row) const {
+    addMachine(run, row.machine);
     SQLite::Database db(_path, SQLite::OPEN_READWRITE);
     SQLite::Statement insert(
         db, "INSERT INTO partition_results (run_id, machine, partition, ip, outcome, status_text,"

@@ -24,8 +24,11 @@ public:
     // Adds a run of console started at started (ISO 8601) and returns its id.
     long long addRun(std::string const& console, std::string const& started) const;
 
-    // Adds a partition's row to run; the streak and the last survey as the
-    // recording computed them.
+    // Adds the machine's row to run, as a run that listed it has (once).
+    void addMachine(long long run, std::string const& machine) const;
+
+    // Adds a partition's row to run, and its machine's; the streak and the
+    // last survey as the recording computed them.
     struct PartitionRow {
         std::string machine;
         std::string partition;

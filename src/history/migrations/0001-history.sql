@@ -19,7 +19,10 @@ CREATE TABLE runs (
     partitions     INTEGER NOT NULL,  -- listed partitions
     surveyed       INTEGER NOT NULL,
     failed         INTEGER NOT NULL,  -- failing partitions (see docs/history.md)
-    summary        TEXT    NOT NULL   -- the run's whole summary document (JSON)
+    summary        TEXT    NOT NULL,  -- the run's whole summary document (JSON)
+    all_machines   INTEGER NOT NULL DEFAULT 1  -- 1: every machine the console listed
+                                               -- (--all); 0: machines named by hand, or
+                                               -- the console's machine listing failed
 );
 CREATE INDEX runs_by_console ON runs (console, id);
 CREATE INDEX runs_by_start ON runs (started_unix);
@@ -32,6 +35,8 @@ CREATE TABLE machine_results (
     listing_failure TEXT,              -- JSON {command, exit_status, message} or null
     PRIMARY KEY (run_id, machine)
 ) WITHOUT ROWID;
+-- A machine's previous record: the latest earlier run that listed it.
+CREATE INDEX machine_results_by_machine ON machine_results (machine, run_id);
 
 -- One row per listed partition of a run. "partition" is the host name as
 -- listed; a host listed again on the same machine is "<host> #2", "#3", ...
@@ -56,7 +61,8 @@ CREATE TABLE partition_results (
 ) WITHOUT ROWID;
 CREATE INDEX partition_results_by_partition ON partition_results (machine, partition, run_id);
 
--- The changes a run brought, computed against the console's previous run.
+-- The changes a run brought, each machine's computed against its previous
+-- record: the console's latest earlier run that listed the machine.
 --   scope "machine":   appeared, disappeared, listing_failed, listing_recovered
 --   scope "partition": newly_failing, still_failing, recovered, newly_inactive,
 --                      appeared, disappeared
