@@ -432,7 +432,7 @@ bool killWhileRecording(SurveyProcess& survey, std::string const& file, int paus
 // series: every run brings documents the database has not stored yet, to
 // be read into components, stored and compared with the run before
 // (property_changed events), all within the run's transaction.
-constexpr int gc_SurveyedPartitions = 80;
+constexpr int gc_SurveyedPartitions = 50;
 
 std::string surveyedWithDocuments(int series) {
     std::string scenario =
@@ -447,7 +447,7 @@ std::string surveyedWithDocuments(int series) {
     return scenario;
 }
 
-// A run that reads and stores dozens of new documents takes some
+// A run that reads and stores dozens of new documents takes tens of
 // milliseconds to record: it is killed at random moments within its
 // transaction (the seed is printed) and leaves the database with the run
 // whole or without it, its documents and events included, never part of it.
@@ -463,7 +463,7 @@ TEST_F(FleetHistory, RunKilledWhileRecordingIsWhollyThereOrNotAtAll) {
     for (int attempt = 1; attempt <= 3; ++attempt) {
         SimulatedConsole const console(surveyedWithDocuments(attempt));
         SurveyProcess survey = _start({gc_Identity});
-        int const pause = std::uniform_int_distribution<int>(0, 5)(random);
+        int const pause = std::uniform_int_distribution<int>(0, 20)(random);
         if (killWhileRecording(survey, gc_DefaultHistory, pause)) {
             ++killedWhileRecording;
         }
