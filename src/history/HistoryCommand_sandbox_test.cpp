@@ -69,12 +69,12 @@ TEST(HistoryCommand, APartitionListedByTwoConsolesNeedsTheConsole) {
     long long const run =
         history.addRun("cons-b", "2026-11-05T03:00:00Z", "2026-11-05T03:00:09Z", 1, 1, 0);
     history.addPartition(run, QuorvexTest::gc_HistoryMachine, "lpar1");
-    EXPECT_EQ(outcome(runHistory({"partition", QuorvexTest::gc_HistoryMachine, "lpar1",
-                                  "--history", path})),
+    EXPECT_EQ(outcome(runHistory(
+                  {"partition", QuorvexTest::gc_HistoryMachine, "lpar1", "--history", path})),
               "64||quorvex-survey: history: lpar1 on 8233-E8B_10ABCDE is listed by several "
               "consoles (cons-a, cons-b): choose one with --console\n");
-    EXPECT_EQ(outcome(runHistory({"partition", QuorvexTest::gc_HistoryMachine, "lpar1",
-                                  "--console", "cons-b", "--history", path})),
+    EXPECT_EQ(outcome(runHistory({"partition", QuorvexTest::gc_HistoryMachine, "lpar1", "--console",
+                                  "cons-b", "--history", path})),
               "0|lpar1 on 8233-E8B_10ABCDE (cons-b): listed by 1 run\n"
               "\n"
               "Runs\n"
@@ -86,8 +86,26 @@ TEST(HistoryCommand, AMissingDatabaseExits66AndIsNotCreated) {
     QuorvexTest::TemporaryDirectory folder;
     std::string const path = folder.file("history.sqlite");
     EXPECT_EQ(outcome(runHistory({"runs", "--history", path})),
-              "66||quorvex-survey: history: cannot read " + path + ": No such file or directory\n");
+              "66||quorvex-survey: history: cannot read " + path +
+                  ": No such file or directory (no run has been recorded there yet; choose "
+                  "another file with --history FILE)\n");
     EXPECT_FALSE(QuorvexTest::fileExists(path));
+}
+
+// On a machine where no run has recorded its history, every action says
+// where it looked and how to look elsewhere.
+TEST(HistoryCommand, AMissingDefaultDatabaseSaysHowToChooseAnother) {
+    ASSERT_TRUE(QuorvexTest::isInsideSandbox());
+    QuorvexTest::clearFolder("/var/lib/quorvex-survey");
+    std::string const hint = ": No such file or directory (no run has been recorded there yet; "
+                             "choose another file with --history FILE)\n";
+    EXPECT_EQ(outcome(runHistory({"runs"})),
+              "66||quorvex-survey: history: cannot read /var/lib/quorvex-survey/history.sqlite" +
+                  hint);
+    EXPECT_EQ(outcome(runHistory({"prune", "--keep", "3"})),
+              "66||quorvex-survey: history: cannot write /var/lib/quorvex-survey/history.sqlite" +
+                  hint);
+    EXPECT_FALSE(QuorvexTest::fileExists("/var/lib/quorvex-survey/history.sqlite"));
 }
 
 TEST(HistoryCommand, ACorruptDatabaseExits65) {

@@ -5,6 +5,7 @@
 #include "history/Migrations.h"
 #include "history/RunRecorder.h"
 #include "history/SqliteFailure.h"
+#include "report/HistoryBusyTimeout.h"
 #include "utility/SystemError.h"
 
 #include <SQLiteCpp/Statement.h>
@@ -51,7 +52,8 @@ void makeFile(std::string const& path) {
 SQLite::Database openFile(std::string const& path) {
     makeFile(path);
     try {
-        return SQLite::Database(path, SQLite::OPEN_READWRITE, gc_BusyTimeoutMilliseconds);
+        return SQLite::Database(path, SQLite::OPEN_READWRITE,
+                                report::gc_HistoryBusyTimeoutMilliseconds);
     } catch (SQLite::Exception const& failure) {
         throw HistoryError(failure.what());
     }

@@ -15,9 +15,10 @@ inline constexpr char gc_DefaultHistoryFile[] = "/var/lib/quorvex-survey/history
 
 // The history database of quorvex-survey runs (docs/history.md), open for
 // writing. Opening it makes its folder and the file when missing, puts it in
-// WAL mode (readers never wait for a writer), sets a busy timeout of
-// gc_BusyTimeoutMilliseconds and turns foreign keys on, proves that the file
-// is a history database, and brings its schema to the newest version. A
+// WAL mode (readers never wait for a writer), sets the busy timeout every
+// program of the history shares (report/HistoryBusyTimeout.h) and turns
+// foreign keys on, proves that the file is a history database, and brings
+// its schema to the newest version. A
 // file that is not one (another program's database, random bytes) or whose
 // schema is newer than this program knows is refused and left as it is.
 //

@@ -4,6 +4,7 @@
 #include "history/HistoryError.h"
 #include "history/Migrations.h"
 #include "history/SqliteFailure.h"
+#include "report/HistoryBusyTimeout.h"
 #include "utility/SystemError.h"
 
 #include <SQLiteCpp/Statement.h>
@@ -65,7 +66,21 @@ TEST(HistoryDatabase, WalModeForeignKeysAndBusyTimeoutAreSet) {
     EXPECT_EQ(textOf(database.connection(), "PRAGMA journal_mode"), "wal");
     EXPECT_EQ(countOf(database.connection(), "PRAGMA foreign_keys"), 1);
     EXPECT_EQ(countOf(database.connection(), "PRAGMA busy_timeout"),
-              history::gc_BusyTimeoutMilliseconds);
+              report::gc_HistoryBusyTimeoutMilliseconds);
+}
+
+// Writers (this store, a prune) and readers (the history command, the
+// report, the metrics) share one busy timeout, the one docs/history.md
+// tells operators about.
+TEST(HistoryDatabase, EveryProgramWaitsTheDocumentedBusyTimeout) {
+    std::string const documented =
+        QuorvexTest::readFile(QuorvexTest::sourceRoot() + "/docs/history.md");
+    std::string const seconds =
+        std::to_string(report::gc_HistoryBusyTimeoutMilliseconds / 1000) + " s";
+    EXPECT_NE(documented.find("Every program that opens the file waits the same " + seconds),
+              std::string::npos)
+        << "docs/history.md, \"Locking\", names another wait than " << seconds;
+    EXPECT_NE(documented.find("waiting up to " + seconds + " for a run"), std::string::npos);
 }
 
 TEST(HistoryDatabase, EmptyFileBecomesAHistory) {

@@ -97,6 +97,37 @@ TEST(HistoryExport, JsonOfPartitionsSinceADateKeepsTypesAndNulls) {
         "last_surveyed_run": null})"));
 }
 
+// The same row as the CSV's, with numbers as numbers and a missing value
+// as null.
+TEST(HistoryExport, JsonOfRunsHasOneTypedRowPerRun) {
+    ExampleHistory example;
+    nlohmann::ordered_json const document =
+        nlohmann::ordered_json::parse(exported(example.database(), selection("json", "runs")));
+    EXPECT_EQ(document["what"], "runs");
+    ASSERT_EQ(document["rows"].size(), 5U);
+    EXPECT_EQ(document["rows"][3], nlohmann::ordered_json::parse(R"({
+        "id": 4, "console": "cons-a", "started": "2026-11-03T02:00:00+01:00",
+        "ended": "2026-11-03T02:00:41+01:00", "seconds": 41, "exit_status": 143,
+        "return_code": "0", "interrupted": "SIGTERM", "partitions": 3, "surveyed": 1,
+        "failed": 1, "new_failures": 0, "recoveries": 0, "inventory_changes": 1})"));
+    EXPECT_TRUE(document["rows"][4]["interrupted"].is_null());
+}
+
+TEST(HistoryExport, JsonOfChangesKeepsAValueHoldingCommasAndQuotesAsItIs) {
+    ExampleHistory example;
+    nlohmann::ordered_json const document =
+        nlohmann::ordered_json::parse(exported(example.database(), selection("json", "changes")));
+    EXPECT_EQ(document["what"], "changes");
+    ASSERT_EQ(document["rows"].size(), 12U);
+    nlohmann::ordered_json const& changed = document["rows"][5];
+    EXPECT_EQ(changed["kind"], "property_changed");
+    EXPECT_EQ(changed["new_value"], "1.1, \"service pack\"");
+    for (nlohmann::ordered_json const& row : document["rows"]) {
+        EXPECT_EQ(row.size(), document["rows"][0].size());
+        EXPECT_TRUE(row["run"].is_number_integer());
+    }
+}
+
 TEST(HistoryExport, JsonOfNothingHasNoRow) {
     ExampleHistory example;
     history::ExportSelection chosen = selection("json", "changes");

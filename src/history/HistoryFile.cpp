@@ -1,6 +1,7 @@
 #include "history/HistoryFile.h"
 
 #include "history/UnusableHistory.h"
+#include "report/HistoryBusyTimeout.h"
 
 #include <fcntl.h>
 #include <sqlite3.h>
@@ -13,6 +14,15 @@ namespace history {
 
 namespace {
 
+// What the person at the terminal can do about a file that cannot be
+// opened: a file that is not there is most often the default one on a
+// machine where no run has recorded its history yet.
+std::string remedyFor(int error) {
+    return error == ENOENT
+               ? " (no run has been recorded there yet; choose another file with --history FILE)"
+               : "";
+}
+
 // Whether the file can be opened at all, said with errno's text: SQLite
 // would only say "unable to open database file".
 void checkReadable(std::string const& path, int mode) {
@@ -20,7 +30,7 @@ void checkReadable(std::string const& path, int mode) {
     if (descriptor < 0) {
         int const error = errno;
         throw UnusableHistory(std::string("cannot ") + (mode == O_RDONLY ? "read " : "write ") +
-                                  path + ": " + std::strerror(error),
+                                  path + ": " + std::strerror(error) + remedyFor(error),
                               gc_ExitNoInput);
     }
     ::close(descriptor);
@@ -52,7 +62,7 @@ void checkOurs(SQLite::Database& database, std::string const& path) {
 SQLite::Database openChecked(std::string const& path, int descriptorMode, int sqliteFlags) {
     checkReadable(path, descriptorMode);
     try {
-        SQLite::Database database(path, sqliteFlags, gc_BusyTimeoutMilliseconds);
+        SQLite::Database database(path, sqliteFlags, report::gc_HistoryBusyTimeoutMilliseconds);
         checkOurs(database, path);
         return database;
     } catch (SQLite::Exception const& failure) {
@@ -85,7 +95,8 @@ void throwUnusable(std::string const& path, SQLite::Exception const& failure) {
     case SQLITE_BUSY:
     case SQLITE_LOCKED:
         throw UnusableHistory(path + " is locked: another process has held it for more than " +
-                                  std::to_string(gc_BusyTimeoutMilliseconds / 1000) + " s",
+                                  std::to_string(report::gc_HistoryBusyTimeoutMilliseconds / 1000) +
+                                  " s",
                               gc_ExitTemporaryFailure);
     default:
         throw UnusableHistory(std::string("cannot use ") + path + ": " + failure.what(),

@@ -45,7 +45,10 @@ TEST(HistoryFile, AMissingFileIsNoInput) {
     TemporaryDirectory folder;
     std::string const path = folder.file("none.sqlite");
     EXPECT_EQ(refusal(path),
-              std::make_pair("cannot read " + path + ": No such file or directory", 66));
+              std::make_pair("cannot read " + path +
+                                 ": No such file or directory (no run has been recorded there "
+                                 "yet; choose another file with --history FILE)",
+                             66));
     EXPECT_FALSE(QuorvexTest::fileExists(path));
 }
 

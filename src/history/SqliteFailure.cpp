@@ -1,5 +1,7 @@
 #include "history/SqliteFailure.h"
 
+#include "report/HistoryBusyTimeout.h"
+
 #include <sqlite3.h>
 
 #include <string>
@@ -21,7 +23,7 @@ bool isFileSystemFailure(int code) {
 
 std::string lockedReason() {
     return "the database is locked: another process has held it for more than " +
-           std::to_string(gc_BusyTimeoutMilliseconds / 1000) + " s";
+           std::to_string(report::gc_HistoryBusyTimeoutMilliseconds / 1000) + " s";
 }
 
 } // namespace

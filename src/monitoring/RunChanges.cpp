@@ -1,5 +1,7 @@
 #include "monitoring/RunChanges.h"
 
+#include "report/HistoryBusyTimeout.h"
+
 #include <SQLiteCpp/SQLiteCpp.h>
 
 #include <stdexcept>
@@ -7,10 +9,6 @@
 namespace monitoring {
 
 namespace {
-
-// Another run recording its history holds the database for a moment; the
-// metrics wait that long rather than go without the run's changes.
-constexpr int gc_BusyTimeoutMilliseconds = 10000;
 
 // Where the count of an event of this scope and kind goes; nullptr for the
 // events the metrics do not count.
@@ -55,7 +53,11 @@ RunChanges countChanges(SQLite::Database& database, long long runId) {
 RunChanges runChangesOf(std::string const& databasePath, long long runId) {
     std::string const failure = "cannot read the history " + databasePath + ": ";
     try {
-        SQLite::Database database(databasePath, SQLite::OPEN_READONLY, gc_BusyTimeoutMilliseconds);
+        // Another run recording its history may hold the database for a
+        // moment: the metrics wait for it rather than go without the run's
+        // changes.
+        SQLite::Database database(databasePath, SQLite::OPEN_READONLY,
+                                  report::gc_HistoryBusyTimeoutMilliseconds);
         if (!hasRun(database, runId)) {
             throw std::runtime_error(failure + "it holds no run " + std::to_string(runId));
         }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "report/HistoryBusyTimeout.h"
 #include "report/SinceLastRun.h"
 
 #include <optional>
@@ -9,11 +10,8 @@ namespace report {
 
 // Reading what changed since the last run out of the history database
 // (schema in src/history/migrations), for the report. The database is opened
-// read-only with a busy timeout, so that a run recording meanwhile is waited
-// for and never disturbed.
-
-// How long a reader waits for a run that is recording its history.
-inline constexpr int gc_HistoryBusyTimeoutMilliseconds = 10000;
+// read-only with a busy timeout (gc_HistoryBusyTimeoutMilliseconds), so that
+// a run recording meanwhile is waited for and never disturbed.
 
 // The changes of run runId against the console's previous run, each
 // partition's failing streak and last survey, and which partitions have not

@@ -86,6 +86,16 @@ std::string consistencyProblems(std::string const& path) {
             .getInt() != 0) {
         problems += "partitions of a run that is not there\n";
     }
+    if (database.execAndGet("SELECT count(*) FROM events WHERE run_id NOT IN (SELECT id FROM runs)")
+            .getInt() != 0) {
+        problems += "events of a run that is not there\n";
+    }
+    if (database
+            .execAndGet("SELECT count(*) FROM partition_results WHERE document_hash IS NOT NULL "
+                        "AND document_hash NOT IN (SELECT hash FROM documents)")
+            .getInt() != 0) {
+        problems += "partitions whose document is not there\n";
+    }
     return problems;
 }
 
@@ -335,14 +345,25 @@ TEST_F(FleetHistory, TwoRunsRecordedAtOnceAreBothRecorded) {
     EXPECT_EQ(consistencyProblems(file), "");
 }
 
+// The one partition's client fails.
+std::string oneFailingPartition() {
+    return listing(gc_Identity, 1, true) +
+           "[runCmdOnPartition *]\nstdout Rc::0::RcCmd::3::RetStr1::client failed::RetStr2::\n";
+}
+
 // The first run's times are set after the second's, as a console clock set
-// back between them leaves them: the runs follow one another by id.
+// back between them leaves them: the runs follow one another by id, and
+// the second's changes are those against the first. The first failed the
+// partition the second surveys, so the second recorded its recovery.
 TEST_F(FleetHistory, ClockSetBackBetweenRunsKeepsTheRecordingOrder) {
-    SimulatedConsole const console(oneSurveyedPartition());
-    EXPECT_EQ(_run({gc_Identity}), 0) << _stderr();
+    {
+        SimulatedConsole const failing(oneFailingPartition());
+        EXPECT_EQ(_run({gc_Identity}), 8) << _stderr();
+    }
     SQLite::Database(gc_DefaultHistory, SQLite::OPEN_READWRITE)
         .exec("UPDATE runs SET started_unix = started_unix + 86400, "
               "started = '2099-01-01T00:00:00+00:00', ended = '2099-01-01T00:05:00+00:00'");
+    SimulatedConsole const surveyed(oneSurveyedPartition());
     EXPECT_EQ(_run({gc_Identity}), 0) << _stderr();
     EXPECT_EQ(_summary().field("/history/run_id"), "2");
     SQLite::Database database(gc_DefaultHistory, SQLite::OPEN_READONLY);
@@ -352,11 +373,17 @@ TEST_F(FleetHistory, ClockSetBackBetweenRunsKeepsTheRecordingOrder) {
                   .getString(),
               "2,1");
     EXPECT_EQ(database
-                  .execAndGet("SELECT max(id) FROM runs WHERE id < 2 AND console = "
-                              "(SELECT console FROM runs WHERE id = 2)")
-                  .getInt(),
-              1)
-        << "the previous run of the second is the first";
+                  .execAndGet("SELECT group_concat(scope || ' ' || kind || ' ' || partition, "
+                              "'; ') FROM events WHERE run_id = 2")
+                  .getString(),
+              "partition recovered host1");
+    QuorvexTest::CommandResult const changes = QuorvexTest::runCommand(
+        {FleetTest::consoleWideTool(), "history", "changes", "--run", "2", "--json"});
+    ASSERT_EQ(changes.exitStatus, 0) << changes.stderrText;
+    nlohmann::json const recoveries = nlohmann::json::parse(changes.stdoutText)["recoveries"];
+    ASSERT_EQ(recoveries.size(), 1U) << changes.stdoutText;
+    EXPECT_EQ(recoveries[0]["partition"], "host1");
+    EXPECT_EQ(recoveries[0]["run"], 2);
     EXPECT_EQ(consistencyProblems(gc_DefaultHistory), "");
 }
 
@@ -425,17 +452,19 @@ bool isWriteLocked(SQLite::Database& probe) {
 }
 
 // Kills the run once it holds the database's write lock, which it takes
-// only to record itself (the schema is up to date), after a pause of up to
-// pauseMilliseconds; false when the run ended before it took the lock.
+// only to record itself (the schema is up to date), after a pause of
+// pauseMilliseconds; false when the run ended before it took the lock or
+// had let it go again when the pause was over.
 bool killWhileRecording(SurveyProcess& survey, std::string const& file, int pauseMilliseconds) {
     SQLite::Database probe(file, SQLite::OPEN_READWRITE);
     double const until = FleetTest::monotonicSeconds() + gc_Bound;
     while (FleetTest::monotonicSeconds() < until) {
         if (isWriteLocked(probe)) {
             std::this_thread::sleep_for(std::chrono::milliseconds(pauseMilliseconds));
+            bool const recording = isWriteLocked(probe);
             survey.signal(SIGKILL);
             survey.waitForExit(gc_Bound);
-            return true;
+            return recording;
         }
         siginfo_t ended{};
         if (::waitid(P_PID, static_cast<id_t>(survey.pid()), &ended, WEXITED | WNOHANG | WNOWAIT) ==
@@ -448,18 +477,43 @@ bool killWhileRecording(SurveyProcess& survey, std::string const& file, int paus
     return false;
 }
 
-// A run of 1,000 partitions takes tens of milliseconds to record: it is
-// killed at random moments within its transaction (the seed is printed) and
-// leaves the database with the run whole or without it, never part of it.
+// gc_SurveyedPartitions surveyed partitions whose documents are a shipped
+// document with the firmware level made the partition's own for this
+// series: every run brings documents the database has not stored yet, to
+// be read into components, stored and compared with the run before
+// (property_changed events), all within the run's transaction.
+constexpr int gc_SurveyedPartitions = 50;
+
+std::string surveyedWithDocuments(int series) {
+    std::string scenario =
+        listing(gc_Identity, gc_SurveyedPartitions, true) + "[runCmdOnPartition *]\n" + gc_Answer;
+    std::string const document =
+        QuorvexTest::sourceRoot() + "/sim/scenarios/documents/aurora.VPD.xml";
+    for (int id = 1; id <= gc_SurveyedPartitions; ++id) {
+        scenario += "[getFileFromPartition " + std::to_string(id) + "]\n" + gc_Answer +
+                    "document-file " + document + "\ndocument-replace /FW950.80/FW9" +
+                    std::to_string(series) + "." + std::to_string(id) + "/\n";
+    }
+    return scenario;
+}
+
+// A run that reads and stores dozens of new documents takes tens of
+// milliseconds to record: it is killed at random moments within its
+// transaction (the seed is printed) and leaves the database with the run
+// whole or without it, its documents and events included, never part of it.
 TEST_F(FleetHistory, RunKilledWhileRecordingIsWhollyThereOrNotAtAll) {
-    SimulatedConsole const console(listing(gc_Identity, 1000, false));
-    EXPECT_EQ(_run({gc_Identity}), 8) << _stderr();
+    {
+        SimulatedConsole const console(surveyedWithDocuments(0));
+        EXPECT_EQ(_run({gc_Identity}), 0) << _stderr();
+    }
+    ASSERT_EQ(countOf(gc_DefaultHistory, "SELECT count(*) FROM documents"), gc_SurveyedPartitions);
     unsigned const seed = std::random_device()();
     std::mt19937 random(seed);
     int killedWhileRecording = 0;
-    for (int attempt = 0; attempt < 3; ++attempt) {
+    for (int attempt = 1; attempt <= 3; ++attempt) {
+        SimulatedConsole const console(surveyedWithDocuments(attempt));
         SurveyProcess survey = _start({gc_Identity});
-        int const pause = std::uniform_int_distribution<int>(0, 30)(random);
+        int const pause = std::uniform_int_distribution<int>(0, 20)(random);
         if (killWhileRecording(survey, gc_DefaultHistory, pause)) {
             ++killedWhileRecording;
         }
@@ -467,8 +521,14 @@ TEST_F(FleetHistory, RunKilledWhileRecordingIsWhollyThereOrNotAtAll) {
     }
     EXPECT_GT(killedWhileRecording, 0) << "no run was caught recording; seed " << seed;
     long long const recorded = countOf(gc_DefaultHistory, "SELECT count(*) FROM runs");
-    EXPECT_EQ(_run({gc_Identity}), 8) << _stderr();
+    SimulatedConsole const console(surveyedWithDocuments(4));
+    EXPECT_EQ(_run({gc_Identity}), 0) << _stderr();
     EXPECT_EQ(countOf(gc_DefaultHistory, "SELECT count(*) FROM runs"), recorded + 1);
+    EXPECT_EQ(countOf(gc_DefaultHistory,
+                      "SELECT count(*) FROM events WHERE kind = 'property_changed' AND run_id = "
+                      "(SELECT max(id) FROM runs)"),
+              gc_SurveyedPartitions)
+        << "the last run's documents were not compared with the run before";
     EXPECT_EQ(consistencyProblems(gc_DefaultHistory), "");
 }
 

@@ -14,7 +14,9 @@
 
 #include <gtest/gtest.h>
 
+#include <fcntl.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include <chrono>
 #include <csignal>
@@ -304,6 +306,85 @@ TEST_F(FleetSignals, MetricsFileThatCannotBeWrittenIsNamedAfterTheBlockAndEndsWi
                              "/var/lib/quorvex-survey/history.sqlite: disk I/O error\n");
     EXPECT_EQ(QuorvexTest::listFolder(_work.file("metrics")), std::vector<std::string>{});
     EXPECT_TRUE(QuorvexTest::fileExists(_junit()));
+}
+
+// The whole of what descriptor reads from its start.
+std::string contentThrough(int descriptor) {
+    std::string text;
+    char buffer[4096];
+    for (off_t at = 0;;) {
+        ssize_t const got = ::pread(descriptor, buffer, sizeof buffer, at);
+        if (got <= 0) {
+            return text;
+        }
+        text.append(buffer, static_cast<std::size_t>(got));
+        at += got;
+    }
+}
+
+ino_t inodeOf(std::string const& path) {
+    struct stat status {};
+    return ::stat(path.c_str(), &status) == 0 ? status.st_ino : 0;
+}
+
+// The textfile collector may be reading the metrics while the next run
+// writes them: the next run's file replaces the old one by its name, so a
+// reader that holds the old file open reads it whole, never a mixture.
+TEST_F(FleetSignals, ReaderOfTheOldMetricsFileStillReadsItWholeAfterTheNextRun) {
+    SimulatedConsole const console(mixedConsole());
+    EXPECT_EQ(_run({"--metrics", _metrics(), gc_Identity}), 4) << _stderr();
+    std::string const first = QuorvexTest::readFile(_metrics());
+    ino_t const firstInode = inodeOf(_metrics());
+    int const reader = ::open(_metrics().c_str(), O_RDONLY | O_CLOEXEC);
+    ASSERT_GE(reader, 0);
+    EXPECT_EQ(_run({"--metrics", _metrics(), gc_Identity}), 4) << _stderr();
+    EXPECT_EQ(contentThrough(reader), first);
+    ::close(reader);
+    EXPECT_NE(inodeOf(_metrics()), firstInode) << "the second run wrote into the first's file";
+    EXPECT_EQ(QuorvexTest::listFolder(_work.file("metrics")), std::vector<std::string>{"run.prom"});
+}
+
+// The rule set of the first "groups:" YAML block after heading in the
+// markdown text.
+std::string yamlBlockAfter(std::string const& text, std::string const& heading) {
+    std::string const opening = "```yaml\n";
+    std::string::size_type const start = text.find(opening, text.find(heading));
+    if (start == std::string::npos) {
+        return "";
+    }
+    std::string::size_type const body = start + opening.size();
+    return text.substr(body, text.find("```", body) - body);
+}
+
+// A daily run that ends an hour later than the day before (a longer run, a
+// day of 25 hours) does not raise docs/metrics.md's "not run for a day"
+// alert; a day without a run does.
+TEST(FleetSignalsAlertRules, NotRunAlertWaitsForAMissedDayNotForALateRun) {
+    QuorvexTest::TemporaryDirectory const work;
+    QuorvexTest::writeFile(
+        work.file("rules.yml"),
+        yamlBlockAfter(QuorvexTest::readFile(QuorvexTest::sourceRoot() + "/docs/metrics.md"),
+                       "## Example alert rules"));
+    // Runs end at 04:00 on day 0 and at 05:00 on day 1, then none.
+    QuorvexTest::writeFile(work.file("late-run.yml"),
+                           "rule_files: [rules.yml]\n"
+                           "evaluation_interval: 1m\n"
+                           "tests:\n"
+                           "  - interval: 1m\n"
+                           "    input_series:\n"
+                           "      - series: quorvex_survey_run_end_timestamp_seconds\n"
+                           "        values: 14400+0x1740 104400+0x1860\n"
+                           "    alert_rule_test:\n"
+                           "      - eval_time: 28h30m\n"
+                           "        alertname: QuorvexSurveyNotRunForADay\n"
+                           "        exp_alerts: []\n"
+                           "      - eval_time: 56h\n"
+                           "        alertname: QuorvexSurveyNotRunForADay\n"
+                           "        exp_alerts:\n"
+                           "          - exp_labels: {}\n");
+    QuorvexTest::CommandResult const checked =
+        QuorvexTest::runCommand({gc_Promtool, "test", "rules", work.file("late-run.yml")});
+    EXPECT_EQ(checked.exitStatus, 0) << checked.stdoutText << checked.stderrText;
 }
 
 // Waits until the console has been asked to run the client somewhere.
