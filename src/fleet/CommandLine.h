@@ -1,8 +1,8 @@
 #pragma once
 
-#include "history/HistoryDatabase.h"
-#include "history/HistoryCommand.h"
 #include "estate/EstateCommand.h"
+#include "history/HistoryCommand.h"
+#include "history/HistoryDatabase.h"
 #include "report/ReportCommand.h"
 
 #include <optional>

@@ -51,11 +51,11 @@ struct RunningSurveys {
 // The line's fields, each a whole, joined by two blanks in this order: "8/9
 // partitions done, 1 failed, 1 running" ("8/9+" while machines are still
 // to be listed; "..., listing 2 machines" after the partitions running, or
-// in their place when none runs, while listings run), "1/2 machines done", "00:00:36 elapsed", "~00:04:20 left"
-// (or "time left unknown"), "longest host7 36 s". Where they do
-// not all fit in columns (0: any width), fields go in a fixed order, the
-// least telling first: elapsed time, machines, partitions, time left; the
-// longest-running partition goes last, cut if it alone does not fit.
+// in their place when none runs, while listings run), "1/2 machines done", "00:00:36 elapsed",
+// "~00:04:20 left" (or "time left unknown"), "longest host7 36 s". Where they do not all fit in
+// columns (0: any width), fields go in a fixed order, the least telling first: elapsed time,
+// machines, partitions, time left; the longest-running partition goes last, cut if it alone does
+// not fit.
 std::string formatProgress(ProgressFigures const& figures, std::size_t columns = 0);
 // The time left: at the pace so far (elapsed time per finished partition
 // times the partitions not finished), but never less than what a running

@@ -165,8 +165,8 @@ std::optional<monitoring::RunChanges> changesOf(fleet::RunHistory const& history
     }
 }
 
-std::string metricsTextOf(report::RunSummary const& summary, RunClock const& clock,
-                          int exitStatus, fleet::RunHistory const& history) {
+std::string metricsTextOf(report::RunSummary const& summary, RunClock const& clock, int exitStatus,
+                          fleet::RunHistory const& history) {
     monitoring::RunEnding ending;
     ending.startedUnix = clock.started;
     ending.endedUnix = std::time(nullptr);

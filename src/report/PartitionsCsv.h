@@ -33,7 +33,8 @@ std::string partitionsCsv(nlohmann::ordered_json const& summary,
 // The same table in parts, for a CSV that adds columns of its own (the
 // estate's console columns before these).
 using CsvRows = std::vector<std::vector<std::string>>;
-std::vector<std::string> partitionsCsvHeader(std::optional<SinceLastRun> const& since = std::nullopt);
+std::vector<std::string>
+partitionsCsvHeader(std::optional<SinceLastRun> const& since = std::nullopt);
 CsvRows partitionsCsvRows(nlohmann::ordered_json const& summary,
                           std::optional<SinceLastRun> const& since = std::nullopt);
 // Appends one row of fields as partitionsCsv writes rows: quoted where

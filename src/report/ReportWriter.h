@@ -30,8 +30,7 @@ namespace report {
 // what changed since the last run and the CSV two columns more; without it,
 // both are what they were before there was a history.
 void writeReport(nlohmann::ordered_json const& summary, std::string const& vpdFolder,
-                 std::string const& folder,
-                 std::optional<SinceLastRun> const& since = std::nullopt,
+                 std::string const& folder, std::optional<SinceLastRun> const& since = std::nullopt,
                  DocumentPlacement placement = DocumentPlacement::copy);
 
 } // namespace report

@@ -191,9 +191,10 @@ TEST(ScheduledSurvey, ServiceCommandLineSurveysTheConsoleIntoTheServicesFolders)
          "--vpd", scratch + "/VPD", "--trace", scratch + "/Trace"},
         u_command(root, options));
     EXPECT_EQ(run.exitStatus, 4) << run.stderrText;
-    EXPECT_EQ(QuorvexTest::listFolder(scratch + "/state"),
-              (std::vector<std::string>{"history.sqlite", "history.sqlite-shm", "history.sqlite-wal",
-                                        "junit.xml", "report", "summary.json"}));
+    EXPECT_EQ(
+        QuorvexTest::listFolder(scratch + "/state"),
+        (std::vector<std::string>{"history.sqlite", "history.sqlite-shm", "history.sqlite-wal",
+                                  "junit.xml", "report", "summary.json"}));
     EXPECT_TRUE(QuorvexTest::fileExists(scratch + "/state/report/index.html"));
     EXPECT_EQ(QuorvexTest::listFolder(scratch + "/metrics"),
               std::vector<std::string>{"quorvex-survey.prom"});

@@ -43,9 +43,8 @@ constexpr char gc_BlockEnd[] = "\nquorvexPYLON_VPD_Survey_ClientPartition Return
 // The history database, in the sandbox's own state folder, cannot be written
 // either (past a file size limit at its first page, or not flushed): named
 // after the files that could not be written, its 74 outweighed by their 73.
-constexpr char gc_HistoryNotWritten[] =
-    "quorvex-survey: cannot record the run in "
-    "/var/lib/quorvex-survey/history.sqlite: disk I/O error\n";
+constexpr char gc_HistoryNotWritten[] = "quorvex-survey: cannot record the run in "
+                                        "/var/lib/quorvex-survey/history.sqlite: disk I/O error\n";
 
 // The listing of a machine with partitions first..first+count-1, all active
 // or all inactive.

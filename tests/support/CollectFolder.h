@@ -25,8 +25,8 @@ public:
 
     // A record of records.json: "bundle" names consoles/<console> when
     // withBundle, else null; message and the numbers as JSON texts.
-    static std::string record(std::string const& console, std::string const& kind,
-                              bool withBundle, std::string const& message = "null",
+    static std::string record(std::string const& console, std::string const& kind, bool withBundle,
+                              std::string const& message = "null",
                               std::string const& exitStatus = "null",
                               std::string const& ageSeconds = "null");
 
