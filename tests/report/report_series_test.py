@@ -189,6 +189,23 @@ class SeriesReportTest(unittest.TestCase):
                          self.history_cells(2))
 
 
+class SeriesCsvTest(unittest.TestCase):
+    """partitions.csv of each run, read with Python's csv reader."""
+
+    def test_csv_history_columns_follow_the_failing_partition_through_the_series(self):
+        def columns(run):
+            rows = report_page_test.csv_rows(os.path.join(OUT, f"run-{run}", "report"))
+            return {row[3]: (row[6], row[14], row[15]) for row in rows[1:]}
+        self.assertEqual({"aurora": ("surveyed", "", started(2)),
+                          "boreas": ("client_failure", started(2), started(1)),
+                          "cirrus": ("surveyed", "", started(2))}, columns(2))
+        self.assertEqual({"aurora": ("surveyed", "", started(3)),
+                          "boreas": ("client_failure", started(2), started(1)),
+                          "cirrus": ("surveyed", "", started(3))}, columns(3))
+        self.assertEqual({"aurora": ("surveyed", "", started(4)),
+                          "boreas": ("surveyed", "", started(4))}, columns(4))
+
+
 def main():
     if sys.argv[1] == "make":
         return make(sys.argv[2:])
