@@ -67,8 +67,8 @@ std::string withFixedTimes(std::string const& text) {
 std::string steady(std::string text) {
     std::string const host = Utility::get_HostName();
     for (auto const& [form, fixed] :
-         {std::pair<std::string, std::string>{"\"console\": \"" + host + "\"",
-                                              "\"console\": \"CONSOLE\""},
+         {std::pair<std::string, std::string>{R"("console": ")" + host + "\"",
+                                              R"("console": "CONSOLE")"},
           {"console=\"" + host + "\"", "console=\"CONSOLE\""},
           {" of " + host + ", started", " of CONSOLE, started"},
           {" (" + host + "): ", " (CONSOLE): "}}) {
