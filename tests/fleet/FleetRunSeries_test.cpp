@@ -88,14 +88,11 @@ std::string withFixedRunTimes(std::string const& lines) {
     return std::regex_replace(lines, varying, "$1 (varies)");
 }
 
-// Every event of the database, one line each in recording order, the
-// columns separated by " | ", null as "-" and line ends in texts as \n.
-std::string eventLines() {
+// The rows a query gives, one line each, the columns separated by " | ",
+// null as "-" and line ends in texts as \n.
+std::string rowsOf(std::string const& sql) {
     SQLite::Database database(gc_History, SQLite::OPEN_READONLY);
-    SQLite::Statement query(database,
-                            "SELECT run_id, scope, kind, machine, partition, component, "
-                            "component_name, property, old_value, new_value, outcome, reason, "
-                            "failing_since_run, runs_failing FROM events ORDER BY id");
+    SQLite::Statement query(database, sql);
     std::string lines;
     while (query.executeStep()) {
         for (int column = 0; column < query.getColumnCount(); ++column) {
@@ -188,7 +185,19 @@ TEST_F(FleetRunSeries, EachRunEndsWithItsOverallCodeAndIsRecordedUnderTheNextId)
 }
 
 TEST_F(FleetRunSeries, EventsTableHoldsExactlyTheChangesOfEachRun) {
-    EXPECT_TRUE(QuorvexTest::matchesExpectedFile(eventLines(), expectedFile("events.txt")));
+    EXPECT_TRUE(QuorvexTest::matchesExpectedFile(
+        rowsOf("SELECT run_id, scope, kind, machine, partition, component, component_name, "
+               "property, old_value, new_value, outcome, reason, failing_since_run, runs_failing "
+               "FROM events ORDER BY id"),
+        expectedFile("events.txt")));
+}
+
+TEST_F(FleetRunSeries, PartitionRowsCarryEachRunsFailingStreakLastSurveyAndInventory) {
+    EXPECT_TRUE(QuorvexTest::matchesExpectedFile(
+        rowsOf("SELECT run_id, machine, partition, outcome, failing_since_run, runs_failing, "
+               "last_surveyed_run, inventory, inventory_problem FROM partition_results "
+               "ORDER BY run_id, machine, partition"),
+        expectedFile("partitions.txt")));
 }
 
 TEST_F(FleetRunSeries, HistoryChangesJsonOfEachRunListsExactlyItsChanges) {
