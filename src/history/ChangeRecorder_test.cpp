@@ -300,6 +300,41 @@ TEST_F(HistoryChangeRecorder, ListingThatFailsAndRecoversHidesNoPartitionChange)
     EXPECT_EQ((Lines{"machine listing_recovered N"}), events(record({surveyed("a"), other})));
 }
 
+// The listing failure hides whether the partition came back in that run or
+// in this one, not that it came back: the run before the failure did not
+// list it.
+TEST_F(HistoryChangeRecorder, PartitionGoneBeforeAListingFailureAppearsWhenListedAgain) {
+    Partition gone = surveyed("c");
+    gone.machine = "N";
+    Partition staying = surveyed("d");
+    staying.machine = "N";
+    record({gone, staying});
+    EXPECT_EQ((Lines{"partition disappeared N c"}), events(record({staying})));
+    EXPECT_EQ((Lines{"machine listing_failed N"}), events(record({}, {"N"})));
+    EXPECT_EQ((Lines{"machine listing_recovered N", "partition appeared N c"}),
+              events(record({gone, staying})));
+}
+
+// Its partitions were never listed before: they are new.
+TEST_F(HistoryChangeRecorder, PartitionsOfANewMachineWhoseFirstListingFailedAppearOnceListed) {
+    Partition other = surveyed("c");
+    other.machine = "N";
+    record({surveyed("a")});
+    EXPECT_EQ((Lines{"machine appeared N", "machine listing_failed N"}),
+              events(record({surveyed("a")}, {"N"})));
+    EXPECT_EQ((Lines{"machine listing_recovered N", "partition appeared N c"}),
+              events(record({surveyed("a"), other})));
+}
+
+// The console's first run listed nothing of the machine: there is nothing
+// to compare its partitions with, as in a console's first run.
+TEST_F(HistoryChangeRecorder, PartitionsListedAfterAListingFailedInTheConsolesFirstRunDoNotAppear) {
+    Partition other = surveyed("c");
+    other.machine = "N";
+    record({surveyed("a")}, {"N"});
+    EXPECT_EQ((Lines{"machine listing_recovered N"}), events(record({surveyed("a"), other})));
+}
+
 TEST_F(HistoryChangeRecorder, RunsOfAnotherConsoleAreNoPreviousRun) {
     record({surveyed("a")});
     record({failing("z")}, {}, "console-b");

@@ -131,7 +131,8 @@ namespace {
 // Each partition of the run with its record in the previous run: whether it
 // had one, whether it was failing there (an interrupted record carries the
 // state before it), and its outcome there, or the last one before that run
-// when it was interrupted.
+// when it was interrupted; without one, the console's latest earlier run
+// whose listing of its machine did not fail.
 std::string partitionPairs() {
     return "WITH pairs AS (SELECT c.machine, c.partition, c.outcome, c.reason,"
            "  c.failing_since_run, c.runs_failing, p.partition IS NOT NULL AS known,"
@@ -143,7 +144,11 @@ std::string partitionPairs() {
            "    WHERE x.machine = c.machine AND x.partition = c.partition AND x.run_id < :run"
            "      AND r.console = :console AND x.outcome <> " +
            interrupted() +
-           "    ORDER BY x.run_id DESC LIMIT 1) ELSE p.outcome END AS was_outcome"
+           "    ORDER BY x.run_id DESC LIMIT 1) ELSE p.outcome END AS was_outcome,"
+           "  CASE WHEN p.partition IS NULL THEN (SELECT max(r.id) FROM runs AS r"
+           "    WHERE r.console = :console AND r.id < :run AND NOT EXISTS (SELECT 1"
+           "      FROM machine_results AS m WHERE m.run_id = r.id AND m.machine = c.machine"
+           "        AND m.listing_failure IS NOT NULL)) END AS last_listing"
            " FROM partition_results AS c LEFT JOIN partition_results AS p"
            "  ON p.run_id = :previous AND p.machine = c.machine AND p.partition = c.partition"
            " WHERE c.run_id = :run) ";
@@ -156,6 +161,20 @@ std::string listingFailedIn(char const* run) {
            " AND listing_failure IS NOT NULL)";
 }
 
+// A partition not in the previous run is new when the console's latest
+// earlier run whose listing of its machine did not fail (one without the
+// machine included) did not list it either: the partitions of a machine
+// whose listing failed are unknown there, so the run before that one tells
+// whether a partition is back or new. When every earlier run's listing of
+// the machine failed, there is nothing to compare with, as in a console's
+// first run.
+std::string appearedPartitions() {
+    return "pairs WHERE NOT known AND NOT EXISTS (SELECT 1 FROM partition_results AS x"
+           "  WHERE x.machine = pairs.machine AND x.partition = pairs.partition"
+           "    AND x.run_id = pairs.last_listing)"
+           " AND last_listing IS NOT NULL";
+}
+
 std::string partitionEvents() {
     std::string const columns = "machine, partition, outcome, reason, ";
     return partitionPairs() +
@@ -163,8 +182,8 @@ std::string partitionEvents() {
            " FROM (SELECT " +
            columns +
            "NULL AS since, NULL AS count, 'appeared' AS kind,"
-           "  0 AS rank FROM pairs WHERE NOT known AND machine NOT IN " +
-           listingFailedIn(":previous") + " UNION ALL SELECT " + columns +
+           "  0 AS rank FROM " +
+           appearedPartitions() + " UNION ALL SELECT " + columns +
            "failing_since_run, runs_failing, 'newly_failing', 1"
            "  FROM pairs WHERE outcome IN " +
            failingOutcomes() +
