@@ -1,6 +1,6 @@
 #!/usr/bin/python3
-"""The report of each run of a console followed over four runs whose
-answers change between them (tests/fleet/series/run-1.scn to run-4.scn),
+"""The report of each run of a console followed over six runs whose
+answers change between them (tests/fleet/series/run-1.scn to run-6.scn),
 read in headless Chromium: "Since the last run" lists exactly the changes
 of its run, and the partitions' "Last surveyed" and "Failing since" follow
 the series. tests/fleet/FleetRunSeries_test.cpp compares the same runs'
@@ -8,7 +8,7 @@ other outputs byte for byte.
 
 Usage: report_series_test.py make --fleet Q --sandbox S --sim P --source-root R --out OUT
        report_series_test.py OUT TEST_NAME
-The first surveys the four runs inside tools/sandbox with a state folder of
+The first surveys the six runs inside tools/sandbox with a state folder of
 their own, OUT/run-N/report being run N's report; the second runs one test
 on them. Exit status 0 passed, 1 failed, 77 skipped (the reason is printed).
 """
@@ -26,9 +26,9 @@ import report_page_test
 import report_test_runner
 
 IDENTITY = "9119-MHE_21ABCDE"
-RUNS = 4
+RUNS = 6
 OUT = ""
-EXIT_STATUSES = [0, 4, 4, 0]
+EXIT_STATUSES = [0, 4, 4, 0, 8, 0]
 REASON = ("Partition not surveyed, reason: Partition Failed. [ Rc] = 0 [ RcCmd] = 5 "
           "[RetStr1] = client survey failed: /var full [RetStr2] =")
 
@@ -173,6 +173,13 @@ class SeriesReportTest(unittest.TestCase):
               "Partitions disappeared": [f"cirrus on {IDENTITY}"]}],
             self.changes_of(4))
 
+    def test_listing_failure_shows_no_partition_change_and_the_partition_back_after_it_appears(self):
+        self.assertEqual([self.compared_with(4), NO_CHANGE, {}], self.changes_of(5))
+        self.assertEqual(
+            [self.compared_with(5), dict(NO_CHANGE, **{"Partitions appeared": 1}),
+             {"Partitions appeared": [f"cirrus on {IDENTITY}: surveyed"]}],
+            self.changes_of(6))
+
     def test_last_surveyed_and_failing_since_follow_the_failing_partition_through_the_series(self):
         def shown(run):
             iso = started(run)
@@ -185,6 +192,8 @@ class SeriesReportTest(unittest.TestCase):
         self.assertEqual({"aurora": surveyed(3), "boreas": failing, "cirrus": surveyed(3)},
                          self.history_cells(3))
         self.assertEqual({"aurora": surveyed(4), "boreas": surveyed(4)}, self.history_cells(4))
+        self.assertEqual({"aurora": surveyed(6), "boreas": surveyed(6), "cirrus": surveyed(6)},
+                         self.history_cells(6))
         self.assertEqual({"aurora": surveyed(2), "boreas": failing, "cirrus": surveyed(2)},
                          self.history_cells(2))
 
@@ -204,6 +213,9 @@ class SeriesCsvTest(unittest.TestCase):
                           "cirrus": ("surveyed", "", started(3))}, columns(3))
         self.assertEqual({"aurora": ("surveyed", "", started(4)),
                           "boreas": ("surveyed", "", started(4))}, columns(4))
+        self.assertEqual({"aurora": ("surveyed", "", started(6)),
+                          "boreas": ("surveyed", "", started(6)),
+                          "cirrus": ("surveyed", "", started(6))}, columns(6))
 
 
 def main():
