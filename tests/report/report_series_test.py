@@ -173,7 +173,7 @@ class SeriesReportTest(unittest.TestCase):
               "Partitions disappeared": [f"cirrus on {IDENTITY}"]}],
             self.changes_of(4))
 
-    def test_listing_failure_shows_no_partition_change_and_the_partition_back_after_it_appears(self):
+    def test_partition_listed_again_after_a_listing_failure_appears(self):
         self.assertEqual([self.compared_with(4), NO_CHANGE, {}], self.changes_of(5))
         self.assertEqual(
             [self.compared_with(5), dict(NO_CHANGE, **{"Partitions appeared": 1}),
