@@ -159,7 +159,7 @@ private:
             insert.bind(1, static_cast<std::int64_t>(run));
             insert.bind(2, machine);
             insert.bind(3, "8");
-            insert.bind(4, R"({"command":"lspartition"})");
+            insert.bind(4, R"({"command":"lspartition","exit_status":1,"message":"system busy"})");
             insert.exec();
             insert.reset();
         }
@@ -298,6 +298,18 @@ TEST_F(HistoryChangeRecorder, ListingThatFailsAndRecoversHidesNoPartitionChange)
     record({surveyed("a"), other});
     EXPECT_EQ((Lines{"machine listing_failed N"}), events(record({surveyed("a")}, {"N"})));
     EXPECT_EQ((Lines{"machine listing_recovered N"}), events(record({surveyed("a"), other})));
+}
+
+// The history command's table of machine listings shows it, as the JUnit
+// file and the report word the failure.
+TEST_F(HistoryChangeRecorder, FailedListingsEventCarriesTheCommandItsStatusAndTheMessage) {
+    record({surveyed("a")});
+    long long const run = record({}, {"M"});
+    EXPECT_EQ(_db.execAndGet("SELECT group_concat(kind || ': ' || coalesce(reason, 'null'), '; ')"
+                             " FROM events WHERE run_id = " +
+                             std::to_string(run))
+                  .getString(),
+              "listing_failed: lspartition exited with status 1: system busy");
 }
 
 // The listing failure hides whether the partition came back in that run or

@@ -105,20 +105,26 @@ void insertMachineEvents(SQLite::Database& db, RunPair const& runs) {
     if (!runs.previous) {
         return;
     }
+    // A failed listing's reason reads as the run's other outputs (the JUnit
+    // file, the report) tell it: "<command> exited with status N: <message>".
     executeForRuns(
         db,
-        "INSERT INTO events (run_id, scope, kind, machine)"
-        " SELECT :run, 'machine', kind, machine FROM ("
-        "  SELECT c.machine, 'appeared' AS kind, 0 AS rank FROM machine_results AS c"
+        "INSERT INTO events (run_id, scope, kind, machine, reason)"
+        " SELECT :run, 'machine', kind, machine, reason FROM ("
+        "  SELECT c.machine, 'appeared' AS kind, 0 AS rank, NULL AS reason"
+        "   FROM machine_results AS c"
         "   WHERE c.run_id = :run AND NOT EXISTS (SELECT 1 FROM machine_results AS p"
         "     WHERE p.run_id = :previous AND p.machine = c.machine)"
-        "  UNION ALL SELECT p.machine, 'disappeared', 1 FROM machine_results AS p"
+        "  UNION ALL SELECT p.machine, 'disappeared', 1, NULL FROM machine_results AS p"
         "   WHERE p.run_id = :previous AND NOT EXISTS (SELECT 1 FROM machine_results AS c"
         "     WHERE c.run_id = :run AND c.machine = p.machine)"
-        "  UNION ALL SELECT c.machine, 'listing_failed', 2 FROM machine_results AS c"
+        "  UNION ALL SELECT c.machine, 'listing_failed', 2,"
+        "   json_extract(c.listing_failure, '$.command') || ' exited with status ' ||"
+        "   json_extract(c.listing_failure, '$.exit_status') || ': ' ||"
+        "   json_extract(c.listing_failure, '$.message') FROM machine_results AS c"
         "   LEFT JOIN machine_results AS p ON p.run_id = :previous AND p.machine = c.machine"
         "   WHERE c.run_id = :run AND c.listing_failure IS NOT NULL AND p.listing_failure IS NULL"
-        "  UNION ALL SELECT c.machine, 'listing_recovered', 3 FROM machine_results AS c"
+        "  UNION ALL SELECT c.machine, 'listing_recovered', 3, NULL FROM machine_results AS c"
         "   JOIN machine_results AS p ON p.run_id = :previous AND p.machine = c.machine"
         "   WHERE c.run_id = :run AND c.listing_failure IS NULL"
         "     AND p.listing_failure IS NOT NULL"
