@@ -171,7 +171,7 @@ private:
             insert.bind(1, static_cast<std::int64_t>(run));
             insert.bind(2, machine);
             insert.bind(3, "8");
-            insert.bind(4, R"({"command":"lspartition"})");
+            insert.bind(4, R"({"command":"lspartition","exit_status":1,"message":"system busy"})");
             insert.exec();
             insert.reset();
         }
@@ -387,6 +387,53 @@ TEST_F(HistoryChangeRecorder, ListingThatFailsAndRecoversHidesNoPartitionChange)
     other.machine = "N";
     record({surveyed("a"), other});
     EXPECT_EQ((Lines{"machine listing_failed N"}), events(record({surveyed("a")}, {"N"})));
+    EXPECT_EQ((Lines{"machine listing_recovered N"}), events(record({surveyed("a"), other})));
+}
+
+// The history command's table of machine listings shows it, as the JUnit
+// file and the report word the failure.
+TEST_F(HistoryChangeRecorder, FailedListingsEventCarriesTheCommandItsStatusAndTheMessage) {
+    record({surveyed("a")});
+    long long const run = record({}, {"M"});
+    EXPECT_EQ(_db.execAndGet("SELECT group_concat(kind || ': ' || coalesce(reason, 'null'), '; ')"
+                             " FROM events WHERE run_id = " +
+                             std::to_string(run))
+                  .getString(),
+              "listing_failed: lspartition exited with status 1: system busy");
+}
+
+// The listing failure hides whether the partition came back in that run or
+// in this one, not that it came back: the run before the failure did not
+// list it.
+TEST_F(HistoryChangeRecorder, PartitionGoneBeforeAListingFailureAppearsWhenListedAgain) {
+    Partition gone = surveyed("c");
+    gone.machine = "N";
+    Partition staying = surveyed("d");
+    staying.machine = "N";
+    record({gone, staying});
+    EXPECT_EQ((Lines{"partition disappeared N c"}), events(record({staying})));
+    EXPECT_EQ((Lines{"machine listing_failed N"}), events(record({}, {"N"})));
+    EXPECT_EQ((Lines{"machine listing_recovered N", "partition appeared N c"}),
+              events(record({gone, staying})));
+}
+
+// Its partitions were never listed before: they are new.
+TEST_F(HistoryChangeRecorder, PartitionsOfANewMachineWhoseFirstListingFailedAppearOnceListed) {
+    Partition other = surveyed("c");
+    other.machine = "N";
+    record({surveyed("a")});
+    EXPECT_EQ((Lines{"machine appeared N", "machine listing_failed N"}),
+              events(record({surveyed("a")}, {"N"})));
+    EXPECT_EQ((Lines{"machine listing_recovered N", "partition appeared N c"}),
+              events(record({surveyed("a"), other})));
+}
+
+// The console's first run listed nothing of the machine: there is nothing
+// to compare its partitions with, as in a console's first run.
+TEST_F(HistoryChangeRecorder, PartitionsListedAfterAListingFailedInTheConsolesFirstRunDoNotAppear) {
+    Partition other = surveyed("c");
+    other.machine = "N";
+    record({surveyed("a")}, {"N"});
     EXPECT_EQ((Lines{"machine listing_recovered N"}), events(record({surveyed("a"), other})));
 }
 

@@ -110,20 +110,25 @@ void insertMachineEvents(SQLite::Database& db, RunPair const& runs) {
     if (!runs.previous) {
         return;
     }
+    // A failed listing's reason reads as the run's other outputs (the JUnit
+    // file, the report) tell it: "<command> exited with status N: <message>".
     executeForRuns(
         db,
         "WITH " + previousRecords() +
-            "INSERT INTO events (run_id, scope, kind, machine)"
-            " SELECT :run, 'machine', kind, machine FROM ("
-            "  SELECT machine, 'appeared' AS kind, 0 AS rank FROM previous"
+            "INSERT INTO events (run_id, scope, kind, machine, reason)"
+            " SELECT :run, 'machine', kind, machine, reason FROM ("
+            "  SELECT machine, 'appeared' AS kind, 0 AS rank, NULL AS reason FROM previous"
             "   WHERE listed AND run_id IS NULL"
-            "  UNION ALL SELECT machine, 'disappeared', 1 FROM previous WHERE NOT listed"
-            "  UNION ALL SELECT c.machine, 'listing_failed', 2 FROM machine_results AS c"
+            "  UNION ALL SELECT machine, 'disappeared', 1, NULL FROM previous WHERE NOT listed"
+            "  UNION ALL SELECT c.machine, 'listing_failed', 2,"
+            "   json_extract(c.listing_failure, '$.command') || ' exited with status ' ||"
+            "   json_extract(c.listing_failure, '$.exit_status') || ': ' ||"
+            "   json_extract(c.listing_failure, '$.message') FROM machine_results AS c"
             "   JOIN previous AS m ON m.machine = c.machine AND m.listed"
             "   LEFT JOIN machine_results AS p ON p.run_id = m.run_id AND p.machine = c.machine"
             "   WHERE c.run_id = :run AND c.listing_failure IS NOT NULL"
             "     AND p.listing_failure IS NULL"
-            "  UNION ALL SELECT c.machine, 'listing_recovered', 3 FROM machine_results AS c"
+            "  UNION ALL SELECT c.machine, 'listing_recovered', 3, NULL FROM machine_results AS c"
             "   JOIN previous AS m ON m.machine = c.machine AND m.listed"
             "   JOIN machine_results AS p ON p.run_id = m.run_id AND p.machine = c.machine"
             "   WHERE c.run_id = :run AND c.listing_failure IS NULL"
@@ -135,15 +140,17 @@ void insertMachineEvents(SQLite::Database& db, RunPair const& runs) {
 namespace {
 
 // Each partition of the run with its record in its machine's previous
-// record: whether it had one, whether the machine's listing failed there,
-// whether it was failing there (an interrupted record carries the state
-// before it), and its outcome there, or the last one before that run when it
-// was interrupted.
+// record: whether it had one, whether the machine's listing failed there
+// and, if so, whether the partition was listed by the machine's latest
+// earlier listing that did not fail (a machine whose every listing failed
+// counts as listed when it was there from the console's first run), whether
+// it was failing there (an interrupted record carries the state before it),
+// and its outcome there, or the last one before that run when it was
+// interrupted.
 std::string partitionPairs() {
     return "WITH " + previousRecords() +
            ", pairs AS (SELECT c.machine, c.partition, c.outcome, c.reason,"
            "  c.failing_since_run, c.runs_failing, p.partition IS NOT NULL AS known,"
-           "  pm.listing_failure IS NOT NULL AS listing_failed_before,"
            "  p.failing_since_run AS was_failing_since,"
            "  CASE WHEN p.outcome = " +
            interrupted() +
@@ -152,7 +159,17 @@ std::string partitionPairs() {
            "    WHERE x.machine = c.machine AND x.partition = c.partition AND x.run_id < :run"
            "      AND r.console = :console AND x.outcome <> " +
            interrupted() +
-           "    ORDER BY x.run_id DESC LIMIT 1) ELSE p.outcome END AS was_outcome"
+           "    ORDER BY x.run_id DESC LIMIT 1) ELSE p.outcome END AS was_outcome,"
+           "  pm.listing_failure IS NOT NULL AND coalesce((SELECT EXISTS (SELECT 1"
+           "    FROM partition_results AS y WHERE y.run_id = s.id AND y.machine = c.machine"
+           "      AND y.partition = c.partition)"
+           "    FROM (SELECT max(x.run_id) AS id FROM machine_results AS x"
+           "      JOIN runs AS r ON r.id = x.run_id WHERE x.machine = c.machine"
+           "        AND x.run_id < :run AND r.console = :console AND x.listing_failure IS NULL)"
+           "      AS s WHERE s.id IS NOT NULL),"
+           "   (SELECT min(x.run_id) FROM machine_results AS x JOIN runs AS r ON r.id = x.run_id"
+           "     WHERE x.machine = c.machine AND r.console = :console) ="
+           "   (SELECT min(id) FROM runs WHERE console = :console)) AS listed_before_failure"
            " FROM partition_results AS c JOIN previous AS m ON m.machine = c.machine AND m.listed"
            " LEFT JOIN machine_results AS pm ON pm.run_id = m.run_id AND pm.machine = c.machine"
            " LEFT JOIN partition_results AS p"
@@ -174,7 +191,7 @@ std::string partitionEvents() {
            " FROM (SELECT " +
            columns +
            "NULL AS since, NULL AS count, 'appeared' AS kind,"
-           "  0 AS rank FROM pairs WHERE NOT known AND NOT listing_failed_before"
+           "  0 AS rank FROM pairs WHERE NOT known AND NOT listed_before_failure"
            " UNION ALL SELECT " +
            columns +
            "failing_since_run, runs_failing, 'newly_failing', 1"
