@@ -319,13 +319,9 @@ bool areOutputsWritable(fleet::Options const& options) {
     return failures.empty();
 }
 
-} // namespace
-
-int main(int argc, char** argv) {
-    auto const parsed = fleet::parseCommandLine(argc, argv);
-    if (parsed.exitStatus) {
-        return *parsed.exitStatus;
-    }
+// The exit status of the subcommand given, which surveys nothing; nullopt
+// for a survey.
+std::optional<int> runSubcommand(fleet::ParsedCommandLine const& parsed) {
     if (parsed.reportRequest) {
         return report::runReportSubcommand(*parsed.reportRequest, std::cout, std::cerr);
     }
@@ -335,6 +331,19 @@ int main(int argc, char** argv) {
     }
     if (parsed.estateRequest) {
         return estate::runEstateSubcommand(*parsed.estateRequest, std::cout, std::cerr);
+    }
+    return std::nullopt;
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    auto const parsed = fleet::parseCommandLine(argc, argv);
+    if (parsed.exitStatus) {
+        return *parsed.exitStatus;
+    }
+    if (std::optional<int> const status = runSubcommand(parsed)) {
+        return *status;
     }
     for (auto const& warning : parsed.warnings) {
         std::cerr << warning << std::endl;

@@ -66,8 +66,8 @@ constexpr std::array<EventGroup, 8> gc_Groups{{
 }};
 
 bool belongs(EventGroup const& group, Event const& event) {
-    std::string const& scope = event[Scope].get_ref<std::string const&>();
-    std::string const& kind = event[Kind].get_ref<std::string const&>();
+    auto const& scope = event[Scope].get_ref<std::string const&>();
+    auto const& kind = event[Kind].get_ref<std::string const&>();
     bool const scopeFits = *group.scope == '\0' || scope == group.scope;
     bool const kindFits = *group.kind == '\0' || kind == group.kind || kind == group.otherKind;
     return scopeFits && kindFits;

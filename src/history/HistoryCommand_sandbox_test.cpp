@@ -137,7 +137,7 @@ TEST(HistoryCommand, AnotherProgramsDatabaseExits65) {
 
 TEST(HistoryCommand, BadCommandLinesExit64WithTheirReason) {
     ExampleHistory example;
-    std::string const file = example.path();
+    std::string const& file = example.path();
     struct Refusal {
         std::vector<std::string> arguments;
         std::string message;
