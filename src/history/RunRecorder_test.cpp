@@ -9,6 +9,7 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace {
@@ -60,8 +61,8 @@ protected:
     long long _record(report::RunSummary const& summary, nlohmann::ordered_json document = {}) {
         SQLite::Transaction transaction(_database.connection(),
                                         SQLite::TransactionBehavior::IMMEDIATE);
-        long long const runId =
-            history::RunRecorder(_database.connection()).record(summary, document, 1700000500);
+        long long const runId = history::RunRecorder(_database.connection())
+                                    .record(summary, std::move(document), 1700000500);
         transaction.commit();
         return runId;
     }
@@ -108,10 +109,10 @@ TEST_F(RunRecorderTest, PartitionRowsNamedByHostWithTheDerivedColumnsLeftEmpty) 
     _record(twoMachines());
     EXPECT_EQ(_rows("SELECT * FROM partition_results ORDER BY partition"),
               (std::vector<std::string>{
-                  "1|9119-MHE_21ABCDE|app1|-|10.0.0.4|timed_out|Failed|stopped by the time "
-                  "limit|-|-|none|-|-|-|-|-",
-                  "1|9119-MHE_21ABCDE|db1|3|10.0.0.3|surveyed|Ok|-|2.5|/var/adm/quorvex/VPD/"
-                  "x-3.VPD.xml|none|-|-|-|-|-",
+                  std::string("1|9119-MHE_21ABCDE|app1|-|10.0.0.4|timed_out|Failed|") +
+                      "stopped by the time limit|-|-|none|-|-|-|-|-",
+                  std::string("1|9119-MHE_21ABCDE|db1|3|10.0.0.3|surveyed|Ok|-|2.5|") +
+                      "/var/adm/quorvex/VPD/x-3.VPD.xml|none|-|-|-|-|-",
                   "1|9119-MHE_21ABCDE|db1 #2|-|10.0.0.3|interrupted|Failed|-|-|-|none|-|-|-|-|-",
                   "1|9119-MHE_21ABCDE|web|-|10.0.0.3|inactive|Failed|-|-|-|none|-|-|-|-|-",
                   "1|9119-MHE_21ABCDE|x|-|10.0.0.1|worker_died|Failed|-|-|-|none|-|-|-|-|-"}));
