@@ -7,6 +7,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <sstream>
 
 namespace {
@@ -68,10 +69,12 @@ std::vector<std::string> recordedConsoles(std::string const& historyFile) {
 
 // The console's entry of estate.json by its inventory name.
 nlohmann::json const& consoleEntry(nlohmann::json const& estate, std::string const& name) {
-    for (nlohmann::json const& console : estate["consoles"]) {
-        if (console["console"] == name) {
-            return console;
-        }
+    nlohmann::json const& consoles = estate["consoles"];
+    auto const found =
+        std::find_if(consoles.begin(), consoles.end(),
+                     [&name](nlohmann::json const& console) { return console["console"] == name; });
+    if (found != consoles.end()) {
+        return *found;
     }
     throw std::runtime_error("no console " + name + " in estate.json");
 }

@@ -7,6 +7,8 @@
 
 #include <nlohmann/json.hpp>
 
+#include <algorithm>
+#include <iterator>
 #include <unordered_map>
 
 namespace estate {
@@ -29,10 +31,11 @@ std::string textOf(nlohmann::ordered_json const& value) {
 
 Json outcomeTable() {
     Json outcomes = Json::array();
-    for (report::OutcomeText const& row : report::outcomeTable()) {
-        outcomes.push_back(
-            {row.name, row.label, row.pageClass, report::isFailure(row.outcome) ? 1 : 0});
-    }
+    std::transform(
+        report::outcomeTable().begin(), report::outcomeTable().end(), std::back_inserter(outcomes),
+        [](report::OutcomeText const& row) {
+            return Json{row.name, row.label, row.pageClass, report::isFailure(row.outcome) ? 1 : 0};
+        });
     outcomes.push_back(
         {report::gc_ListingFailedName, report::gc_ListingFailedLabel, "listing-failed", 1});
     return outcomes;

@@ -32,9 +32,9 @@ void RunHistory::record(report::RunSummary summary) {
         }
         _record->recorded = true;
         _record->error.reset();
-    } catch (std::exception const& failure) {
+    } catch (std::exception const& refusal) {
         _record->recorded = false;
-        _record->error = failure.what();
+        _record->error = refusal.what();
     }
 }
 

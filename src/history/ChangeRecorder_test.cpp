@@ -110,9 +110,9 @@ protected:
         std::vector<std::string> lines;
         while (select.executeStep()) {
             std::string line;
-            for (int column = 0; column < select.getColumnCount(); ++column) {
-                if (!select.getColumn(column).isNull()) {
-                    line += (line.empty() ? "" : " ") + select.getColumn(column).getString();
+            for (int index = 0; index < select.getColumnCount(); ++index) {
+                if (!select.getColumn(index).isNull()) {
+                    line += (line.empty() ? "" : " ") + select.getColumn(index).getString();
                 }
             }
             lines.push_back(line);
@@ -480,8 +480,6 @@ TEST_F(HistoryChangeRecorder, ComponentsCompareWithTheLastReadableInventoryAcros
 }
 
 TEST_F(HistoryChangeRecorder, DocumentsAreRecordedWithTheirInventoryState) {
-    Partition gone = surveyed("d");
-    gone.document = std::nullopt;
     long long const run = record({surveyed("a"), failing("b"), inactive("c")});
     EXPECT_EQ("read", column(run, "a", "inventory"));
     EXPECT_EQ("null", column(run, "a", "inventory_problem"));
@@ -508,7 +506,9 @@ TEST_F(HistoryChangeRecorder, DocumentGoneFromTheFolderIsMissingWithItsCause) {
 
 struct Malformed {
     char const* name;
+    // cppcheck-suppress unusedStructMember ; read through GetParam()
     std::string text;
+    // cppcheck-suppress unusedStructMember ; read through GetParam()
     char const* problem;
 };
 

@@ -3,6 +3,7 @@
 #include "history/DisplayText.h"
 
 #include <algorithm>
+#include <iterator>
 #include <numeric>
 
 namespace history {
@@ -59,9 +60,8 @@ std::string FittedTable::text(std::size_t width, std::string const& indent) cons
 
 std::vector<std::size_t> FittedTable::_naturalWidths() const {
     std::vector<std::size_t> widths;
-    for (TableColumn const& column : _columns) {
-        widths.push_back(displayWidth(column.header));
-    }
+    std::transform(_columns.begin(), _columns.end(), std::back_inserter(widths),
+                   [](TableColumn const& column) { return displayWidth(column.header); });
     for (std::vector<std::string> const& row : _rows) {
         for (std::size_t i = 0; i < row.size(); ++i) {
             widths[i] = std::max(widths[i], displayWidth(row[i]));

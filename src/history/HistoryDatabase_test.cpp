@@ -12,6 +12,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <random>
 #include <string>
 
@@ -47,7 +48,7 @@ report::RunSummary oneSurveyedPartition() {
 std::string refusalKeepingTheFile(std::string const& path) {
     std::string const before = QuorvexTest::readFile(path);
     std::optional<history::HistoryError> const refusal =
-        thrownBy<history::HistoryError>([&] { history::HistoryDatabase{path}; });
+        thrownBy<history::HistoryError>([&] { history::HistoryDatabase const opened(path); });
     EXPECT_EQ(QuorvexTest::readFile(path), before) << "the refused file was changed";
     return refusal ? refusal->what() : "(not refused)";
 }
@@ -94,9 +95,7 @@ TEST(HistoryDatabase, RandomBytesAreRefusedAndLeftAsTheyAre) {
     QuorvexTest::TemporaryDirectory const work;
     std::mt19937 bytes(20);
     std::string noise(8192, '\0');
-    for (char& byte : noise) {
-        byte = static_cast<char>(bytes());
-    }
+    std::generate(noise.begin(), noise.end(), [&bytes] { return static_cast<char>(bytes()); });
     QuorvexTest::writeFile(work.file("h.sqlite"), noise);
     EXPECT_EQ(refusalKeepingTheFile(work.file("h.sqlite")),
               "it is not a quorvex-survey history database (file is not a database); it was "

@@ -8,6 +8,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <numeric>
 #include <utility>
 
 namespace history {
@@ -43,13 +44,11 @@ void bindOptional(SQLite::Statement& statement, int index, std::optional<T> cons
 }
 
 long long failingCount(report::OutcomeCounts const& counts) {
-    long long failing = 0;
-    for (report::OutcomeText const& row : report::outcomeTable()) {
-        if (isFailing(row.outcome)) {
-            failing += counts.of(row.outcome);
-        }
-    }
-    return failing;
+    return std::accumulate(report::outcomeTable().begin(), report::outcomeTable().end(), 0LL,
+                           [&counts](long long failing, report::OutcomeText const& row) {
+                               return isFailing(row.outcome) ? failing + counts.of(row.outcome)
+                                                             : failing;
+                           });
 }
 
 // Compact: a summary of 1,000 partitions is a third smaller than indented.

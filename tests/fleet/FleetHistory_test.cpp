@@ -19,6 +19,7 @@
 #include <sys/stat.h>
 #include <sys/wait.h>
 
+#include <algorithm>
 #include <chrono>
 #include <csignal>
 #include <filesystem>
@@ -62,6 +63,11 @@ std::string oneSurveyedPartition() {
 long long countOf(std::string const& path, std::string const& query) {
     SQLite::Database database(path, SQLite::OPEN_READONLY);
     return database.execAndGet(query).getInt64();
+}
+
+// Makes the history database at path, as a first run would.
+void makeHistory(std::string const& path) {
+    history::HistoryDatabase const made(path);
 }
 
 // The whole database checked: SQLite's own check, and every recorded run
@@ -228,7 +234,7 @@ TEST_F(FleetHistory, ReadOnlyStateFolderEndsWith74AndEveryOtherOutputIsWritten) 
 // Root passes over file modes: the run goes without its capabilities.
 TEST_F(FleetHistory, ReadOnlyHistoryFileEndsWith74) {
     SimulatedConsole const console(oneSurveyedPartition());
-    history::HistoryDatabase{gc_DefaultHistory};
+    makeHistory(gc_DefaultHistory);
     ASSERT_EQ(::chmod(gc_DefaultHistory, 0444), 0);
     std::vector<std::string> prefix;
     if (hasCapabilities()) {
@@ -243,7 +249,7 @@ TEST_F(FleetHistory, ReadOnlyHistoryFileEndsWith74) {
 // Another process holds the write lock for longer than the run waits.
 TEST_F(FleetHistory, HistoryLockedPastTheTimeoutEndsWith74SayingAnotherProcessHoldsIt) {
     SimulatedConsole const console(oneSurveyedPartition());
-    history::HistoryDatabase{gc_DefaultHistory};
+    makeHistory(gc_DefaultHistory);
     SQLite::Database holder(gc_DefaultHistory, SQLite::OPEN_READWRITE);
     holder.exec("BEGIN IMMEDIATE");
     SurveyProcess survey = _start({gc_Identity});
@@ -259,9 +265,7 @@ TEST_F(FleetHistory, CorruptHistoryIsRefusedLeftAsItIsAndEndsWith74) {
     SimulatedConsole const console(oneSurveyedPartition());
     std::mt19937 bytes(74);
     std::string noise(16384, '\0');
-    for (char& byte : noise) {
-        byte = static_cast<char>(bytes());
-    }
+    std::generate(noise.begin(), noise.end(), [&bytes] { return static_cast<char>(bytes()); });
     QuorvexTest::writeFile(gc_DefaultHistory, noise);
     _expectNotRecorded(_run({gc_Identity}), gc_DefaultHistory,
                        "it is not a quorvex-survey history database (file is not a database); "
@@ -316,20 +320,23 @@ bool waitForEnding(std::string const& path, std::string const& text) {
 TEST_F(FleetHistory, TwoRunsRecordedAtOnceAreBothRecorded) {
     SimulatedConsole const console(oneSurveyedPartition());
     std::string const file = _work.file("shared/history.sqlite");
-    history::HistoryDatabase{file};
+    makeHistory(file);
     SQLite::Database holder(file, SQLite::OPEN_READWRITE);
     holder.exec("BEGIN IMMEDIATE");
-    std::vector<std::string> other{QuorvexTest::sandboxPath(), "--sim",
-                                   QuorvexTest::simulatorPath(), "--bind",
-                                   _work.path() + ":" + _work.path()};
-    other.push_back("--bind");
-    other.push_back(console.directory() + ":" + console.directory());
-    other.push_back("--");
-    for (std::string const& argument :
-         {FleetTest::consoleWideTool(), std::string("--history"), file, std::string("--summary"),
-          _work.file("other.json"), std::string(gc_Identity)}) {
-        other.push_back(argument);
-    }
+    std::vector<std::string> const other{QuorvexTest::sandboxPath(),
+                                         "--sim",
+                                         QuorvexTest::simulatorPath(),
+                                         "--bind",
+                                         _work.path() + ":" + _work.path(),
+                                         "--bind",
+                                         console.directory() + ":" + console.directory(),
+                                         "--",
+                                         FleetTest::consoleWideTool(),
+                                         "--history",
+                                         file,
+                                         "--summary",
+                                         _work.file("other.json"),
+                                         gc_Identity};
     SurveyProcess second(other, _work.file("other.out"), _work.file("other.err"));
     ASSERT_TRUE(waitForEnding(_work.file("other.err"), gc_SurveyedBlock));
     SurveyProcess first = _start({"--history", file, gc_Identity});

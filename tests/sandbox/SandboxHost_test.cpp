@@ -345,8 +345,8 @@ TEST(SandboxHost, UnprivilegedCallerGetsASandboxEvenFromAPrivateCheckout) {
     CommandResult const run =
         runCommand({"/usr/bin/setpriv", "--reuid=65534", "--regid=65534", "--clear-groups",
                     "/usr/bin/env", "-C", "/", sandbox, "--sim", simulator, "--", "sh", "-c",
-                    "test -d /var/adm/quorvex/VPD && test -x /usr/bin/runact-api && "
-                    "touch /var/lib/quorvex-survey/history.sqlite"});
+                    std::string("test -d /var/adm/quorvex/VPD && test -x /usr/bin/runact-api") +
+                        " && touch /var/lib/quorvex-survey/history.sqlite"});
     if (run.exitStatus == QuorvexTest::gc_SandboxUnavailable) {
         GTEST_SKIP() << run.stderrText;
     }

@@ -42,7 +42,7 @@ SQLite::Database& HistoryFixture::database() {
 
 long long HistoryFixture::addRun(std::string const& console, std::string const& started,
                                  std::string const& ended, int partitions, int surveyed, int failed,
-                                 Number exitStatus, Text interrupted) {
+                                 Number exitStatus, Text const& interrupted) {
     SQLite::Statement insert(
         _database, "INSERT INTO runs (console, tool, started, ended, started_unix, recorded_unix,"
                    " exit_status, return_code, interrupted, partitions, surveyed, failed, summary)"
@@ -62,7 +62,7 @@ long long HistoryFixture::addRun(std::string const& console, std::string const& 
 
 void HistoryFixture::addPartition(long long run, std::string const& machine,
                                   std::string const& partition, std::string const& outcome,
-                                  Text reason, Number failingSinceRun, Number runsFailing,
+                                  Text const& reason, Number failingSinceRun, Number runsFailing,
                                   std::string const& inventory) {
     // The run listed the partition's machine.
     SQLite::Statement machineRow(_database, "INSERT OR IGNORE INTO machine_results (run_id,"
@@ -87,21 +87,22 @@ void HistoryFixture::addPartition(long long run, std::string const& machine,
 
 void HistoryFixture::addPartitionEvent(long long run, std::string const& kind,
                                        std::string const& machine, std::string const& partition,
-                                       Text outcome, Text reason, Number failingSinceRun,
-                                       Number runsFailing) {
+                                       Text const& outcome, Text const& reason,
+                                       Number failingSinceRun, Number runsFailing) {
     _addEvent(run, "partition", kind, machine, {partition, {}, {}, {}, {}, {}, outcome, reason},
               failingSinceRun, runsFailing);
 }
 
 void HistoryFixture::addMachineEvent(long long run, std::string const& kind,
-                                     std::string const& machine, Text reason) {
+                                     std::string const& machine, Text const& reason) {
     _addEvent(run, "machine", kind, machine, {{}, {}, {}, {}, {}, {}, {}, reason}, {}, {});
 }
 
 void HistoryFixture::addComponentEvent(long long run, std::string const& kind,
                                        std::string const& machine, std::string const& partition,
                                        std::string const& component, std::string const& name,
-                                       Text property, Text oldValue, Text newValue) {
+                                       Text const& property, Text const& oldValue,
+                                       Text const& newValue) {
     _addEvent(run, "component", kind, machine,
               {partition, component, name, property, oldValue, newValue, {}, {}}, {}, {});
 }

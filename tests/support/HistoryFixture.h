@@ -26,23 +26,24 @@ public:
     // A run of console; started_unix is read from started. Returns its id.
     long long addRun(std::string const& console, std::string const& started,
                      std::string const& ended, int partitions, int surveyed, int failed,
-                     Number exitStatus = 0, Text interrupted = {});
+                     Number exitStatus = 0, Text const& interrupted = {});
     // Adds the partition's result, and its machine's when the run has none.
     void addPartition(long long run, std::string const& machine, std::string const& partition,
-                      std::string const& outcome = "surveyed", Text reason = {},
+                      std::string const& outcome = "surveyed", Text const& reason = {},
                       Number failingSinceRun = {}, Number runsFailing = {},
                       std::string const& inventory = "read");
     void addPartitionEvent(long long run, std::string const& kind, std::string const& machine,
-                           std::string const& partition, Text outcome = {}, Text reason = {},
-                           Number failingSinceRun = {}, Number runsFailing = {});
+                           std::string const& partition, Text const& outcome = {},
+                           Text const& reason = {}, Number failingSinceRun = {},
+                           Number runsFailing = {});
     void addMachineEvent(long long run, std::string const& kind, std::string const& machine,
-                         Text reason = {});
+                         Text const& reason = {});
     // old and new: the serial numbers of "replaced", the values of
     // "property_changed".
     void addComponentEvent(long long run, std::string const& kind, std::string const& machine,
                            std::string const& partition, std::string const& component,
-                           std::string const& name, Text property = {}, Text oldValue = {},
-                           Text newValue = {});
+                           std::string const& name, Text const& property = {},
+                           Text const& oldValue = {}, Text const& newValue = {});
 
 private:
     // The columns of the events table from partition on, in its order.
