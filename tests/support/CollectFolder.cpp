@@ -50,10 +50,10 @@ void CollectFolder::addBundle(std::string const& console, std::string const& sum
     writeFile(bundle + "/bundle.json", meta.dump() + "\n");
     writeFile(bundle + "/summary.json", summary);
     for (std::string const& document : documents) {
-        std::string path = bundle;
-        path += "/VPD/";
-        path += document;
-        writeFile(path, "<doc/>");
+        std::string documentPath = bundle;
+        documentPath += "/VPD/";
+        documentPath += document;
+        writeFile(documentPath, "<doc/>");
     }
 }
 
