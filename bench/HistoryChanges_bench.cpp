@@ -6,6 +6,7 @@
 //   history_changes_bench change DIR     second round: a few documents change
 //   history_changes_bench ingest DIR DB  records one run per console
 #include "history/ChangeRecorder.h"
+#include "history/HistoryDatabase.h"
 #include "utility/FileText.h"
 #include "utility/SystemError.h"
 
@@ -228,20 +229,11 @@ private:
     }
 };
 
-void openSchema(SQLite::Database& db) {
-    db.exec("PRAGMA journal_mode = WAL; PRAGMA synchronous = NORMAL; PRAGMA foreign_keys = ON");
-    if (db.execAndGet("PRAGMA user_version").getInt() == 0) {
-        SQLite::Transaction transaction(db);
-        db.exec(util::readWholeFile(QUORVEX_SCHEMA_FILE));
-        db.exec("PRAGMA user_version = 1");
-        transaction.commit();
-    }
-}
-
 void ingest(std::string const& dir, std::string const& file) {
     int const round = std::stoi(util::readWholeFile(dir + "/round"));
-    SQLite::Database db(file, SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE);
-    openSchema(db);
+    // Opened as quorvex-survey opens it: the same pragmas and schema.
+    history::HistoryDatabase history(file);
+    SQLite::Database& db = history.connection();
     auto const start = std::chrono::steady_clock::now();
     RunRows rows(db);
     for (int console = 0; console < gc_Consoles; ++console) {

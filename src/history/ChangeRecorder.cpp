@@ -3,6 +3,7 @@
 #include "history/ComponentEvents.h"
 #include "history/DocumentIngest.h"
 #include "history/InventoryState.h"
+#include "history/KnownDocuments.h"
 #include "history/PartitionChanges.h"
 #include "history/RunPair.h"
 
@@ -13,7 +14,6 @@
 #include <optional>
 #include <stdexcept>
 #include <thread>
-#include <unordered_set>
 #include <utility>
 #include <vector>
 
@@ -47,23 +47,6 @@ std::string baseName(std::string const& path) {
     return slash == std::string::npos ? path : path.substr(slash + 1);
 }
 
-// The contents of the machines' previous records: the documents that may
-// not have changed. A content held for other runs only is read again, and
-// its row is kept as it is.
-std::unordered_set<std::string> knownHashes(SQLite::Database& db, RunPair const& runs) {
-    std::unordered_set<std::string> hashes;
-    SQLite::Statement select(db, "WITH " + previousRecords() +
-                                     "SELECT DISTINCT p.document_hash FROM previous AS m"
-                                     " JOIN partition_results AS p"
-                                     "  ON p.run_id = m.run_id AND p.machine = m.machine"
-                                     " WHERE m.listed AND p.document_hash IS NOT NULL");
-    bindRuns(select, runs);
-    while (select.executeStep()) {
-        hashes.insert(select.getColumn(0).getString());
-    }
-    return hashes;
-}
-
 unsigned readingThreads() {
     return std::max(1U, std::thread::hardware_concurrency());
 }
@@ -75,13 +58,9 @@ public:
     DocumentWriter(SQLite::Database& db, long long runId)
         : _insertDocument(db, "INSERT OR IGNORE INTO documents (hash, inventory, problem,"
                               " components) VALUES (?, ?, ?, ?)"),
-          _setRead(db, "UPDATE partition_results SET document_hash = ?5, inventory = ?6,"
-                       " inventory_problem = ?7"
-                       " WHERE run_id = ?2 AND machine = ?3 AND partition = ?4"),
-          _setKnown(db, "UPDATE partition_results SET document_hash = ?5,"
-                        " (inventory, inventory_problem) = (SELECT inventory, problem"
-                        "  FROM documents WHERE hash = ?5)"
-                        " WHERE run_id = ?2 AND machine = ?3 AND partition = ?4"),
+          _setInventory(db, "UPDATE partition_results SET document_hash = ?5, inventory = ?6,"
+                            " inventory_problem = ?7"
+                            " WHERE run_id = ?2 AND machine = ?3 AND partition = ?4"),
           _setMissing(db, std::string("UPDATE partition_results SET inventory = '") +
                               gc_InventoryMissing +
                               "', inventory_problem = ?5"
@@ -89,7 +68,7 @@ public:
           _runId(runId) {}
 
     // A content read now gives the partition's inventory at once; one held
-    // already takes it from its row.
+    // already gives what reading it gave before.
     void write(DocumentRow const& row, DocumentIngestResult&& result) {
         if (result.hash.empty()) {
             _bindRow(_setMissing, row);
@@ -97,26 +76,28 @@ public:
             _execute(_setMissing);
             return;
         }
-        if (!result.reading) {
-            _bindRow(_setKnown, row);
-            _setKnown.bind(5, result.hash);
-            _execute(_setKnown);
+        if (result.known != nullptr) {
+            _setInventoryOf(row, result.hash, result.known->inventory, result.known->problem);
             return;
         }
         _insert(result);
-        _bindRow(_setRead, row);
-        _setRead.bind(5, result.hash);
-        _setRead.bind(6, result.reading->inventory);
-        _bindProblem(_setRead, 7, result.reading->problem);
-        _execute(_setRead);
+        _setInventoryOf(row, result.hash, result.reading->inventory, result.reading->problem);
     }
 
 private:
     SQLite::Statement _insertDocument;
-    SQLite::Statement _setRead;
-    SQLite::Statement _setKnown;
+    SQLite::Statement _setInventory;
     SQLite::Statement _setMissing;
     long long _runId;
+
+    void _setInventoryOf(DocumentRow const& row, std::string const& hash,
+                         std::string const& inventory, std::optional<std::string> const& problem) {
+        _bindRow(_setInventory, row);
+        _setInventory.bind(5, hash);
+        _setInventory.bind(6, inventory);
+        _bindProblem(_setInventory, 7, problem);
+        _execute(_setInventory);
+    }
 
     void _insert(DocumentIngestResult const& result) {
         _insertDocument.bind(1, result.hash);
@@ -172,7 +153,7 @@ void ChangeRecorder::_readDocuments(SQLite::Database& db, RunPair const& runs) c
         rows.push_back({select.getColumn(0).getString(), select.getColumn(1).getString()});
         paths.push_back(_documentFolder + "/" + baseName(select.getColumn(2).getString()));
     }
-    std::unordered_set<std::string> const known = knownHashes(db, runs);
+    KnownDocuments const known = KnownDocuments::ofPreviousRecords(db, runs);
     DocumentWriter writer(db, runId);
     DocumentIngest(known, readingThreads())
         .run(paths, [&](std::size_t index, DocumentIngestResult&& result) {

@@ -358,13 +358,13 @@ TEST_F(HistoryChangeRecorder, ComponentsCompareWithTheMachinesPreviousRecord) {
               events(record({surveyed("a", "FW2"), other})));
 }
 
-// A document the machine's previous record holds is taken from its row,
-// though the console's latest run did not list the machine.
+// A document the machine's previous record holds takes what reading it gave
+// there, though the console's latest run did not list the machine.
 TEST_F(HistoryChangeRecorder, DocumentOfTheMachinesPreviousRecordIsNotReadAgain) {
     Partition const other = onOtherMachine(surveyed("c"));
     record({surveyed("a"), other});
     recordNamed({other});
-    _db.exec("UPDATE documents SET problem = 'kept'");
+    _db.exec("UPDATE partition_results SET inventory_problem = 'kept'");
     long long const run = record({surveyed("a"), other});
     EXPECT_EQ("kept", column(run, "a", "inventory_problem"));
 }
@@ -574,9 +574,10 @@ TEST_F(HistoryChangeRecorder, DefaultDocumentIsNoInventoryAndBringsNoComponentEv
 TEST_F(HistoryChangeRecorder, UnchangedDocumentIsStoredOnceAndNotReadAgain) {
     record({surveyed("a"), surveyed("b")});
     EXPECT_EQ(2, count("documents"));
-    // The stored reading is what a run uses for a content it holds: were the
-    // document read again, its inventory would say "read".
-    _db.exec("UPDATE documents SET inventory = 'unreadable', problem = 'kept'");
+    // What the previous run's reading gave is what a run uses for a content
+    // it holds: were the document read again, its inventory would say "read".
+    _db.exec("UPDATE partition_results SET inventory = 'unreadable',"
+             " inventory_problem = 'kept'");
     long long const run = record({surveyed("a"), surveyed("b")});
     EXPECT_EQ(2, count("documents"));
     EXPECT_EQ("unreadable", column(run, "a", "inventory"));

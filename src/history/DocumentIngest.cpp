@@ -7,6 +7,7 @@
 #include "utility/FileText.h"
 #include "utility/SystemError.h"
 
+#include <algorithm>
 #include <atomic>
 #include <condition_variable>
 #include <deque>
@@ -14,6 +15,7 @@
 #include <mutex>
 #include <thread>
 #include <utility>
+#include <vector>
 
 namespace history {
 
@@ -22,9 +24,11 @@ namespace {
 // Below this many documents one thread reads them all: starting threads
 // would cost more than it saves.
 constexpr std::size_t gc_DocumentsPerThread = 64;
-// Readings waiting for the database at most, so that memory stays bounded
-// however many documents a run has.
-constexpr std::size_t gc_WaitingResults = 256;
+// Documents a reading thread reads before it hands them over.
+constexpr std::size_t gc_BatchDocuments = 16;
+// Batches waiting for the database at most (256 readings), so that memory
+// stays bounded however many documents a run has.
+constexpr std::size_t gc_WaitingBatches = 16;
 
 DocumentIngestResult::Reading readingOf(std::string const& bytes) {
     inventory::DocumentReading const reading = inventory::readDocument(bytes);
@@ -41,25 +45,29 @@ DocumentIngestResult::Reading readingOf(std::string const& bytes) {
     return result;
 }
 
-// The results the reading threads hand over, and the first exception.
+// What a reading thread hands over at once: consecutive documents, so that
+// threads wake each other once per batch rather than once per document.
+using Batch = std::vector<std::pair<std::size_t, DocumentIngestResult>>;
+
+// The batches the reading threads hand over, and the first exception.
 class ResultQueue {
 public:
-    void push(std::size_t index, DocumentIngestResult&& result) {
+    void push(Batch&& batch) {
         std::unique_lock<std::mutex> lock(_mutex);
-        _roomLeft.wait(lock, [this] { return _results.size() < gc_WaitingResults || _stopped; });
-        _results.emplace_back(index, std::move(result));
+        _roomLeft.wait(lock, [this] { return _batches.size() < gc_WaitingBatches || _stopped; });
+        _batches.push_back(std::move(batch));
         _ready.notify_one();
     }
 
-    // False once every result was taken or the run stopped.
-    bool pop(std::size_t total, std::pair<std::size_t, DocumentIngestResult>& taken) {
+    // False once every batch was taken or the run stopped.
+    bool pop(std::size_t batches, Batch& taken) {
         std::unique_lock<std::mutex> lock(_mutex);
-        _ready.wait(lock, [&] { return !_results.empty() || _stopped || _taken == total; });
-        if (_stopped || _results.empty()) {
+        _ready.wait(lock, [&] { return !_batches.empty() || _stopped || _taken == batches; });
+        if (_stopped || _batches.empty()) {
             return false;
         }
-        taken = std::move(_results.front());
-        _results.pop_front();
+        taken = std::move(_batches.front());
+        _batches.pop_front();
         ++_taken;
         _roomLeft.notify_one();
         return true;
@@ -89,18 +97,29 @@ private:
     std::mutex _mutex;
     std::condition_variable _ready;
     std::condition_variable _roomLeft;
-    std::deque<std::pair<std::size_t, DocumentIngestResult>> _results;
+    std::deque<Batch> _batches;
     std::size_t _taken = 0;
     bool _stopped = false;
     std::exception_ptr _failure;
 };
 
+std::size_t batchCount(std::size_t documents) {
+    return (documents + gc_BatchDocuments - 1) / gc_BatchDocuments;
+}
+
 void readAll(DocumentIngest const& ingest, std::vector<std::string> const& paths,
-             std::atomic<std::size_t>& next, ResultQueue& queue) {
+             std::atomic<std::size_t>& nextBatch, ResultQueue& queue) {
     try {
-        for (std::size_t index = next++; index < paths.size() && !queue.isStopped();
-             index = next++) {
-            queue.push(index, ingest.ingest(paths[index]));
+        for (std::size_t batch = nextBatch++;
+             batch < batchCount(paths.size()) && !queue.isStopped(); batch = nextBatch++) {
+            std::size_t const first = batch * gc_BatchDocuments;
+            std::size_t const end = std::min(first + gc_BatchDocuments, paths.size());
+            Batch results;
+            results.reserve(end - first);
+            for (std::size_t index = first; index < end; ++index) {
+                results.emplace_back(index, ingest.ingest(paths[index]));
+            }
+            queue.push(std::move(results));
         }
     } catch (...) {
         queue.stop(std::current_exception());
@@ -109,8 +128,8 @@ void readAll(DocumentIngest const& ingest, std::vector<std::string> const& paths
 
 } // namespace
 
-DocumentIngest::DocumentIngest(std::unordered_set<std::string> const& knownHashes, unsigned threads)
-    : _knownHashes(knownHashes), _threads(threads == 0 ? 1 : threads) {}
+DocumentIngest::DocumentIngest(KnownDocuments const& known, unsigned threads)
+    : _known(known), _threads(threads == 0 ? 1 : threads) {}
 
 DocumentIngestResult DocumentIngest::ingest(std::string const& path) const {
     DocumentIngestResult result;
@@ -122,7 +141,8 @@ DocumentIngestResult DocumentIngest::ingest(std::string const& path) const {
         return result;
     }
     result.hash = contentHash(bytes);
-    if (_knownHashes.count(result.hash) == 0) {
+    result.known = _known.find(result.hash);
+    if (result.known == nullptr) {
         result.reading = readingOf(bytes);
     }
     return result;
@@ -136,16 +156,18 @@ void DocumentIngest::run(std::vector<std::string> const& paths, Delivery const& 
         return;
     }
     ResultQueue queue;
-    std::atomic<std::size_t> next{0};
+    std::atomic<std::size_t> nextBatch{0};
     std::vector<std::thread> readers;
-    std::pair<std::size_t, DocumentIngestResult> taken;
+    Batch taken;
     try {
         for (unsigned thread = 0; thread < _threads; ++thread) {
-            readers.emplace_back(readAll, std::cref(*this), std::cref(paths), std::ref(next),
+            readers.emplace_back(readAll, std::cref(*this), std::cref(paths), std::ref(nextBatch),
                                  std::ref(queue));
         }
-        while (queue.pop(paths.size(), taken)) {
-            deliver(taken.first, std::move(taken.second));
+        while (queue.pop(batchCount(paths.size()), taken)) {
+            for (auto& [index, result] : taken) {
+                deliver(index, std::move(result));
+            }
         }
     } catch (...) {
         queue.stop(std::current_exception());

@@ -1,10 +1,11 @@
 #pragma once
 
+#include "history/KnownDocuments.h"
+
 #include <cstddef>
 #include <functional>
 #include <optional>
 #include <string>
-#include <unordered_set>
 #include <vector>
 
 namespace history {
@@ -23,6 +24,8 @@ struct DocumentIngestResult {
     std::string hash;               // empty when the file could not be read
     std::string readFailure;        // "cannot read PATH: <errno text>"
     std::optional<Reading> reading; // none for a content already held
+    // What reading a content already held gave before; null otherwise.
+    KnownDocuments::Known const* known = nullptr;
 };
 
 // Reads the documents of a run: each file's bytes, their content hash, and
@@ -35,8 +38,8 @@ class DocumentIngest {
 public:
     using Delivery = std::function<void(std::size_t index, DocumentIngestResult&& result)>;
 
-    // knownHashes: contents held already, which are not read again.
-    DocumentIngest(std::unordered_set<std::string> const& knownHashes, unsigned threads);
+    // known: contents held already, which are not read again.
+    DocumentIngest(KnownDocuments const& known, unsigned threads);
 
     // Calls deliver once per path, with the path's index, in any order.
     // An exception of a reading thread or of deliver ends the whole run and
@@ -47,7 +50,7 @@ public:
     DocumentIngestResult ingest(std::string const& path) const;
 
 private:
-    std::unordered_set<std::string> const& _knownHashes;
+    KnownDocuments const& _known;
     unsigned _threads;
 };
 

@@ -27,7 +27,7 @@ std::vector<std::string> writtenDocuments(QuorvexTest::TemporaryDirectory const&
 TEST(HistoryDocumentIngest, EveryDocumentIsDeliveredOnceWithItsOwnHash) {
     QuorvexTest::TemporaryDirectory const folder;
     std::vector<std::string> const paths = writtenDocuments(folder, 1000);
-    std::unordered_set<std::string> const known;
+    history::KnownDocuments const known;
     std::vector<int> deliveries(paths.size());
     DocumentIngest(known, 2).run(paths, [&](std::size_t index, DocumentIngestResult&& result) {
         ++deliveries.at(index);
@@ -41,15 +41,19 @@ TEST(HistoryDocumentIngest, EveryDocumentIsDeliveredOnceWithItsOwnHash) {
 TEST(HistoryDocumentIngest, KnownContentIsNotRead) {
     QuorvexTest::TemporaryDirectory const folder;
     std::vector<std::string> const paths = writtenDocuments(folder, 1);
-    std::unordered_set<std::string> const known{history::contentHash("not xml 0")};
+    history::KnownDocuments known;
+    known.add(history::contentHash("not xml 0"), {"unreadable", "document unreadable at line 1"});
     DocumentIngestResult const result = DocumentIngest(known, 1).ingest(paths[0]);
     EXPECT_FALSE(result.reading);
     EXPECT_EQ(history::contentHash("not xml 0"), result.hash);
+    ASSERT_NE(nullptr, result.known);
+    EXPECT_EQ("unreadable", result.known->inventory);
+    EXPECT_EQ("document unreadable at line 1", result.known->problem);
 }
 
 TEST(HistoryDocumentIngest, FileThatCannotBeReadSaysWhy) {
     QuorvexTest::TemporaryDirectory const folder;
-    std::unordered_set<std::string> const known;
+    history::KnownDocuments const known;
     DocumentIngestResult const result = DocumentIngest(known, 1).ingest(folder.path());
     EXPECT_EQ("", result.hash);
     EXPECT_EQ("cannot read " + folder.path() + ": Is a directory", result.readFailure);
@@ -58,7 +62,7 @@ TEST(HistoryDocumentIngest, FileThatCannotBeReadSaysWhy) {
 TEST(HistoryDocumentIngest, FailureWhileDeliveringStopsTheReadersAndIsThrown) {
     QuorvexTest::TemporaryDirectory const folder;
     std::vector<std::string> const paths = writtenDocuments(folder, 1000);
-    std::unordered_set<std::string> const known;
+    history::KnownDocuments const known;
     std::size_t delivered = 0;
     EXPECT_THROW(DocumentIngest(known, 2).run(paths,
                                               [&](std::size_t, DocumentIngestResult&&) {

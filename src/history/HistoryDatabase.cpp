@@ -28,6 +28,13 @@ namespace {
 
 namespace fs = std::filesystem;
 
+// The page cache of the connection that records a run, in KiB (SQLite takes
+// a negative size as KiB). A run of a whole estate inserts its documents'
+// hashes at random places in two indexes: with SQLite's 2 MB default the
+// same pages are spilled to the WAL and read back again and again inside the
+// one transaction. The cache grows only as far as a run needs it.
+constexpr int gc_RecordingCacheKiB = 32768;
+
 // The folder and the file are made here, so that a failure carries errno's
 // text; SQLite says only "unable to open database file". The file is
 // opened for writing without being truncated: an existing one is left as
@@ -127,6 +134,7 @@ void HistoryDatabase::_prepare() {
     checkOwnership(_database);
     _database.exec("PRAGMA journal_mode = WAL");
     _database.exec("PRAGMA foreign_keys = ON");
+    _database.exec("PRAGMA cache_size = -" + std::to_string(gc_RecordingCacheKiB));
     migrate(_database);
 }
 

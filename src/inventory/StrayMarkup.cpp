@@ -21,24 +21,44 @@ constexpr std::string_view gc_Declaration = "<?xml";
 constexpr std::string_view gc_DeclarationEnd = "?>";
 constexpr std::size_t gc_None = std::string_view::npos;
 
+// What a byte can be, looked up once per byte: a document is scanned whole
+// for every reading, and most of its bytes are names, blanks and plain text.
+enum CharacterClass : unsigned char { gc_NameCharacter = 1, gc_Blank = 2, gc_Escaped = 4 };
+
+constexpr std::array<unsigned char, 256> gc_CharacterClasses = [] {
+    std::array<unsigned char, 256> classes{};
+    for (int c = 0; c < 256; ++c) {
+        bool const isName = (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') ||
+                            (c >= '0' && c <= '9') || c == '.' || c == '-' || c == '_' || c == ':';
+        bool const isBlank = c == ' ' || c == '\t' || c == '\n' || c == '\r';
+        bool const isEscaped = c == '&' || c == '<' || c == '>' || c == '"';
+        classes[c] =
+            static_cast<unsigned char>((isName ? gc_NameCharacter : 0) | (isBlank ? gc_Blank : 0) |
+                                       (isEscaped ? gc_Escaped : 0));
+    }
+    return classes;
+}();
+
+bool isOfClass(char c, CharacterClass wanted) {
+    return (gc_CharacterClasses[static_cast<unsigned char>(c)] & wanted) != 0;
+}
+
 bool isNameCharacter(char c) {
-    return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') || c == '.' ||
-           c == '-' || c == '_' || c == ':';
+    return isOfClass(c, gc_NameCharacter);
 }
 
 bool isBlank(char c) {
-    return c == ' ' || c == '\t' || c == '\n' || c == '\r';
-}
-
-bool isEscaped(char c) {
-    return c == '&' || c == '<' || c == '>' || c == '"';
+    return isOfClass(c, gc_Blank);
 }
 
 bool isElementName(std::string_view name) {
     return std::find(gc_ElementNames.begin(), gc_ElementNames.end(), name) != gc_ElementNames.end();
 }
 
-// Scans the document once, copying markup and escaping the text around it.
+// Scans the document once, escaping the text around its markup. The result
+// is the document with some characters replaced by their entities, so it is
+// built from the stretches between them: markup is never copied piece by
+// piece, and a document with nothing to escape is copied once.
 class Scan {
 public:
     explicit Scan(std::string_view document) : _in(document) {
@@ -51,6 +71,8 @@ private:
     std::string_view _in;
     std::size_t _at = 0;
     std::string _out;
+    // The document up to here is in _out.
+    std::size_t _copied = 0;
     // The raw display name of the begin tag copied last.
     std::string_view _displayName;
 
@@ -76,6 +98,7 @@ std::string Scan::run() {
             _escape(_at + 1);
         }
     }
+    _out.append(_in.substr(_copied));
     return std::move(_out);
 }
 
@@ -93,7 +116,6 @@ void Scan::_copyDeclaration() {
     }
     std::size_t const end = _in.find(gc_DeclarationEnd);
     _at = end == gc_None ? _in.size() : end + gc_DeclarationEnd.size();
-    _out.append(_in.substr(0, _at));
 }
 
 bool Scan::_copyEndTag() {
@@ -105,7 +127,6 @@ bool Scan::_copyEndTag() {
         !isElementName(_in.substr(_at + 2, end - _at - 2))) {
         return false;
     }
-    _out.append(_in.substr(_at, end + 1 - _at));
     _at = end + 1;
     return true;
 }
@@ -121,16 +142,13 @@ bool Scan::_copyStartTag() {
         (end < _in.size() && !isBlank(_in[end]) && _in[end] != '>' && _in[end] != '/')) {
         return false;
     }
-    _out.append(_in.substr(_at, end - _at));
     _at = end;
     while (_copyAttribute(name)) {
     }
     // The writer never writes the empty-element form; another writer may.
     if (_in.substr(_at, 2) == "/>") {
-        _out.append("/>");
         _at += 2;
     } else if (_at < _in.size() && _in[_at] == '>') {
-        _out += '>';
         ++_at;
         if (name == gc_ValueElement) {
             _copyValueText();
@@ -172,10 +190,8 @@ bool Scan::_copyAttribute(std::string_view element) {
     if (_in.substr(nameStart, nameEnd - nameStart) == gc_DisplayNameAttribute) {
         _displayName = _in.substr(nameEnd + 2, valueEnd - nameEnd - 2);
     }
-    _out.append(_in.substr(_at, nameEnd + 2 - _at));
     _at = nameEnd + 2;
     _escape(valueEnd);
-    _out += '"';
     _at = valueEnd + 1;
     return true;
 }
@@ -225,7 +241,6 @@ void Scan::_copyValueText() {
     std::size_t const end = _valueEnd();
     _escape(end);
     if (end < _in.size()) {
-        _out.append(gc_ValueEndTag);
         _at = end + gc_ValueEndTag.size();
     }
 }
@@ -247,20 +262,20 @@ std::size_t Scan::_valueEnd() const {
     return _in.size();
 }
 
-// Runs of plain bytes are copied whole: most of a document is plain.
+// The position is kept in a local: a member written on every byte is
+// stored on every byte, as the output string may alias it.
 void Scan::_escape(std::size_t end) {
-    while (_at < end) {
-        std::size_t special = _at;
-        while (special < end && !isEscaped(_in[special])) {
-            ++special;
-        }
-        _out.append(_in.substr(_at, special - _at));
-        _at = special;
-        if (_at < end) {
-            _out.append(util::htmlEntityOf(_in[_at]));
-            ++_at;
+    if (_at >= end) {
+        return;
+    }
+    for (std::size_t at = _at; at < end; ++at) {
+        if (isOfClass(_in[at], gc_Escaped)) {
+            _out.append(_in.substr(_copied, at - _copied));
+            _out.append(util::htmlEntityOf(_in[at]));
+            _copied = at + 1;
         }
     }
+    _at = end;
 }
 
 } // namespace
