@@ -33,7 +33,7 @@ namespace fs = std::filesystem;
 // hashes at random places in two indexes: with SQLite's 2 MB default the
 // same pages are spilled to the WAL and read back again and again inside the
 // one transaction. The cache grows only as far as a run needs it.
-constexpr int gc_RecordingCacheKiB = 32768;
+constexpr int gc_RecordingCacheKiB = 16384;
 
 // The folder and the file are made here, so that a failure carries errno's
 // text; SQLite says only "unable to open database file". The file is
