@@ -33,12 +33,8 @@ void EstateCsv::add(ConsoleRun const& console,
     }
 }
 
-std::string const& EstateCsv::text() const {
-    return _text;
-}
-
-std::string EstateCsv::takeText() && {
-    return std::move(_text);
+std::string EstateCsv::takeText() {
+    return std::exchange(_text, std::string());
 }
 
 } // namespace estate

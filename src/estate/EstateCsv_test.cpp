@@ -35,14 +35,25 @@ TEST(EstateCsv, EachConsolesRowsFollowTheConsolesColumnsAndAConsoleWithoutRowsHa
               "up,collected,,up.example,9119-MHE_21ABCDE,4,2,\"h,2\",10.0.0.2,3,channel_failure,"
               "\"RELAY Failed, "
               "rc = 1\",8,0,0,1.5,\"VPD/h,2.VPD.xml\",\"line 1\nline 2\"\r\n",
-              csv.text());
+              csv.takeText());
+}
+
+TEST(EstateCsv, TextIsTakenOncePieceByPieceWithTheHeaderFirst) {
+    estate::EstateCsv csv;
+    csv.add(consoleRun("down", estate::RecordKind::Unreachable, "refused"), std::nullopt);
+    std::string const first = csv.takeText();
+    EXPECT_EQ(0U, first.find("console,record,"));
+    EXPECT_NE(std::string::npos, first.find("\r\ndown,unreachable,refused,"));
+    EXPECT_EQ("", csv.takeText());
+    csv.add(consoleRun("gone", estate::RecordKind::Unreachable, "refused"), std::nullopt);
+    EXPECT_EQ("gone,unreachable,refused,,,,,,,,,,,,,,,\r\n", csv.takeText());
 }
 
 TEST(EstateCsv, ACollectedConsoleWithoutMachinesStillHasItsRow) {
     estate::EstateCsv csv;
     csv.add(consoleRun("empty", estate::RecordKind::Collected, ""),
             nlohmann::ordered_json::parse(CollectFolder::summary({})));
-    std::string const text = csv.text();
+    std::string const text = csv.takeText();
     EXPECT_NE(std::string::npos, text.find("\r\nempty,collected,,empty.example,,,,,,,,,,,,,,\r\n"));
 }
 

@@ -36,12 +36,35 @@ std::optional<long long> recordedRun(history::HistoryDatabase& database,
 
 // The summary as the history keeps it: its history member says where it is
 // recorded now, as a run's own summary does (the console's own record stays
-// in its bundle).
-Json keptSummary(Json summary, std::string const& file) {
-    summary["history"] =
-        Json{{"file", file}, {"run_id", nullptr}, {"recorded", true}, {"error", nullptr}};
-    return summary;
-}
+// in its bundle). Set for as long as this lives, then put back as it was.
+class KeptSummary {
+public:
+    KeptSummary(Json& summary, std::string const& file)
+        : _summary(summary), _hadHistory(summary.contains(gc_HistoryMember)) {
+        if (_hadHistory) {
+            _history = std::move(summary[gc_HistoryMember]);
+        }
+        summary[gc_HistoryMember] =
+            Json{{"file", file}, {"run_id", nullptr}, {"recorded", true}, {"error", nullptr}};
+    }
+    ~KeptSummary() {
+        if (_hadHistory) {
+            _summary[gc_HistoryMember] = std::move(_history);
+        } else {
+            _summary.erase(gc_HistoryMember);
+        }
+    }
+    KeptSummary(KeptSummary const&) = delete;
+    KeptSummary& operator=(KeptSummary const&) = delete;
+
+    Json const& document() const { return _summary; }
+
+private:
+    static constexpr char gc_HistoryMember[] = "history";
+    Json& _summary;
+    bool _hadHistory;
+    Json _history;
+};
 
 } // namespace
 
@@ -51,7 +74,7 @@ EstateHistory::EstateHistory(std::string file) : _file(std::move(file)) {}
 // database, the documents), leaves that console's run unrecorded and every
 // output still to be written.
 std::optional<report::SinceLastRun> EstateHistory::record(ConsoleRun const& console,
-                                                          Json const& summary) {
+                                                          Json& summary) {
     if (_file.empty() || !isRecorded(console.record.kind)) {
         return std::nullopt;
     }
@@ -69,14 +92,15 @@ std::vector<std::string> const& EstateHistory::failures() const {
     return _failures;
 }
 
-long long EstateHistory::_recordOnce(ConsoleRun const& console, Json const& summary) const {
+long long EstateHistory::_recordOnce(ConsoleRun const& console, Json& summary) const {
     report::RunSummary run = bundledRun(summary);
     run.consoleHost = console.record.console;
     history::HistoryDatabase database(_file);
     if (std::optional<long long> const recorded = recordedRun(database, run)) {
         return *recorded;
     }
-    return database.recordRun(run, keptSummary(summary, _file), console.vpdFolder);
+    KeptSummary const kept(summary, _file);
+    return database.recordRun(run, kept.document(), console.vpdFolder);
 }
 
 } // namespace estate

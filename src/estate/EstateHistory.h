@@ -29,16 +29,18 @@ public:
     // what changed since the console's previous run, or why that cannot be
     // told. nullopt without a history, or for a console whose record is
     // neither collected nor stale (its run, if any, did not end as a run
-    // does).
+    // does). The summary's history member says, while the run is recorded,
+    // where the history keeps it, and is put back as it was after: a
+    // summary of thousands of partitions is not copied for one member.
     std::optional<report::SinceLastRun> record(ConsoleRun const& console,
-                                               nlohmann::ordered_json const& summary);
+                                               nlohmann::ordered_json& summary);
 
     // One line per console whose run could not be recorded: "cannot record
     // console NAME's run in FILE: reason".
     std::vector<std::string> const& failures() const;
 
 private:
-    long long _recordOnce(ConsoleRun const& console, nlohmann::ordered_json const& summary) const;
+    long long _recordOnce(ConsoleRun const& console, nlohmann::ordered_json& summary) const;
 
     std::string _file;
     std::vector<std::string> _failures;

@@ -93,6 +93,44 @@ TEST(EstateHistory, EachCollectedConsolesRunIsRecordedOnceByItsInventoryName) {
     EXPECT_TRUE(consoleEntry(ending.estate, "down")["since_last_run"].is_null());
 }
 
+// The history keeps the summary saying where it is recorded; the console's
+// own report keeps the bundle's summary as it came.
+TEST(EstateHistory, HistoryKeepsTheSummaryWithItsHistoryMemberAndTheReportTheBundlesOwn) {
+    CollectFolder const folder;
+    layDownEstate(folder, "55", "surveyed");
+    QuorvexTest::TemporaryDirectory const work;
+    ASSERT_EQ(0, runEstate(folder.path(), work.file("report"), work.file("h.sqlite")).status);
+    SQLite::Database database(work.file("h.sqlite"), SQLite::OPEN_READONLY);
+    nlohmann::json const kept = nlohmann::json::parse(
+        database.execAndGet("SELECT summary FROM runs WHERE console = 'a'").getString());
+    EXPECT_EQ(work.file("h.sqlite"), kept["history"]["file"]);
+    EXPECT_EQ(true, kept["history"]["recorded"]);
+    nlohmann::json const bundled =
+        nlohmann::json::parse(QuorvexTest::readFile(folder.path() + "/consoles/a/summary.json"));
+    nlohmann::json const reported = nlohmann::json::parse(
+        QuorvexTest::readFile(work.file("report") + "/consoles/a/summary.json"));
+    EXPECT_EQ(bundled, reported);
+    EXPECT_FALSE(reported.contains("history"));
+}
+
+TEST(EstateHistory, ConsolesOwnHistoryMemberStaysInItsReport) {
+    CollectFolder const folder;
+    std::string summary =
+        summaryOf("a.example", "55", {CollectFolder::partition("1", "h1", "surveyed")});
+    summary.replace(summary.find('{'), 1,
+                    R"({"history": {"file": "/var/lib/quorvex-survey/history.sqlite",)"
+                    R"( "run_id": 7, "recorded": true, "error": null}, )");
+    folder.addBundle("a", summary, {"h1.VPD.xml"});
+    folder.writeRecords(
+        CollectFolder::records({CollectFolder::record("a", "collected", true, "null", "0")}));
+    QuorvexTest::TemporaryDirectory const work;
+    ASSERT_EQ(0, runEstate(folder.path(), work.file("report"), work.file("h.sqlite")).status);
+    nlohmann::json const reported = nlohmann::json::parse(
+        QuorvexTest::readFile(work.file("report") + "/consoles/a/summary.json"));
+    EXPECT_EQ(7, reported["history"]["run_id"]);
+    EXPECT_EQ(nlohmann::json::parse(summary), reported);
+}
+
 TEST(EstateHistory, TheSameBundlesMergedAgainRecordNothingNew) {
     CollectFolder const folder;
     layDownEstate(folder, "55", "surveyed");

@@ -7,6 +7,7 @@
 #include "estate/EstateTotals.h"
 #include "report/ReportWriter.h"
 #include "utility/AtomicFile.h"
+#include "utility/AtomicFileWriter.h"
 #include "utility/SystemError.h"
 
 #include <filesystem>
@@ -25,18 +26,22 @@ void makeFolder(std::string const& folder) {
     }
 }
 
-// Every output of the estate, gathered console by console.
+// Every output of the estate, gathered console by console; estate.csv goes
+// to its file as it comes.
 struct EstateOutputs {
+    explicit EstateOutputs(std::string const& folder) : csvFile(folder + "/estate.csv") {}
+
     EstateTotals totals;
     EstateDocument document;
     EstateCsv csv;
+    util::AtomicFileWriter csvFile;
     EstateRows rows;
     EstatePage page;
 };
 
 void addConsole(EstateOutputs& outputs, ConsoleRun console, std::string const& folder,
                 EstateHistory& history) {
-    std::optional<nlohmann::ordered_json> const summary = readSummary(console);
+    std::optional<nlohmann::ordered_json> summary = readSummary(console);
     if (summary) {
         std::optional<report::SinceLastRun> const since = history.record(console, *summary);
         if (since) {
@@ -49,6 +54,7 @@ void addConsole(EstateOutputs& outputs, ConsoleRun console, std::string const& f
     outputs.totals.add(console, summary);
     outputs.document.add(console, summary);
     outputs.csv.add(console, summary);
+    outputs.csvFile.append(outputs.csv.takeText());
     outputs.rows.add(console, summary);
     outputs.page.add(console, summary);
 }
@@ -57,7 +63,7 @@ void addConsole(EstateOutputs& outputs, ConsoleRun console, std::string const& f
 
 void writeEstate(Estate const& estate, std::string const& folder, EstateHistory& history) {
     makeFolder(folder);
-    EstateOutputs outputs;
+    EstateOutputs outputs(folder);
     for (ConsoleRun const& console : estate.consoles) {
         addConsole(outputs, console, folder, history);
     }
@@ -66,7 +72,7 @@ void writeEstate(Estate const& estate, std::string const& folder, EstateHistory&
     // the outputs held together would double the estate's memory.
     util::writeFileAtomically(folder + "/estate.json",
                               std::move(outputs.document).text(estate.collected, totals));
-    util::writeFileAtomically(folder + "/estate.csv", std::move(outputs.csv).takeText());
+    outputs.csvFile.commit();
     util::writeFileAtomically(folder + "/index.html",
                               outputs.page.text(estate, totals, outputs.rows.scriptText()));
 }
