@@ -12,8 +12,13 @@ last console's name and the first partition's host of each of its machines
 carry markup, quotes and non-ASCII letters, as a careless inventory or
 console might give them.
 
+With --documents each partition's VPD document is a one-line stand-in; with
+--document-template FILE it is FILE's text with "{host}" replaced by the
+partition's host name, for documents shaped as a console writes them.
+
 Usage: make_estate.py --out DIR [--consoles 5] [--machines 3] [--partitions 4]
-                      [--not-collected] [--documents] [--hostile-names]
+                      [--not-collected] [--documents] [--document-template FILE]
+                      [--hostile-names]
 """
 import argparse
 import json
@@ -40,7 +45,13 @@ OUTCOMES = ("surveyed", "inactive", "channel_failure", "client_failure", "fetch_
             "timed_out", "interrupted", "worker_died")
 
 
-def partition_entry(machine, p, documents_folder):
+def document_text(host, template):
+    if template is None:
+        return f"<?xml version=\"1.0\"?><doc host=\"{host}\"/>\n"
+    return template.replace("{host}", host)
+
+
+def partition_entry(machine, p, documents_folder, template):
     host = f"part-{p:04d}.{machine.lower()}.example"
     document = f"VPD/{PREFIX}{machine}-{p}.VPD.xml"
     entry = {"id": str(p), "host": host, "ip": f"10.{p // 65536}.{p // 256 % 256}.{p % 256}",
@@ -55,7 +66,7 @@ def partition_entry(machine, p, documents_folder):
     if documents_folder and entry["document"]:
         with open(os.path.join(documents_folder, os.path.basename(document)), "w",
                   encoding="utf-8") as file:
-            file.write(f"<?xml version=\"1.0\"?><doc host=\"{host}\"/>\n")
+            file.write(document_text(host, template))
     return entry
 
 
@@ -65,9 +76,10 @@ def counts_of(partitions):
     return counts
 
 
-def machine_entry(console, m, partitions, documents_folder):
+def machine_entry(console, m, partitions, documents_folder, template):
     machine = f"9119-MHE_{console:02d}{m:03d}AB"
-    entries = [partition_entry(machine, p, documents_folder) for p in range(1, partitions + 1)]
+    entries = [partition_entry(machine, p, documents_folder, template)
+               for p in range(1, partitions + 1)]
     surveyed = sum(1 for p in entries if p["outcome"] == "surveyed")
     code = "0" if surveyed == len(entries) else "4" if surveyed else "8"
     return {"identity": machine, "return_code": code,
@@ -76,8 +88,9 @@ def machine_entry(console, m, partitions, documents_folder):
             "counts": counts_of(entries), "partitions": entries}
 
 
-def summary_of(console, host, machines, partitions, documents_folder):
-    entries = [machine_entry(console, m, partitions, documents_folder) for m in range(machines)]
+def summary_of(console, host, machines, partitions, documents_folder, template):
+    entries = [machine_entry(console, m, partitions, documents_folder, template)
+               for m in range(machines)]
     every = [p for machine in entries for p in machine["partitions"]]
     totals = {"machines": len(entries)}
     totals.update(counts_of(every))
@@ -101,7 +114,7 @@ def lay_down_bundle(out, index, name, arguments):
     os.makedirs(vpd)
     host = f"pylon-{index:02d}.example"
     summary = summary_of(index, host, arguments.machines, arguments.partitions,
-                         vpd if arguments.documents else None)
+                         vpd if arguments.documents else None, arguments.template)
     if arguments.hostile_names and name == HOSTILE_CONSOLE:
         for machine in summary["machines"]:
             machine["partitions"][0]["host"] = HOSTILE_HOST
@@ -143,8 +156,14 @@ def main():
     parser.add_argument("--partitions", type=int, default=4)
     parser.add_argument("--not-collected", action="store_true")
     parser.add_argument("--documents", action="store_true")
+    parser.add_argument("--document-template")
     parser.add_argument("--hostile-names", action="store_true")
     arguments = parser.parse_args()
+    arguments.template = None
+    if arguments.document_template:
+        arguments.documents = True
+        with open(arguments.document_template, encoding="utf-8") as file:
+            arguments.template = file.read()
     os.makedirs(arguments.out, exist_ok=True)
     records = [console_record(arguments.out, index, arguments)
                for index in range(arguments.consoles)]
