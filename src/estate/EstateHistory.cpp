@@ -8,6 +8,7 @@
 
 #include <cstdint>
 #include <exception>
+#include <optional>
 #include <utility>
 
 namespace estate {
@@ -34,37 +35,44 @@ std::optional<long long> recordedRun(history::HistoryDatabase& database,
     return static_cast<long long>(query.getColumn(0).getInt64());
 }
 
-// The summary as the history keeps it: its history member says where it is
-// recorded now, as a run's own summary does (the console's own record stays
-// in its bundle). Set for as long as this lives, then put back as it was.
-class KeptSummary {
-public:
-    KeptSummary(Json& summary, std::string const& file)
-        : _summary(summary), _hadHistory(summary.contains(gc_HistoryMember)) {
-        if (_hadHistory) {
-            _history = std::move(summary[gc_HistoryMember]);
-        }
-        summary[gc_HistoryMember] =
-            Json{{"file", file}, {"run_id", nullptr}, {"recorded", true}, {"error", nullptr}};
-    }
-    ~KeptSummary() {
-        if (_hadHistory) {
-            _summary[gc_HistoryMember] = std::move(_history);
-        } else {
-            _summary.erase(gc_HistoryMember);
-        }
-    }
-    KeptSummary(KeptSummary const&) = delete;
-    KeptSummary& operator=(KeptSummary const&) = delete;
+constexpr char gc_HistoryMember[] = "history";
 
-    Json const& document() const { return _summary; }
+// The summary's history member, taken out; null when it had none.
+std::optional<Json> takeHistoryMember(Json& summary) {
+    if (!summary.contains(gc_HistoryMember)) {
+        return std::nullopt;
+    }
+    Json member = std::move(summary[gc_HistoryMember]);
+    return member;
+}
 
-private:
-    static constexpr char gc_HistoryMember[] = "history";
-    Json& _summary;
-    bool _hadHistory;
-    Json _history;
-};
+void putBackHistoryMember(Json& summary, std::optional<Json>&& member) {
+    if (member) {
+        summary[gc_HistoryMember] = std::move(*member);
+    } else {
+        summary.erase(gc_HistoryMember);
+    }
+}
+
+// Records the run with the summary as the history keeps it: its history
+// member says where it is recorded now, as a run's own summary does (the
+// console's own record stays in its bundle). The member is set in place and
+// put back after, whatever happens: a summary of thousands of partitions is
+// not copied for one member.
+long long recordKeptSummary(history::HistoryDatabase& database, report::RunSummary const& run,
+                            Json& summary, std::string const& vpdFolder) {
+    std::optional<Json> own = takeHistoryMember(summary);
+    summary[gc_HistoryMember] = Json{
+        {"file", database.path()}, {"run_id", nullptr}, {"recorded", true}, {"error", nullptr}};
+    try {
+        long long const runId = database.recordRun(run, summary, vpdFolder);
+        putBackHistoryMember(summary, std::move(own));
+        return runId;
+    } catch (...) {
+        putBackHistoryMember(summary, std::move(own));
+        throw;
+    }
+}
 
 } // namespace
 
@@ -99,8 +107,7 @@ long long EstateHistory::_recordOnce(ConsoleRun const& console, Json& summary) c
     if (std::optional<long long> const recorded = recordedRun(database, run)) {
         return *recorded;
     }
-    KeptSummary const kept(summary, _file);
-    return database.recordRun(run, kept.document(), console.vpdFolder);
+    return recordKeptSummary(database, run, summary, console.vpdFolder);
 }
 
 } // namespace estate
