@@ -13,6 +13,20 @@ inventory of ten simulated consoles on this one machine:
   paths; a key pair and known_hosts made for the test;
 - one unreachable (127.0.0.4, where nothing listens).
 
+The first sshd (ssh-run) is given the product's Debian package (--package,
+the survey role's quorvex_survey_package): the role copies it there and
+installs it with the apt module (dpkg -i) before running the survey it
+installed, /usr/bin/quorvex-survey. That sshd starts inside private-system
+(beside this script), a mount namespace where /usr, /etc and /var are
+overlays whose writable layers are in memory, and /run/systemd an empty
+tmpfs: before the first collection its mount table must show an overlay or
+tmpfs of its own on every place dpkg, its triggers and apt write, or the
+test stops there. The package's dependencies are the C and C++ runtimes and
+SQLite, already installed here, so apt needs no network. The first
+collection installs it (changed), the second finds it installed (ok); dpkg
+on this machine must know nothing of it, its status database the same
+bytes before and after.
+
 Among them: a survey run now, timer runs collected (one of them stale), a
 console whose machine listing fails (tool error, exit 69), one whose survey
 hangs past the deadline, one without Python and one whose variable fails
@@ -23,7 +37,7 @@ end; every process started carries a marker in its environment, and none
 may be left.
 
 Usage: collect_test.py --source-root DIR --work-root DIR --survey FILE
-                       --simulator FILE --collection FILE
+                       --simulator FILE --collection FILE --package FILE.deb
 """
 import argparse
 import csv
@@ -63,6 +77,21 @@ BROKEN_VARIABLES = {
     'local-no-python': {'ansible_python_interpreter': '/nonexistent/python3'},
     'local-bad-variable': {'quorvex_survey_poll_seconds': 'often'},
 }
+# The console that first installs the product's package from the controller
+# (the survey role's quorvex_survey_package) and then runs the survey it
+# installed. Its sshd starts inside private-system (beside this script):
+# /usr, /etc and /var are overlays in memory there, proven by its mount
+# table before the first collection, so that dpkg and apt change nothing on
+# this machine.
+PACKAGE_CONSOLE = 'ssh-run'
+INSTALLED_SURVEY = '/usr/bin/quorvex-survey'
+# Where dpkg, its triggers and apt write when the package is installed; each
+# must lie on an overlay or tmpfs of the console's own. /run/systemd, where
+# the host has it, hides the running systemd from the maintainer scripts.
+PACKAGE_WRITES = ('/usr', '/usr/bin', '/usr/sbin', '/usr/lib', '/usr/share', '/etc', '/var/lib/dpkg',
+                  '/var/lib/apt', '/var/cache/apt', '/var/cache/man', '/var/cache/debconf', '/var/log',
+                  '/var/lib/systemd')
+PRIVATE_FILE_SYSTEMS = ('overlay', 'tmpfs')
 # The console whose run writes its metrics file; a wrapper around
 # quorvex-survey keeps a copy of it to compare with the bundle's.
 METRICS_CONSOLE = 'local-run'
@@ -144,6 +173,70 @@ def marked_processes(marker, folder, namespaces):
             if pid.isdigit() and int(pid) != os.getpid() and is_test_process(pid, marker, folder, namespaces)]
 
 
+def mount_table(pid):
+    """The mounts process pid sees, in the order they were made, each as
+    (mount point, file system type, source, options of the file system)."""
+    mounts = []
+    with open('/proc/%s/mountinfo' % pid) as mountinfo:
+        for line in mountinfo:
+            fields, described = line.split(' - ', 1)
+            kind, source, options = described.split()
+            mounts.append((fields.split()[4], kind, source, options))
+    return mounts
+
+
+def covering_mount(mounts, path):
+    """The mount that holds path: the deepest mount point above it, the
+    newest of those on the same point."""
+    found = None
+    for mount in mounts:
+        point = mount[0]
+        if (path == point or path.startswith(point.rstrip('/') + '/')) and (
+                found is None or len(point) >= len(found[0])):
+            found = mount
+    return found
+
+
+def unshared_writes(pid):
+    """The places where dpkg and apt write that process pid shares with this
+    test: on its own overlay or tmpfs, one this test does not see, each is
+    private to it."""
+    ours = set(mount_table('self'))
+    theirs = mount_table(pid)
+    paths = PACKAGE_WRITES + (('/run/systemd',) if os.path.isdir('/run/systemd') else ())
+    return [path for path in paths if covering_mount(theirs, path) in ours
+            or covering_mount(theirs, path)[1] not in PRIVATE_FILE_SYSTEMS]
+
+
+def host_package_state(package):
+    """What dpkg knows on this machine, to show it untouched: its status
+    database and what it says of the package."""
+    with open('/var/lib/dpkg/status', 'rb') as status:
+        database = status.read()
+    query = subprocess.run(['dpkg-query', '-W', package], capture_output=True, text=True)
+    return {'status': database, 'package': (query.returncode, query.stdout),
+            'survey': os.path.exists(INSTALLED_SURVEY)}
+
+
+def package_field(name):
+    return subprocess.run(['dpkg-deb', '-f', OPTIONS.package, name], capture_output=True, text=True,
+                          check=True).stdout.strip()
+
+
+def task_results(output, task):
+    """The consoles' results of the task named task in ansible-playbook's
+    output: console name to ok, changed, skipping, failed or fatal."""
+    results = {}
+    inside = False
+    for line in output.splitlines():
+        if line.startswith('TASK ['):
+            inside = line.split(']', 1)[0].endswith(' : ' + task)
+        elif inside and ': [' in line:
+            status, rest = line.split(': [', 1)
+            results[rest.split(']', 1)[0]] = status
+    return results
+
+
 def sshd_listener(config):
     """The pid of the sshd that reads the configuration file config."""
     for pid in os.listdir('/proc'):
@@ -164,7 +257,7 @@ class Console:
         self.scenarios = (spec[3], spec[4])
         self.estate = estate
         self.folder = os.path.join(estate.work, 'consoles', self.name)
-        for name in RESULT_NAMES + ('state', 'home', 'vartmp', 'tmp', 'run-sshd'):
+        for name in RESULT_NAMES + ('state', 'home', 'vartmp', 'tmp', 'run-sshd', 'layers'):
             os.makedirs(os.path.join(self.folder, name))
         # The shipped scenarios name their documents relative to themselves.
         os.symlink(os.path.join(OPTIONS.source_root, 'sim', 'scenarios', 'documents'), self.path('documents'))
@@ -217,13 +310,22 @@ class Console:
             sshd_config.write('\n'.join(config) + '\n')
         binds = [self.path('home') + ':/root', self.path('vartmp') + ':/var/tmp',
                  self.path('run-sshd') + ':/run/sshd']
+        private_system = []
+        if self.name == PACKAGE_CONSOLE:
+            private_system = [os.path.join(os.path.dirname(os.path.abspath(__file__)), 'private-system'),
+                              self.path('layers')]
         log = open(self.path('sshd.log'), 'wb')
         self.sshd = subprocess.Popen(
-            self.sandbox_command(binds) + ['/usr/sbin/sshd', '-D', '-e', '-f', self.path('sshd_config')],
+            private_system + self.sandbox_command(binds)
+            + ['/usr/sbin/sshd', '-D', '-e', '-f', self.path('sshd_config')],
             stdout=log, stderr=subprocess.STDOUT, env=self.estate.environment)
         log.close()
         wait_for_listener(self.address, port, self.sshd)
-        namespace = mount_namespace(sshd_listener(self.path('sshd_config')))
+        listener = sshd_listener(self.path('sshd_config'))
+        if private_system and unshared_writes(listener):
+            raise AssertionError('the package would be installed on this machine: %s of console %s not '
+                                 'private to it' % (', '.join(unshared_writes(listener)), self.name))
+        namespace = mount_namespace(listener)
         if namespace != mount_namespace('self'):
             self.estate.namespaces.add(namespace)
         with open(self.path('host_key.pub')) as key:
@@ -244,6 +346,14 @@ class Console:
             argv = ['ssh'] + self.estate.ssh_options() + ['-p', str(self.estate.port),
                                                           'root@' + self.address] + words
         return subprocess.run(argv, env=self.estate.environment, capture_output=True, text=True, timeout=120)
+
+    def installed_package(self):
+        """What dpkg on the console says of the package and of the survey
+        program the role runs."""
+        words = ['dpkg-query', '-W', '-f', "'${Status} ${Version}\\n'", package_field('Package'), ';',
+                 'dpkg-query', '-S', INSTALLED_SURVEY]
+        run = self.run_on_console(words)
+        return run.stdout
 
     def run_timer(self):
         run = self.run_on_console([OPTIONS.survey, '--all', '--quiet'] + SURVEY_OPTIONS
@@ -267,6 +377,9 @@ class Console:
             variables.update({'ansible_host': self.address, 'ansible_port': self.estate.port,
                               'ansible_user': 'root', 'ansible_remote_tmp': self.path('tmp'),
                               'ansible_ssh_common_args': ' '.join(self.estate.ssh_options())})
+        if self.name == PACKAGE_CONSOLE:
+            variables.update({'quorvex_survey_package': OPTIONS.package,
+                              'quorvex_survey_command': INSTALLED_SURVEY})
         if self.name == METRICS_CONSOLE:
             variables.update({'quorvex_survey_metrics': True,
                               'quorvex_survey_command': self.path('survey-keeping-metrics')})
@@ -299,6 +412,9 @@ class Estate:
 
     def path(self, *names):
         return os.path.join(self.work, *names)
+
+    def console(self, name):
+        return [console for console in self.consoles if console.name == name][0]
 
     def ssh_options(self):
         return ['-o', 'UserKnownHostsFile=' + self.path('known_hosts'), '-o', 'StrictHostKeyChecking=yes',
@@ -383,7 +499,8 @@ class Estate:
                         '-f', str(forks), '-e', 'quorvex_pylon_collect_dir=' + given,
                         '-e', json.dumps(estate_variables(self.path('history.sqlite')))], timeout)
         self.results.append({'folder': folder, 'seconds': time.monotonic() - started, 'output': run.stdout,
-                             'consoles': {console.name: snapshot(console) for console in self.consoles}})
+                             'consoles': {console.name: snapshot(console) for console in self.consoles},
+                             'installed': self.console(PACKAGE_CONSOLE).installed_package()})
         self.collection += 1
         sys.stderr.write('collection %d: %.1f s\n' % (self.collection, self.results[-1]['seconds']))
 
@@ -431,6 +548,7 @@ class Collection(unittest.TestCase):
 
     @classmethod
     def setUpClass(cls):
+        cls.host_before = host_package_state(package_field('Package'))
         cls.estate = Estate()
         try:
             cls.estate.start()
@@ -438,6 +556,7 @@ class Collection(unittest.TestCase):
             cls.estate.collect()
         finally:
             cls.estate.stop()
+            cls.host_after = host_package_state(package_field('Package'))
             cls.left_processes = cls.estate.left_processes()
             cls.estate.kill(cls.left_processes)
             if sys.exc_info()[0] is not None:
@@ -548,6 +667,7 @@ class Collection(unittest.TestCase):
         self.assertTrue(os.path.isfile(os.path.join(folder, 'bundles', METRICS_CONSOLE + '.tar.gz')))
         playbooks = self.estate.path('collections', 'ansible_collections', 'quorvex', 'pylon', 'playbooks')
         self.assertEqual(['collect.yml'], os.listdir(playbooks))
+
     def estate_file(self, collection, name):
         return os.path.join(self.estate.results[collection]['folder'], 'report', name)
 
@@ -596,6 +716,27 @@ class Collection(unittest.TestCase):
         self.assertEqual(changes['run']['id'], entry['since_last_run']['run_id'])
         self.assertEqual(changes['run']['previous_run'], entry['since_last_run']['previous_run_id'])
 
+    def test_package_is_installed_by_the_first_collection_and_kept_by_the_second(self):
+        for collection, expected in enumerate(('changed', 'ok')):
+            output = self.estate.results[collection]['output']
+            for task in ('Copy the package to the console', 'Install or upgrade the package'):
+                self.assertEqual({PACKAGE_CONSOLE: expected}, task_results(output, task), (collection, task))
+            self.assertEqual('install ok installed %s\n%s: %s\n' % (
+                package_field('Version'), package_field('Package'), INSTALLED_SURVEY),
+                self.estate.results[collection]['installed'], collection)
+
+    def test_package_console_runs_the_survey_it_installed(self):
+        self.assertFalse(self.host_before['survey'], INSTALLED_SURVEY + ' on this machine')
+        for collection in (0, 1):
+            record = self.record(collection, PACKAGE_CONSOLE)
+            self.assertEqual('collected', record['record'], collection)
+            bundle = bundle_files(os.path.join(self.estate.results[collection]['folder'], record['bundle']))
+            self.assertEqual(package_field('Version'), json.loads(bundle['bundle.json'])['product_version'])
+
+    def test_host_package_database_is_unchanged(self):
+        self.assertEqual((1, ''), self.host_before['package'])
+        self.assertEqual(self.host_before, self.host_after)
+
     def test_nothing_is_left_running(self):
         self.assertEqual([], self.left_processes)
 
@@ -603,7 +744,7 @@ class Collection(unittest.TestCase):
 def main():
     global OPTIONS
     parser = argparse.ArgumentParser(description=__doc__.split('\n\n')[0])
-    for option in ('--source-root', '--work-root', '--survey', '--simulator', '--collection'):
+    for option in ('--source-root', '--work-root', '--survey', '--simulator', '--collection', '--package'):
         parser.add_argument(option, required=True)
     OPTIONS, rest = parser.parse_known_args()
     OPTIONS.version = subprocess.run([OPTIONS.survey, '--version'], capture_output=True,
