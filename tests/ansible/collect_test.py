@@ -44,6 +44,7 @@ import csv
 import hashlib
 import json
 import os
+import re
 import shutil
 import signal
 import socket
@@ -226,16 +227,27 @@ def package_field(name):
 
 def task_results(output, task):
     """The consoles' results of the task named task in ansible-playbook's
-    output: console name to ok, changed, skipping, failed or fatal."""
+    output: console name to ok, changed, skipping, failed or fatal. Each
+    result follows its task's banner, repeated where the free strategy
+    interleaved another task's; a retry's line does not."""
     results = {}
     inside = False
     for line in output.splitlines():
+        result = re.match(r'(ok|changed|skipping|failed|fatal): \[([^]]+)\]', line)
         if line.startswith('TASK ['):
             inside = line.split(']', 1)[0].endswith(' : ' + task)
-        elif inside and ': [' in line:
-            status, rest = line.split(': [', 1)
-            results[rest.split(']', 1)[0]] = status
+        elif inside and result:
+            results[result.group(2)] = result.group(1)
     return results
+
+
+def process_description(pid):
+    """A process by its id and command line, to name one left running."""
+    try:
+        with open('/proc/%d/cmdline' % pid, 'rb') as cmdline:
+            return '%d %s' % (pid, cmdline.read().replace(b'\0', b' ').decode(errors='replace').strip())
+    except OSError:
+        return '%d (ended)' % pid
 
 
 def sshd_listener(config):
@@ -562,8 +574,9 @@ class Collection(unittest.TestCase):
         finally:
             cls.estate.stop()
             cls.host_after = host_package_state(package_field('Package'))
-            cls.left_processes = cls.estate.left_processes()
-            cls.estate.kill(cls.left_processes)
+            left = cls.estate.left_processes()
+            cls.left_processes = [process_description(pid) for pid in left]
+            cls.estate.kill(left)
             if sys.exc_info()[0] is not None:
                 shutil.rmtree(cls.estate.work)
 
