@@ -342,6 +342,7 @@ class Console:
         namespace = mount_namespace(listener)
         if namespace != mount_namespace('self'):
             self.estate.namespaces.add(namespace)
+            self.estate.namespace_handles.append(os.open('/proc/%d/ns/mnt' % listener, os.O_RDONLY))
         with open(self.path('host_key.pub')) as key:
             host_key = ' '.join(key.read().split()[:2])
         with open(self.estate.path('known_hosts'), 'a') as known_hosts:
@@ -423,6 +424,9 @@ class Estate:
         self.consoles = [Console(self, spec) for spec in CONSOLES]
         self.results = []
         self.namespaces = set()
+        # Held open so that each sshd's namespace outlives it: a freed one's
+        # number may name a namespace of another program's a moment later.
+        self.namespace_handles = []
 
     def path(self, *names):
         return os.path.join(self.work, *names)
@@ -482,6 +486,11 @@ class Estate:
                 os.kill(pid, signal.SIGKILL)
             except ProcessLookupError:
                 continue
+
+    def release_namespaces(self):
+        for handle in self.namespace_handles:
+            os.close(handle)
+        self.namespace_handles = []
 
     def running_processes(self):
         return marked_processes(self.marker, self.work, self.namespaces)
@@ -577,6 +586,7 @@ class Collection(unittest.TestCase):
             left = cls.estate.left_processes()
             cls.left_processes = [process_description(pid) for pid in left]
             cls.estate.kill(left)
+            cls.estate.release_namespaces()
             if sys.exc_info()[0] is not None:
                 shutil.rmtree(cls.estate.work)
 
