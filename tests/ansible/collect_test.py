@@ -21,11 +21,11 @@ installed, /usr/bin/quorvex-survey. That sshd starts inside private-system
 overlays whose writable layers are in memory, and /run/systemd an empty
 tmpfs: before the first collection its mount table must show an overlay or
 tmpfs of its own on every place dpkg, its triggers and apt write, or the
-test stops there. The package's dependencies are the C and C++ runtimes and
-SQLite, already installed here, so apt needs no network. The first
-collection installs it (changed), the second finds it installed (ok); dpkg
-on this machine must know nothing of it, its status database the same
-bytes before and after.
+test stops there. The libraries the package depends on (the C and C++
+runtimes, Expat, pugixml, SQLite) are installed here already, so apt
+fetches nothing. The first collection installs it (changed), the second
+finds it installed (ok); dpkg on this machine must know nothing of it, its
+status database the same bytes before and after.
 
 Among them: a survey run now, timer runs collected (one of them stale), a
 console whose machine listing fails (tool error, exit 69), one whose survey
@@ -324,14 +324,18 @@ class Console:
         binds = [self.path('home') + ':/root', self.path('vartmp') + ':/var/tmp',
                  self.path('run-sshd') + ':/run/sshd']
         private_system = []
+        environment = self.estate.environment
         if self.name == PACKAGE_CONSOLE:
             private_system = [os.path.join(os.path.dirname(os.path.abspath(__file__)), 'private-system'),
                               self.path('layers')]
+            # dpkg needs root's capabilities, which proot would drop; where
+            # private-system makes its namespace, the sandbox can make one.
+            environment = dict(environment, QUORVEX_SANDBOX='namespace')
         log = open(self.path('sshd.log'), 'wb')
         self.sshd = subprocess.Popen(
             private_system + self.sandbox_command(binds)
             + ['/usr/sbin/sshd', '-D', '-e', '-f', self.path('sshd_config')],
-            stdout=log, stderr=subprocess.STDOUT, env=self.estate.environment)
+            stdout=log, stderr=subprocess.STDOUT, env=environment)
         log.close()
         wait_for_listener(self.address, port, self.sshd)
         listener = sshd_listener(self.path('sshd_config'))
