@@ -13,6 +13,20 @@ inventory of ten simulated consoles on this one machine:
   paths; a key pair and known_hosts made for the test;
 - one unreachable (127.0.0.4, where nothing listens).
 
+The first sshd (ssh-run) is given the product's Debian package (--package,
+the survey role's quorvex_survey_package): the role copies it there and
+installs it with the apt module (dpkg -i) before running the survey it
+installed, /usr/bin/quorvex-survey. That sshd starts inside private-system
+(beside this script), a mount namespace where /usr, /etc and /var are
+overlays whose writable layers are in memory, and /run/systemd an empty
+tmpfs: before the first collection its mount table must show an overlay or
+tmpfs of its own on every place dpkg, its triggers and apt write, or the
+test stops there. The libraries the package depends on (the C and C++
+runtimes, Expat, pugixml, SQLite) are installed here already, so apt
+fetches nothing. The first collection installs it (changed), the second
+finds it installed (ok); dpkg on this machine must know nothing of it, its
+status database the same bytes before and after.
+
 Among them: a survey run now, timer runs collected (one of them stale), a
 console whose machine listing fails (tool error, exit 69), one whose survey
 hangs past the deadline, one without Python and one whose variable fails
@@ -23,12 +37,14 @@ end; every process started carries a marker in its environment, and none
 may be left.
 
 Usage: collect_test.py --source-root DIR --work-root DIR --survey FILE
-                       --simulator FILE --collection FILE
+                       --simulator FILE --collection FILE --package FILE.deb
 """
 import argparse
 import csv
+import hashlib
 import json
 import os
+import re
 import shutil
 import signal
 import socket
@@ -63,6 +79,21 @@ BROKEN_VARIABLES = {
     'local-no-python': {'ansible_python_interpreter': '/nonexistent/python3'},
     'local-bad-variable': {'quorvex_survey_poll_seconds': 'often'},
 }
+# The console that first installs the product's package from the controller
+# (the survey role's quorvex_survey_package) and then runs the survey it
+# installed. Its sshd starts inside private-system (beside this script):
+# /usr, /etc and /var are overlays in memory there, proven by its mount
+# table before the first collection, so that dpkg and apt change nothing on
+# this machine.
+PACKAGE_CONSOLE = 'ssh-run'
+INSTALLED_SURVEY = '/usr/bin/quorvex-survey'
+# Where dpkg, its triggers and apt write when the package is installed; each
+# must lie on an overlay or tmpfs of the console's own. /run/systemd, where
+# the host has it, hides the running systemd from the maintainer scripts.
+PACKAGE_WRITES = ('/usr', '/usr/bin', '/usr/sbin', '/usr/lib', '/usr/share', '/etc', '/var/lib/dpkg',
+                  '/var/lib/apt', '/var/cache/apt', '/var/cache/man', '/var/cache/debconf', '/var/log',
+                  '/var/lib/systemd')
+PRIVATE_FILE_SYSTEMS = ('overlay', 'tmpfs')
 # The console whose run writes its metrics file; a wrapper around
 # quorvex-survey keeps a copy of it to compare with the bundle's.
 METRICS_CONSOLE = 'local-run'
@@ -144,6 +175,81 @@ def marked_processes(marker, folder, namespaces):
             if pid.isdigit() and int(pid) != os.getpid() and is_test_process(pid, marker, folder, namespaces)]
 
 
+def mount_table(pid):
+    """The mounts process pid sees, in the order they were made, each as
+    (mount point, file system type, source, options of the file system)."""
+    mounts = []
+    with open('/proc/%s/mountinfo' % pid) as mountinfo:
+        for line in mountinfo:
+            fields, described = line.split(' - ', 1)
+            kind, source, options = described.split()
+            mounts.append((fields.split()[4], kind, source, options))
+    return mounts
+
+
+def covering_mount(mounts, path):
+    """The mount that holds path: the deepest mount point above it, the
+    newest of those on the same point."""
+    found = None
+    for mount in mounts:
+        point = mount[0]
+        if (path == point or path.startswith(point.rstrip('/') + '/')) and (
+                found is None or len(point) >= len(found[0])):
+            found = mount
+    return found
+
+
+def unshared_writes(pid):
+    """The places where dpkg and apt write that process pid shares with this
+    test: on its own overlay or tmpfs, one this test does not see, each is
+    private to it."""
+    ours = set(mount_table('self'))
+    theirs = mount_table(pid)
+    paths = PACKAGE_WRITES + (('/run/systemd',) if os.path.isdir('/run/systemd') else ())
+    return [path for path in paths if covering_mount(theirs, path) in ours
+            or covering_mount(theirs, path)[1] not in PRIVATE_FILE_SYSTEMS]
+
+
+def host_package_state(package):
+    """What dpkg knows on this machine, to show it untouched: its status
+    database (its digest) and what it says of the package."""
+    with open('/var/lib/dpkg/status', 'rb') as status:
+        database = hashlib.sha256(status.read()).hexdigest()
+    query = subprocess.run(['dpkg-query', '-W', package], capture_output=True, text=True)
+    return {'status': database, 'package': (query.returncode, query.stdout),
+            'survey': os.path.exists(INSTALLED_SURVEY)}
+
+
+def package_field(name):
+    return subprocess.run(['dpkg-deb', '-f', OPTIONS.package, name], capture_output=True, text=True,
+                          check=True).stdout.strip()
+
+
+def task_results(output, task):
+    """The consoles' results of the task named task in ansible-playbook's
+    output: console name to ok, changed, skipping, failed or fatal. Each
+    result follows its task's banner, repeated where the free strategy
+    interleaved another task's; a retry's line does not."""
+    results = {}
+    inside = False
+    for line in output.splitlines():
+        result = re.match(r'(ok|changed|skipping|failed|fatal): \[([^]]+)\]', line)
+        if line.startswith('TASK ['):
+            inside = line.split(']', 1)[0].endswith(' : ' + task)
+        elif inside and result:
+            results[result.group(2)] = result.group(1)
+    return results
+
+
+def process_description(pid):
+    """A process by its id and command line, to name one left running."""
+    try:
+        with open('/proc/%d/cmdline' % pid, 'rb') as cmdline:
+            return '%d %s' % (pid, cmdline.read().replace(b'\0', b' ').decode(errors='replace').strip())
+    except OSError:
+        return '%d (ended)' % pid
+
+
 def sshd_listener(config):
     """The pid of the sshd that reads the configuration file config."""
     for pid in os.listdir('/proc'):
@@ -164,7 +270,7 @@ class Console:
         self.scenarios = (spec[3], spec[4])
         self.estate = estate
         self.folder = os.path.join(estate.work, 'consoles', self.name)
-        for name in RESULT_NAMES + ('state', 'home', 'vartmp', 'tmp', 'run-sshd'):
+        for name in RESULT_NAMES + ('state', 'home', 'vartmp', 'tmp', 'run-sshd', 'layers'):
             os.makedirs(os.path.join(self.folder, name))
         # The shipped scenarios name their documents relative to themselves.
         os.symlink(os.path.join(OPTIONS.source_root, 'sim', 'scenarios', 'documents'), self.path('documents'))
@@ -217,15 +323,30 @@ class Console:
             sshd_config.write('\n'.join(config) + '\n')
         binds = [self.path('home') + ':/root', self.path('vartmp') + ':/var/tmp',
                  self.path('run-sshd') + ':/run/sshd']
+        private_system = []
+        environment = self.estate.environment
+        if self.name == PACKAGE_CONSOLE:
+            private_system = [os.path.join(os.path.dirname(os.path.abspath(__file__)), 'private-system'),
+                              self.path('layers')]
+            # dpkg needs root's capabilities, which proot would drop; where
+            # private-system makes its namespace, the sandbox can make one.
+            environment = dict(environment, QUORVEX_SANDBOX='namespace')
         log = open(self.path('sshd.log'), 'wb')
         self.sshd = subprocess.Popen(
-            self.sandbox_command(binds) + ['/usr/sbin/sshd', '-D', '-e', '-f', self.path('sshd_config')],
-            stdout=log, stderr=subprocess.STDOUT, env=self.estate.environment)
+            private_system + self.sandbox_command(binds)
+            + ['/usr/sbin/sshd', '-D', '-e', '-f', self.path('sshd_config')],
+            stdout=log, stderr=subprocess.STDOUT, env=environment)
         log.close()
         wait_for_listener(self.address, port, self.sshd)
-        namespace = mount_namespace(sshd_listener(self.path('sshd_config')))
+        listener = sshd_listener(self.path('sshd_config'))
+        unshared = unshared_writes(listener) if private_system else []
+        if unshared:
+            raise AssertionError('the package would be installed on this machine: %s of console %s not '
+                                 'private to it' % (', '.join(unshared), self.name))
+        namespace = mount_namespace(listener)
         if namespace != mount_namespace('self'):
             self.estate.namespaces.add(namespace)
+            self.estate.namespace_handles.append(os.open('/proc/%d/ns/mnt' % listener, os.O_RDONLY))
         with open(self.path('host_key.pub')) as key:
             host_key = ' '.join(key.read().split()[:2])
         with open(self.estate.path('known_hosts'), 'a') as known_hosts:
@@ -244,6 +365,14 @@ class Console:
             argv = ['ssh'] + self.estate.ssh_options() + ['-p', str(self.estate.port),
                                                           'root@' + self.address] + words
         return subprocess.run(argv, env=self.estate.environment, capture_output=True, text=True, timeout=120)
+
+    def installed_package(self):
+        """What dpkg on the console says of the package and of the survey
+        program the role runs."""
+        words = ['dpkg-query', '-W', '-f', "'${Status} ${Version}\\n'", package_field('Package'), ';',
+                 'dpkg-query', '-S', INSTALLED_SURVEY]
+        run = self.run_on_console(words)
+        return run.stdout
 
     def run_timer(self):
         run = self.run_on_console([OPTIONS.survey, '--all', '--quiet'] + SURVEY_OPTIONS
@@ -267,6 +396,9 @@ class Console:
             variables.update({'ansible_host': self.address, 'ansible_port': self.estate.port,
                               'ansible_user': 'root', 'ansible_remote_tmp': self.path('tmp'),
                               'ansible_ssh_common_args': ' '.join(self.estate.ssh_options())})
+        if self.name == PACKAGE_CONSOLE:
+            variables.update({'quorvex_survey_package': OPTIONS.package,
+                              'quorvex_survey_command': INSTALLED_SURVEY})
         if self.name == METRICS_CONSOLE:
             variables.update({'quorvex_survey_metrics': True,
                               'quorvex_survey_command': self.path('survey-keeping-metrics')})
@@ -296,9 +428,18 @@ class Estate:
         self.consoles = [Console(self, spec) for spec in CONSOLES]
         self.results = []
         self.namespaces = set()
+        # Held open so that each sshd's namespace outlives it: a freed one's
+        # number may name a namespace of another program's a moment later.
+        self.namespace_handles = []
 
     def path(self, *names):
         return os.path.join(self.work, *names)
+
+    def installed_package(self):
+        """What dpkg on the package console says, where the estate has one
+        (bench/ansible-collect's has not)."""
+        found = [console for console in self.consoles if console.name == PACKAGE_CONSOLE]
+        return found[0].installed_package() if found else None
 
     def ssh_options(self):
         return ['-o', 'UserKnownHostsFile=' + self.path('known_hosts'), '-o', 'StrictHostKeyChecking=yes',
@@ -350,6 +491,11 @@ class Estate:
             except ProcessLookupError:
                 continue
 
+    def release_namespaces(self):
+        for handle in self.namespace_handles:
+            os.close(handle)
+        self.namespace_handles = []
+
     def running_processes(self):
         return marked_processes(self.marker, self.work, self.namespaces)
 
@@ -383,7 +529,8 @@ class Estate:
                         '-f', str(forks), '-e', 'quorvex_pylon_collect_dir=' + given,
                         '-e', json.dumps(estate_variables(self.path('history.sqlite')))], timeout)
         self.results.append({'folder': folder, 'seconds': time.monotonic() - started, 'output': run.stdout,
-                             'consoles': {console.name: snapshot(console) for console in self.consoles}})
+                             'consoles': {console.name: snapshot(console) for console in self.consoles},
+                             'installed': self.installed_package()})
         self.collection += 1
         sys.stderr.write('collection %d: %.1f s\n' % (self.collection, self.results[-1]['seconds']))
 
@@ -431,6 +578,7 @@ class Collection(unittest.TestCase):
 
     @classmethod
     def setUpClass(cls):
+        cls.host_before = host_package_state(package_field('Package'))
         cls.estate = Estate()
         try:
             cls.estate.start()
@@ -438,8 +586,11 @@ class Collection(unittest.TestCase):
             cls.estate.collect()
         finally:
             cls.estate.stop()
-            cls.left_processes = cls.estate.left_processes()
-            cls.estate.kill(cls.left_processes)
+            cls.host_after = host_package_state(package_field('Package'))
+            left = cls.estate.left_processes()
+            cls.left_processes = [process_description(pid) for pid in left]
+            cls.estate.kill(left)
+            cls.estate.release_namespaces()
             if sys.exc_info()[0] is not None:
                 shutil.rmtree(cls.estate.work)
 
@@ -548,6 +699,7 @@ class Collection(unittest.TestCase):
         self.assertTrue(os.path.isfile(os.path.join(folder, 'bundles', METRICS_CONSOLE + '.tar.gz')))
         playbooks = self.estate.path('collections', 'ansible_collections', 'quorvex', 'pylon', 'playbooks')
         self.assertEqual(['collect.yml'], os.listdir(playbooks))
+
     def estate_file(self, collection, name):
         return os.path.join(self.estate.results[collection]['folder'], 'report', name)
 
@@ -596,6 +748,31 @@ class Collection(unittest.TestCase):
         self.assertEqual(changes['run']['id'], entry['since_last_run']['run_id'])
         self.assertEqual(changes['run']['previous_run'], entry['since_last_run']['previous_run_id'])
 
+    def test_package_is_installed_by_the_first_collection_and_kept_by_the_second(self):
+        for collection, expected in enumerate(('changed', 'ok')):
+            output = self.estate.results[collection]['output']
+            for task in ('Copy the package to the console', 'Install or upgrade the package'):
+                self.assertEqual({PACKAGE_CONSOLE: expected}, task_results(output, task), (collection, task))
+            self.assertEqual('install ok installed %s\n%s: %s\n' % (
+                package_field('Version'), package_field('Package'), INSTALLED_SURVEY),
+                self.estate.results[collection]['installed'], collection)
+
+    def test_package_console_runs_the_survey_it_installed(self):
+        self.assertFalse(self.host_before['survey'], INSTALLED_SURVEY + ' on this machine')
+        for collection in (0, 1):
+            record = self.record(collection, PACKAGE_CONSOLE)
+            self.assertEqual('collected', record['record'], collection)
+            bundle = bundle_files(os.path.join(self.estate.results[collection]['folder'], record['bundle']))
+            self.assertEqual(package_field('Version'), json.loads(bundle['bundle.json'])['product_version'])
+
+    def test_private_system_proof_finds_this_tests_own_mounts_shared(self):
+        paths = PACKAGE_WRITES + (('/run/systemd',) if os.path.isdir('/run/systemd') else ())
+        self.assertEqual(list(paths), unshared_writes('self'))
+
+    def test_host_package_database_is_unchanged(self):
+        self.assertEqual((1, ''), self.host_before['package'])
+        self.assertEqual(self.host_before, self.host_after)
+
     def test_nothing_is_left_running(self):
         self.assertEqual([], self.left_processes)
 
@@ -603,7 +780,7 @@ class Collection(unittest.TestCase):
 def main():
     global OPTIONS
     parser = argparse.ArgumentParser(description=__doc__.split('\n\n')[0])
-    for option in ('--source-root', '--work-root', '--survey', '--simulator', '--collection'):
+    for option in ('--source-root', '--work-root', '--survey', '--simulator', '--collection', '--package'):
         parser.add_argument(option, required=True)
     OPTIONS, rest = parser.parse_known_args()
     OPTIONS.version = subprocess.run([OPTIONS.survey, '--version'], capture_output=True,
