@@ -37,12 +37,14 @@ set(CPACK_DEBIAN_PACKAGE_PRIORITY "optional")
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 # The run-time libraries are read from the executable where dpkg-shlibdeps is
 # there to do it; otherwise the C and C++ runtimes the tool links are named,
-# and SQLite, which quorvex-survey's history links as a shared library.
+# and the shared libraries quorvex-survey links: SQLite (its history), expat
+# (reading the VPD documents) and pugixml (the JUnit file).
 find_program(QUORVEX_DPKG_SHLIBDEPS dpkg-shlibdeps)
 if(QUORVEX_DPKG_SHLIBDEPS)
   set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 else()
-  set(CPACK_DEBIAN_PACKAGE_DEPENDS "libc6, libstdc++6, libgcc-s1, libsqlite3-0")
+  set(CPACK_DEBIAN_PACKAGE_DEPENDS
+      "libc6, libstdc++6, libgcc-s1, libsqlite3-0, libexpat1, libpugixml1v5")
 endif()
 
 # The maintainer scripts of the units (as Debian's dh_installsystemd writes
