@@ -82,6 +82,18 @@ TEST(EstateCommand, EstateJsonListsEveryConsoleOnceWithItsRecord) {
     EXPECT_EQ(1, document["totals"]["outcomes"]["surveyed"]);
 }
 
+TEST(EstateCommand, AnEstateWithoutConsolesHasTheCsvHeaderAlone) {
+    CollectFolder const folder;
+    folder.writeRecords(CollectFolder::records({}));
+    QuorvexTest::TemporaryDirectory const report;
+    Ending const ending = runEstate(folder.path(), report.file("estate"));
+    EXPECT_EQ(0, ending.status) << ending.errors;
+    EXPECT_EQ("console,record,record_message,console_host,machine,machine_return_code,"
+              "partition_id,host,ip,active_status,outcome,status_text,return_code,rc,rc_cmd,"
+              "seconds,document,reason\r\n",
+              QuorvexTest::readFile(report.file("estate") + "/estate.csv"));
+}
+
 TEST(EstateCommand, AFolderWithoutRecordsIsExit66WritingNothing) {
     CollectFolder const folder;
     QuorvexTest::TemporaryDirectory const report;

@@ -57,14 +57,14 @@ void putBackHistoryMember(Json& summary, std::optional<Json>&& member) {
 // Records the run with the summary as the history keeps it: its history
 // member says where it is recorded now, as a run's own summary does (the
 // console's own record stays in its bundle). The member is set in place and
-// put back after, whatever happens: a summary of thousands of partitions is
-// not copied for one member.
+// put back after, whatever happens, rather than the estate copying a summary
+// of thousands of partitions for one member.
 long long recordKeptSummary(history::HistoryDatabase& database, report::RunSummary const& run,
                             Json& summary, std::string const& vpdFolder) {
     std::optional<Json> own = takeHistoryMember(summary);
-    summary[gc_HistoryMember] = Json{
-        {"file", database.path()}, {"run_id", nullptr}, {"recorded", true}, {"error", nullptr}};
     try {
+        summary[gc_HistoryMember] = Json{
+            {"file", database.path()}, {"run_id", nullptr}, {"recorded", true}, {"error", nullptr}};
         long long const runId = database.recordRun(run, summary, vpdFolder);
         putBackHistoryMember(summary, std::move(own));
         return runId;

@@ -30,8 +30,9 @@ public:
     // told. nullopt without a history, or for a console whose record is
     // neither collected nor stale (its run, if any, did not end as a run
     // does). The summary's history member says, while the run is recorded,
-    // where the history keeps it, and is put back as it was after: a
-    // summary of thousands of partitions is not copied for one member.
+    // where the history keeps it, and is put back as it was after, rather
+    // than the estate copying a summary of thousands of partitions for one
+    // member.
     std::optional<report::SinceLastRun> record(ConsoleRun const& console,
                                                nlohmann::ordered_json& summary);
 

@@ -72,6 +72,8 @@ void writeEstate(Estate const& estate, std::string const& folder, EstateHistory&
     // the outputs held together would double the estate's memory.
     util::writeFileAtomically(folder + "/estate.json",
                               std::move(outputs.document).text(estate.collected, totals));
+    // What is not taken yet: the header alone when there was no console.
+    outputs.csvFile.append(outputs.csv.takeText());
     outputs.csvFile.commit();
     util::writeFileAtomically(folder + "/index.html",
                               outputs.page.text(estate, totals, outputs.rows.scriptText()));

@@ -10,7 +10,6 @@
 #include <sys/stat.h>
 #include <unistd.h>
 #include <utility>
-#include <vector>
 
 namespace util {
 
@@ -45,14 +44,13 @@ AtomicFileWriter::AtomicFileWriter(std::string path)
     : AtomicFileWriter(std::move(path), newFileMode()) {}
 
 AtomicFileWriter::AtomicFileWriter(std::string path, mode_t mode) : _path(std::move(path)) {
-    std::string const pattern = folderOf(_path) + "/." + baseNameOf(_path) + ".XXXXXX";
-    std::vector<char> temporary(pattern.begin(), pattern.end());
-    temporary.push_back('\0');
-    _descriptor = ::mkostemp(temporary.data(), O_CLOEXEC);
+    // The name is whole before the file exists: nothing can fail between
+    // making the file and knowing what to remove.
+    _temporary = folderOf(_path) + "/." + baseNameOf(_path) + ".XXXXXX";
+    _descriptor = ::mkostemp(_temporary.data(), O_CLOEXEC);
     if (_descriptor < 0) {
         throw SystemError(gc_Operation, _path, errno);
     }
-    _temporary = temporary.data();
     // mkstemp makes the file readable by its owner only.
     ::fchmod(_descriptor, mode);
 }
